@@ -1,0 +1,544 @@
+#include "CQoFile.h"
+
+#include "CQoException.h"
+
+#include <cerrno>
+#include <cstring>
+#include <sys/stat.h>
+
+#ifdef _WIN32
+#include <io.h>
+#include <windows.h>
+#else
+#include <unistd.h>
+#endif
+
+namespace {
+
+// DOS code page 850 -> Windows-1252 for the bytes 0x80-0xFF. Characters that
+// Windows-1252 lacks (box drawing, shades, dotless i, ...) get their nearest
+// plain form, see the header.
+unsigned char const kDos850ToAnsi[128] = {
+    0xC7, 0xFC, 0xE9, 0xE2, 0xE4, 0xE0, 0xE5, 0xE7, 0xEA, 0xEB, 0xE8, 0xEF, 0xEE, 0xEC, 0xC4, 0xC5,  // 0x80
+    0xC9, 0xE6, 0xC6, 0xF4, 0xF6, 0xF2, 0xFB, 0xF9, 0xFF, 0xD6, 0xDC, 0xF8, 0xA3, 0xD8, 0xD7, 0x83,  // 0x90
+    0xE1, 0xED, 0xF3, 0xFA, 0xF1, 0xD1, 0xAA, 0xBA, 0xBF, 0xAE, 0xAC, 0xBD, 0xBC, 0xA1, 0xAB, 0xBB,  // 0xA0
+    0x23, 0x23, 0x23, 0x7C, 0x2B, 0xC1, 0xC2, 0xC0, 0xA9, 0x2B, 0x7C, 0x2B, 0x2B, 0xA2, 0xA5, 0x2B,  // 0xB0
+    0x2B, 0x2B, 0x2B, 0x2B, 0x2D, 0x2B, 0xE3, 0xC3, 0x2B, 0x2B, 0x2B, 0x2B, 0x2B, 0x2D, 0x2B, 0xA4,  // 0xC0
+    0xF0, 0xD0, 0xCA, 0xCB, 0xC8, 0x69, 0xCD, 0xCE, 0xCF, 0x2B, 0x2B, 0x23, 0x23, 0xA6, 0xCC, 0x23,  // 0xD0
+    0xD3, 0xDF, 0xD4, 0xD2, 0xF5, 0xD5, 0xB5, 0xFE, 0xDE, 0xDA, 0xDB, 0xD9, 0xFD, 0xDD, 0xAF, 0xB4,  // 0xE0
+    0xAD, 0xB1, 0x3D, 0xBE, 0xB6, 0xA7, 0xF7, 0xB8, 0xB0, 0xA8, 0xB7, 0xB9, 0xB3, 0xB2, 0x3F, 0xA0,  // 0xF0
+};
+
+// Windows-1252 -> DOS code page 850 for the bytes 0x80-0xFF. Every character
+// that exists in both maps back exactly; the typographic characters of the
+// 0x80 row get their plain forms, the five unassigned bytes '?'.
+unsigned char const kAnsiToDos850[128] = {
+    0x45, 0x3F, 0x27, 0x9F, 0x22, 0x2E, 0x2B, 0x2B, 0x5E, 0x25, 0x53, 0x3C, 0x4F, 0x3F, 0x5A, 0x3F,  // 0x80
+    0x3F, 0x27, 0x27, 0x22, 0x22, 0x2A, 0x2D, 0x2D, 0x7E, 0x54, 0x73, 0x3E, 0x6F, 0x3F, 0x7A, 0x59,  // 0x90
+    0xFF, 0xAD, 0xBD, 0x9C, 0xCF, 0xBE, 0xDD, 0xF5, 0xF9, 0xB8, 0xA6, 0xAE, 0xAA, 0xF0, 0xA9, 0xEE,  // 0xA0
+    0xF8, 0xF1, 0xFD, 0xFC, 0xEF, 0xE6, 0xF4, 0xFA, 0xF7, 0xFB, 0xA7, 0xAF, 0xAC, 0xAB, 0xF3, 0xA8,  // 0xB0
+    0xB7, 0xB5, 0xB6, 0xC7, 0x8E, 0x8F, 0x92, 0x80, 0xD4, 0x90, 0xD2, 0xD3, 0xDE, 0xD6, 0xD7, 0xD8,  // 0xC0
+    0xD1, 0xA5, 0xE3, 0xE0, 0xE2, 0xE5, 0x99, 0x9E, 0x9D, 0xEB, 0xE9, 0xEA, 0x9A, 0xED, 0xE8, 0xE1,  // 0xD0
+    0x85, 0xA0, 0x83, 0xC6, 0x84, 0x86, 0x91, 0x87, 0x8A, 0x82, 0x88, 0x89, 0x8D, 0xA1, 0x8C, 0x8B,  // 0xE0
+    0xD0, 0xA4, 0x95, 0xA2, 0x93, 0xE4, 0x94, 0xF6, 0x9B, 0x97, 0xA3, 0x96, 0x81, 0xEC, 0xE7, 0x98,  // 0xF0
+};
+
+// Mixed files: only the DOS umlauts and ß are taken as DOS characters; every
+// other byte is Windows-1252. (0x81 and 0x8D are unassigned in Windows-1252, and
+// 0x84 0x94 0x8E 0x99 0x9A 0xE1 are rare typographic or accented characters there,
+// so the umlauts win.)
+struct MixTable {
+    unsigned char map[256];
+    MixTable()
+    {
+        for (int c = 0; c < 256; ++c)
+            map[c] = static_cast<unsigned char>(c);
+        for (int c : {0x84, 0x94, 0x81, 0x8E, 0x99, 0x9A, 0xE1})
+            map[c] = kDos850ToAnsi[c - 0x80];
+    }
+};
+
+MixTable const kMix;
+
+int CharSetOfMode(int mode)
+{
+    if (mode & CQoFile::ascii)
+        return CQoFile::ascii;
+    if (mode & CQoFile::ansimix)
+        return CQoFile::ansimix;
+    return CQoFile::ansi;
+}
+
+int SeekRaw(std::FILE *fp, std::int64_t offset, int origin)
+{
+#ifdef _WIN32
+    return _fseeki64(fp, offset, origin);
+#else
+    return fseeko(fp, static_cast<off_t>(offset), origin);
+#endif
+}
+
+std::int64_t TellRaw(std::FILE *fp)
+{
+#ifdef _WIN32
+    return _ftelli64(fp);
+#else
+    return static_cast<std::int64_t>(ftello(fp));
+#endif
+}
+
+constexpr std::size_t kBlock = 64 * 1024;
+
+} // namespace
+
+// ---------------------------------------------------------------------------
+// construction
+
+CQoFile::CQoFile(int bufferBlocks)
+    : m_bufferSize(static_cast<std::size_t>(bufferBlocks < 1 ? 1 : bufferBlocks) * kBlock)
+{
+}
+
+CQoFile::CQoFile(char const *path, int mode, int bufferBlocks) : CQoFile(bufferBlocks)
+{
+    Open(path, mode);
+}
+
+CQoFile::~CQoFile()
+{
+    CloseQuietly();
+}
+
+void CQoFile::Fail(int code) const
+{
+    CQoException::Throw(code, m_name.c_str());
+}
+
+// ---------------------------------------------------------------------------
+// opening and closing
+
+bool CQoFile::Open(char const *path, int mode)
+{
+    Close();
+    if (!path || !*path)
+        return false;
+
+    bool const wantWrite = (mode & (write | create)) != 0;
+    bool const wantRead = (mode & read) != 0 || !wantWrite;
+    std::FILE *fp = nullptr;
+    if (mode & create) {
+        fp = std::fopen(path, wantRead ? "w+b" : "wb");
+    } else if (wantWrite) {
+        // Keep an existing file; create a missing one.
+        fp = std::fopen(path, "r+b");
+        if (!fp && errno == ENOENT)
+            fp = std::fopen(path, "w+b");
+    } else {
+        fp = std::fopen(path, "rb");
+    }
+    if (!fp)
+        return false;
+
+#ifndef _WIN32
+    // fopen opens a folder for reading here; it is not a file, though.
+    struct stat info;
+    if (fstat(fileno(fp), &info) != 0 || S_ISDIR(info.st_mode)) {
+        std::fclose(fp);
+        return false;
+    }
+#endif
+    // We buffer ourselves; a second buffer in stdio would only copy.
+    std::setvbuf(fp, nullptr, _IONBF, 0);
+
+    std::int64_t position = 0;
+    if (wantWrite && !(mode & create) && !(mode & begin)) {
+        if (SeekRaw(fp, 0, SEEK_END) != 0) {
+            std::fclose(fp);
+            return false;
+        }
+        position = TellRaw(fp);
+    }
+
+    if (!m_buffer)
+        m_buffer.reset(new char[m_bufferSize]);
+    m_fp = fp;
+    m_name = path;
+    m_mode = mode | (wantRead ? read : 0) | (wantWrite ? write : 0);
+    m_charSet = CharSetOfMode(mode);
+    m_pos = m_end = 0;
+    m_filePos = position;
+    m_state = idle;
+    m_lastWasCR = false;
+    return true;
+}
+
+void CQoFile::OpenOrThrow(char const *path, int mode)
+{
+    if (Open(path, mode))
+        return;
+    bool missing = !(mode & (write | create)) && !Exists(path);
+    CQoException::Throw(missing ? CQoException::fileNotFound : CQoException::cannotOpen, path);
+}
+
+void CQoFile::Close()
+{
+    if (!m_fp)
+        return;
+    bool failed = false;
+    try {
+        FlushBuffer();
+    } catch (CQoException const &) {
+        failed = true;
+    }
+    if (std::fclose(m_fp) != 0 && (m_mode & write))
+        failed = true;
+    m_fp = nullptr;
+    m_pos = m_end = 0;
+    m_state = idle;
+    if (failed)
+        Fail(CQoException::writeError);
+}
+
+void CQoFile::CloseQuietly()
+{
+    try {
+        Close();
+    } catch (CQoException const &) {
+        // A destructor must not throw; callers that care call Close themselves.
+    }
+}
+
+void CQoFile::FileCharSet(int charSet)
+{
+    if (charSet == ansi || charSet == ascii || charSet == ansimix)
+        m_charSet = charSet;
+}
+
+// ---------------------------------------------------------------------------
+// buffer handling
+
+void CQoFile::FlushBuffer()
+{
+    if (m_state != writing || m_end == 0)
+        return;
+    std::size_t pending = m_end;
+    m_end = 0;
+    std::size_t written = std::fwrite(m_buffer.get(), 1, pending, m_fp);
+    m_filePos += static_cast<std::int64_t>(written);
+    if (written != pending)
+        Fail(CQoException::writeError);
+}
+
+void CQoFile::SwitchTo(state wanted)
+{
+    if (m_state == wanted)
+        return;
+    if (m_state == writing)
+        FlushBuffer();
+    // The C library wants a seek between reading and writing; it also puts
+    // the system position back where the caller is (unread buffer dropped).
+    std::int64_t logical = Tell();
+    if (m_state != idle && SeekRaw(m_fp, logical, SEEK_SET) != 0)
+        Fail(CQoException::seekError);
+    m_filePos = logical;
+    m_pos = m_end = 0;
+    m_bufferConverted = false;
+    m_state = wanted;
+}
+
+bool CQoFile::FillBuffer(bool throwOnError)
+{
+    m_pos = m_end = 0;
+    m_bufferConverted = false;
+    std::size_t got = std::fread(m_buffer.get(), 1, m_bufferSize, m_fp);
+    if (got == 0 && std::ferror(m_fp)) {
+        std::clearerr(m_fp);
+        if (throwOnError)
+            Fail(CQoException::readError);
+        return false;
+    }
+    m_end = got;
+    m_filePos += static_cast<std::int64_t>(got);
+    return got > 0;
+}
+
+void CQoFile::ConvertIn(char *data, std::size_t count) const
+{
+    if (m_charSet == ansi)
+        return;
+    auto *p = reinterpret_cast<unsigned char *>(data);
+    if (m_charSet == ascii) {
+        for (std::size_t i = 0; i < count; ++i)
+            if (p[i] >= 0x80)
+                p[i] = kDos850ToAnsi[p[i] - 0x80];
+    } else {
+        for (std::size_t i = 0; i < count; ++i)
+            p[i] = kMix.map[p[i]];
+    }
+}
+
+// ---------------------------------------------------------------------------
+// reading
+
+std::size_t CQoFile::Read(void *buffer, std::size_t count, bool throwOnError)
+{
+    if (!m_fp || !(m_mode & read)) {
+        if (throwOnError)
+            Fail(m_fp ? CQoException::readError : CQoException::notOpen);
+        return 0;
+    }
+    SwitchTo(reading);
+    char *out = static_cast<char *>(buffer);
+    std::size_t got = 0;
+    bool const text = !(m_mode & binary);
+    while (got < count) {
+        if (m_pos == m_end) {
+            if (!text && count - got >= m_bufferSize) {
+                // Large binary reads go straight into the caller's memory.
+                std::size_t n = std::fread(out + got, 1, count - got, m_fp);
+                if (n == 0 && std::ferror(m_fp)) {
+                    std::clearerr(m_fp);
+                    if (throwOnError)
+                        Fail(CQoException::readError);
+                    break;
+                }
+                m_filePos += static_cast<std::int64_t>(n);
+                got += n;
+                if (n == 0)
+                    break;
+                continue;
+            }
+            if (!FillBuffer(throwOnError))
+                break;
+        }
+        char const *src = m_buffer.get() + m_pos;
+        std::size_t avail = m_end - m_pos;
+        std::size_t want = count - got;
+        if (!text) {
+            std::size_t n = avail < want ? avail : want;
+            std::memcpy(out + got, src, n);
+            m_pos += n;
+            got += n;
+            continue;
+        }
+        // Text mode: copy up to the next CR, then decide whether it starts CR LF.
+        std::size_t n = avail < want ? avail : want;
+        void const *cr = std::memchr(src, '\r', n);
+        std::size_t plain = cr ? static_cast<std::size_t>(static_cast<char const *>(cr) - src) : n;
+        std::memcpy(out + got, src, plain);
+        m_pos += plain;
+        got += plain;
+        if (!cr)
+            continue;
+        ++m_pos; // the CR
+        if (m_pos == m_end && !FillBuffer(throwOnError)) {
+            out[got++] = '\r'; // CR at the end of the file stays
+            break;
+        }
+        if (m_buffer[m_pos] != '\n')
+            out[got++] = '\r';
+        // A CR LF pair: the LF is copied as the next byte.
+    }
+    ConvertIn(out, got);
+    return got;
+}
+
+bool CQoFile::ReadString(CQoString &line, bool throwOnError)
+{
+    line.Empty();
+    if (!m_fp || !(m_mode & read)) {
+        if (throwOnError)
+            Fail(m_fp ? CQoException::readError : CQoException::notOpen);
+        return false;
+    }
+    SwitchTo(reading);
+    bool any = false;
+    for (;;) {
+        if (m_pos == m_end && !FillBuffer(throwOnError))
+            break;
+        char *start = m_buffer.get() + m_pos;
+        std::size_t avail = m_end - m_pos;
+        any = true;
+        void *lf = std::memchr(start, '\n', avail);
+        std::size_t n = lf ? static_cast<std::size_t>(static_cast<char *>(lf) - start) : avail;
+        // Converting in place is safe: these bytes are consumed now, and a
+        // later Seek drops the buffer.
+        if (m_charSet != ansi) {
+            ConvertIn(start, n);
+            m_bufferConverted = true;
+        }
+        line.Append(start, n);
+        if (lf) {
+            m_pos += n + 1;
+            break;
+        }
+        m_pos = m_end;
+    }
+    if (!any)
+        return false;
+    int length = line.GetLength();
+    if (length > 0 && line.Str()[static_cast<std::size_t>(length) - 1] == '\r')
+        line.Assign(line.GetString(), static_cast<std::size_t>(length) - 1);
+    return true;
+}
+
+// ---------------------------------------------------------------------------
+// writing
+
+void CQoFile::Write(void const *data, std::size_t count)
+{
+    if (!m_fp)
+        Fail(CQoException::notOpen);
+    if (!(m_mode & write))
+        Fail(CQoException::writeError);
+    if (count == 0)
+        return;
+    SwitchTo(writing);
+    auto const *src = static_cast<unsigned char const *>(data);
+    bool const text = !(m_mode & binary);
+    bool const dos = m_charSet == ascii;
+
+    if (!text && !dos) {
+        if (count >= m_bufferSize) {
+            FlushBuffer();
+            std::size_t written = std::fwrite(src, 1, count, m_fp);
+            m_filePos += static_cast<std::int64_t>(written);
+            if (written != count)
+                Fail(CQoException::writeError);
+            return;
+        }
+        while (count > 0) {
+            std::size_t room = m_bufferSize - m_end;
+            std::size_t n = count < room ? count : room;
+            std::memcpy(m_buffer.get() + m_end, src, n);
+            m_end += n;
+            src += n;
+            count -= n;
+            if (m_end == m_bufferSize)
+                FlushBuffer();
+        }
+        return;
+    }
+
+    char *buffer = m_buffer.get();
+    for (std::size_t i = 0; i < count; ++i) {
+        unsigned char c = src[i];
+        if (dos && c >= 0x80)
+            c = kAnsiToDos850[c - 0x80];
+        if (text && c == '\n' && !m_lastWasCR) {
+            if (m_end == m_bufferSize)
+                FlushBuffer();
+            buffer[m_end++] = '\r';
+        }
+        m_lastWasCR = c == '\r';
+        if (m_end == m_bufferSize)
+            FlushBuffer();
+        buffer[m_end++] = static_cast<char>(c);
+    }
+}
+
+void CQoFile::Write(CQoString const &text)
+{
+    Write(text.GetString(), static_cast<std::size_t>(text.GetLength()));
+}
+
+void CQoFile::Flush(bool toDisk)
+{
+    if (!m_fp)
+        return;
+    FlushBuffer();
+    if (std::fflush(m_fp) != 0)
+        Fail(CQoException::writeError);
+    if (toDisk) {
+#ifdef _WIN32
+        if (_commit(_fileno(m_fp)) != 0)
+            Fail(CQoException::writeError);
+#else
+        if (fsync(fileno(m_fp)) != 0)
+            Fail(CQoException::writeError);
+#endif
+    }
+}
+
+// ---------------------------------------------------------------------------
+// position
+
+std::int64_t CQoFile::Tell() const
+{
+    if (m_state == reading)
+        return m_filePos - static_cast<std::int64_t>(m_end - m_pos);
+    if (m_state == writing)
+        return m_filePos + static_cast<std::int64_t>(m_end);
+    return m_filePos;
+}
+
+std::int64_t CQoFile::Length()
+{
+    if (!m_fp)
+        Fail(CQoException::notOpen);
+    if (m_state == writing)
+        Flush();
+#ifdef _WIN32
+    std::int64_t length = _filelengthi64(_fileno(m_fp));
+    if (length < 0)
+        Fail(CQoException::readError);
+    return length;
+#else
+    struct stat info;
+    if (fstat(fileno(m_fp), &info) != 0)
+        Fail(CQoException::readError);
+    return static_cast<std::int64_t>(info.st_size);
+#endif
+}
+
+std::int64_t CQoFile::Seek(std::int64_t offset, int from)
+{
+    if (!m_fp)
+        Fail(CQoException::notOpen);
+    std::int64_t base = 0;
+    if (from == current)
+        base = Tell();
+    else if (from == end)
+        base = Length();
+    std::int64_t target = base + offset;
+    if (target < 0)
+        Fail(CQoException::seekError);
+
+    // Inside the bytes already read (and still as in the file): just move in
+    // the buffer.
+    if (m_state == reading && !m_bufferConverted) {
+        std::int64_t bufferStart = m_filePos - static_cast<std::int64_t>(m_end);
+        if (target >= bufferStart && target <= m_filePos) {
+            m_pos = static_cast<std::size_t>(target - bufferStart);
+            return target;
+        }
+    }
+    FlushBuffer();
+    if (SeekRaw(m_fp, target, SEEK_SET) != 0)
+        Fail(CQoException::seekError);
+    m_filePos = target;
+    m_pos = m_end = 0;
+    m_state = idle;
+    m_lastWasCR = false;
+    return target;
+}
+
+// ---------------------------------------------------------------------------
+// files on the disk
+
+bool CQoFile::Exists(char const *path)
+{
+    if (!path || !*path)
+        return false;
+#ifdef _WIN32
+    return GetFileAttributesA(path) != INVALID_FILE_ATTRIBUTES;
+#else
+    struct stat info;
+    return stat(path, &info) == 0;
+#endif
+}
+
+bool CQoFile::Remove(char const *path)
+{
+    return path && *path && std::remove(path) == 0;
+}

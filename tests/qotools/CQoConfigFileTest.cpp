@@ -1,0 +1,306 @@
+#include "CQoConfigFile.h"
+#include "CQoFile.h"
+
+#include "TempFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <climits>
+#include <filesystem>
+#include <string>
+#include <vector>
+
+namespace {
+
+std::vector<std::string> Names(std::vector<CQoString> const &list)
+{
+    std::vector<std::string> names;
+    for (CQoString const &s : list)
+        names.push_back(s.Str());
+    return names;
+}
+
+CQoConfigFile Reread(CQoConfigFile const &cfg, TempFolder const &tmp)
+{
+    std::string path = tmp.Path("reread.cfg");
+    EXPECT_TRUE(cfg.Write(path.c_str()));
+    CQoConfigFile back;
+    EXPECT_TRUE(back.Open(path.c_str()));
+    return back;
+}
+
+} // namespace
+
+TEST(CQoConfigFileRoundTrip, AnyValueComesBackExactly)
+{
+    TempFolder tmp;
+    std::vector<std::string> values = {
+        "a=b=c", "[not a section]", "; not a comment", "# nor this", "line1\r\nline2\nline3\r",
+        "C:\\daten\\", "\\n is not a newline", "  leading", "trailing  ", " ", "\tTab\t",
+        "M\374ller Gr\366\337e \200", "", "x\\s", "\\x41",
+    };
+    std::string allBytes;
+    for (int c = 1; c < 256; ++c)
+        allBytes += static_cast<char>(c);
+    values.push_back(allBytes);
+    values.push_back(std::string("nul\0inside", 10));
+
+    CQoConfigFile cfg;
+    for (std::size_t i = 0; i < values.size(); ++i) {
+        CQoString value;
+        value.Assign(values[i].data(), values[i].size());
+        ASSERT_TRUE(cfg.SetValue("Werte", ("k" + std::to_string(i)).c_str(), value));
+    }
+    // Names with the characters that structure the file.
+    cfg.SetValue("Sektion ]mit[ = Zeichen", " key=with;all#[]\\ ", "v");
+
+    CQoConfigFile back = Reread(cfg, tmp);
+    for (std::size_t i = 0; i < values.size(); ++i) {
+        CQoString value("preset");
+        EXPECT_TRUE(back.GetValue("Werte", ("k" + std::to_string(i)).c_str(), value)) << i;
+        EXPECT_EQ(values[i], value.Str()) << "value " << i;
+    }
+    CQoString value;
+    EXPECT_TRUE(back.GetValue("Sektion ]mit[ = Zeichen", " key=with;all#[]\\ ", value));
+    EXPECT_STREQ("v", value);
+}
+
+TEST(CQoConfigFileRoundTrip, IntegersNegativeAndLarge)
+{
+    TempFolder tmp;
+    CQoConfigFile cfg;
+    cfg.SetValue("Zahlen", "null", 0);
+    cfg.SetValue("Zahlen", "minus", -17);
+    cfg.SetValue("Zahlen", "intmin", INT_MIN);
+    cfg.SetValue("Zahlen", "intmax", INT_MAX);
+    cfg.SetValue("Zahlen", "longmin", LONG_MIN);
+    cfg.SetValue("Zahlen", "longmax", LONG_MAX);
+    CQoConfigFile back = Reread(cfg, tmp);
+
+    int i = 99;
+    long l = 99;
+    EXPECT_TRUE(back.GetValue("Zahlen", "null", i));
+    EXPECT_EQ(0, i);
+    EXPECT_TRUE(back.GetValue("Zahlen", "minus", i));
+    EXPECT_EQ(-17, i);
+    EXPECT_TRUE(back.GetValue("Zahlen", "intmin", i));
+    EXPECT_EQ(INT_MIN, i);
+    EXPECT_TRUE(back.GetValue("Zahlen", "intmax", i));
+    EXPECT_EQ(INT_MAX, i);
+    EXPECT_TRUE(back.GetValue("Zahlen", "longmin", l));
+    EXPECT_EQ(LONG_MIN, l);
+    EXPECT_TRUE(back.GetValue("Zahlen", "longmax", l));
+    EXPECT_EQ(LONG_MAX, l);
+    CQoString text;
+    EXPECT_TRUE(back.GetValue("Zahlen", "minus", text));
+    EXPECT_STREQ("-17", text);
+}
+
+TEST(CQoConfigFileValues, MissingOrUnfitValuesKeepThePreset)
+{
+    CQoConfigFile cfg;
+    cfg.SetValue("S", "text", "abc");
+    cfg.SetValue("S", "big", "99999999999999999999999");
+    cfg.SetValue("S", "half", "12abc");
+    cfg.SetValue("S", "blank", "");
+
+    CQoString s("preset");
+    int i = 7;
+    long l = 8;
+    EXPECT_FALSE(cfg.GetValue("S", "missing", s));
+    EXPECT_FALSE(cfg.GetValue("other", "text", s));
+    EXPECT_STREQ("preset", s);
+    EXPECT_FALSE(cfg.GetValue("S", "missing", i));
+    EXPECT_FALSE(cfg.GetValue("S", "text", i));
+    EXPECT_FALSE(cfg.GetValue("S", "half", i));
+    EXPECT_FALSE(cfg.GetValue("S", "blank", i));
+    EXPECT_FALSE(cfg.GetValue("S", "big", i));
+    EXPECT_FALSE(cfg.GetValue("S", "big", l));
+    EXPECT_EQ(7, i);
+    EXPECT_EQ(8, l);
+    EXPECT_TRUE(cfg.GetValue("S", "blank", s));
+    EXPECT_STREQ("", s);
+
+    EXPECT_FALSE(cfg.SetValue("", "k", "v"));
+    EXPECT_FALSE(cfg.SetValue("S", "", "v"));
+    EXPECT_FALSE(cfg.SetValue(nullptr, "k", 1));
+    EXPECT_EQ((std::vector<std::string>{"S"}), Names(cfg.GetSections()));
+}
+
+TEST(CQoConfigFileValues, NamesAreCaseInsensitiveAndKeepTheirOrder)
+{
+    TempFolder tmp;
+    CQoConfigFile cfg;
+    cfg.SetValue("Zweite", "b", "1");
+    cfg.SetValue("Erste", "Gr\366\337e", "1");
+    cfg.SetValue("erste", "a", "2");
+    cfg.SetValue("ZWEITE", "a", "3");
+    cfg.SetValue("ERSTE", "GR\326\337E", "4"); // same key, other case, umlaut included
+    CQoConfigFile back = Reread(cfg, tmp);
+    EXPECT_EQ((std::vector<std::string>{"Zweite", "Erste"}), Names(back.GetSections()));
+    EXPECT_EQ((std::vector<std::string>{"Gr\366\337e", "a"}), Names(back.GetKeys("erste")));
+    EXPECT_EQ((std::vector<std::string>{"b", "a"}), Names(back.GetKeys("zweite")));
+    CQoString v;
+    EXPECT_TRUE(back.GetValue("eRSTE", "gr\366\337E", v));
+    EXPECT_STREQ("4", v);
+}
+
+TEST(CQoConfigFileEdit, DeleteCopyAndClear)
+{
+    CQoConfigFile cfg;
+    cfg.SetValue("A", "x", "1");
+    cfg.SetValue("A", "y", "2");
+    cfg.SetValue("B", "z", "3");
+    cfg.SetValue("C", "w", "4");
+
+    EXPECT_TRUE(cfg.DeleteKey("a", "X"));
+    EXPECT_FALSE(cfg.DeleteKey("A", "x"));
+    EXPECT_FALSE(cfg.DeleteKey("none", "x"));
+    EXPECT_FALSE(cfg.HasKey("A", "x"));
+    EXPECT_TRUE(cfg.HasKey("A", "y"));
+    EXPECT_TRUE(cfg.DeleteSection("b"));
+    EXPECT_FALSE(cfg.DeleteSection("B"));
+    EXPECT_EQ((std::vector<std::string>{"A", "C"}), Names(cfg.GetSections()));
+
+    CQoConfigFile other;
+    other.SetValue("a", "new", "n");
+    other.SetValue("D", "d", "dd");
+    other.SetValue("X", "x", "xx");
+
+    cfg.CopySection(other, "A"); // replaced in place: old keys gone
+    EXPECT_EQ((std::vector<std::string>{"new"}), Names(cfg.GetKeys("A")));
+    cfg.CopySection(other, "D"); // new at the end
+    EXPECT_EQ((std::vector<std::string>{"A", "C", "D"}), Names(cfg.GetSections()));
+    cfg.CopySection(other, "C"); // the other has none: gone here too
+    EXPECT_EQ((std::vector<std::string>{"A", "D"}), Names(cfg.GetSections()));
+    cfg.CopySection(cfg, "A"); // itself: unchanged
+    EXPECT_EQ((std::vector<std::string>{"new"}), Names(cfg.GetKeys("A")));
+
+    // The copy is independent of its source.
+    other.SetValue("D", "d", "changed");
+    CQoString v;
+    EXPECT_TRUE(cfg.GetValue("D", "d", v));
+    EXPECT_STREQ("dd", v);
+
+    cfg.Clear();
+    EXPECT_TRUE(cfg.GetSections().empty());
+    EXPECT_FALSE(cfg.GetValue("A", "new", v));
+}
+
+TEST(CQoConfigFileFormat, WrittenFileIsReadableText)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("projekt.cfg");
+    CQoConfigFile cfg;
+    cfg.SetValue("Eingabe", "Datei", "C:\\daten\\kunden.txt");
+    cfg.SetValue("Eingabe", "Zeichensatz", 1);
+    cfg.SetValue("Ausgabe", "Trenner", " ; ");
+    cfg.SetValue("Ausgabe", "Name", "M\374ller\r\nGmbH");
+    ASSERT_TRUE(cfg.Write(path.c_str()));
+    EXPECT_EQ("[Eingabe]\r\n"
+              "Datei=C:\\\\daten\\\\kunden.txt\r\n"
+              "Zeichensatz=1\r\n"
+              "\r\n"
+              "[Ausgabe]\r\n"
+              "Trenner=\\s;\\s\r\n"
+              "Name=M\374ller\\r\\nGmbH\r\n",
+              ReadBytes(path));
+    EXPECT_FALSE(CQoFile::Exists((path + ".~tmp").c_str()));
+}
+
+TEST(CQoConfigFileFormat, MalformedLinesAreSkipped)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("kaputt.cfg");
+    std::string junk = "vorher=keine Sektion\n"
+                       "[Gut]\n"
+                       "  a = 1  \n"
+                       "ohne Gleichheitszeichen\n"
+                       "=leerer Schluessel\n"
+                       "b=bad \\q escape\n"
+                       "c=cut \\x4\n"
+                       "d=\\\n"
+                       "; Kommentar=1\n"
+                       "e=\x01\x02 binary\n"
+                       "\xFF\xFE@@ junk=@\n"
+                       "f=2\r\n"
+                       "[Offen\n"
+                       "g=lost after bad header\n"
+                       "[]\n"
+                       "h=lost after empty header\n"
+                       "[Gut]\n"
+                       "a=3\n"
+                       "[Zweite] trailing\n"
+                       "i=lost\n";
+    for (char &c : junk)
+        if (c == '@')
+            c = '\0';
+    WriteBytes(path, junk);
+    CQoConfigFile cfg;
+    ASSERT_TRUE(cfg.Open(path.c_str()));
+    EXPECT_EQ((std::vector<std::string>{"Gut"}), Names(cfg.GetSections()));
+    EXPECT_EQ((std::vector<std::string>{"a", "f"}), Names(cfg.GetKeys("Gut")));
+    CQoString v;
+    EXPECT_TRUE(cfg.GetValue("Gut", "a", v));
+    EXPECT_STREQ("3", v); // the later value wins, the first place stays
+    EXPECT_TRUE(cfg.GetValue("Gut", "f", v));
+    EXPECT_STREQ("2", v);
+
+    // Pure binary data is not a configuration, but it is no crash either.
+    std::string binary;
+    for (int i = 0; i < 5000; ++i)
+        binary += static_cast<char>((i * 7919) & 0xFF);
+    WriteBytes(path, binary);
+    EXPECT_TRUE(cfg.Open(path.c_str()));
+    for (CQoString const &section : cfg.GetSections())
+        EXPECT_FALSE(section.IsEmpty());
+}
+
+TEST(CQoConfigFileFiles, OpenMissingIsEmptyAndOpenReplaces)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("neu.cfg");
+    CQoConfigFile cfg;
+    cfg.SetValue("Alt", "k", "v");
+    EXPECT_TRUE(cfg.Open(path.c_str()));
+    EXPECT_TRUE(cfg.GetSections().empty());
+
+    WriteBytes(path, "[Neu]\nk=v\n");
+    cfg.SetValue("Alt", "k", "v");
+    EXPECT_TRUE(cfg.Open(path.c_str()));
+    EXPECT_EQ((std::vector<std::string>{"Neu"}), Names(cfg.GetSections()));
+
+    // A folder cannot be read: false, and the contents stay.
+    EXPECT_FALSE(cfg.Open(tmp.Folder().string().c_str()));
+    EXPECT_EQ((std::vector<std::string>{"Neu"}), Names(cfg.GetSections()));
+}
+
+TEST(CQoConfigFileFiles, FailedWriteLeavesTheOldFileIntact)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("projekt.cfg");
+    WriteBytes(path, "[Alt]\nk=v\n");
+    CQoConfigFile cfg;
+    cfg.SetValue("Neu", "k", "v");
+
+    // The temporary file cannot be created: a folder is in its place.
+    std::filesystem::create_directory(path + ".~tmp");
+    EXPECT_FALSE(cfg.Write(path.c_str()));
+    EXPECT_EQ("[Alt]\nk=v\n", ReadBytes(path));
+    std::filesystem::remove(path + ".~tmp");
+
+    // The target cannot be replaced: it is a folder.
+    std::string folder = tmp.Path("ordner.cfg");
+    std::filesystem::create_directory(folder);
+    std::filesystem::create_directory(folder + "/inhalt");
+    EXPECT_FALSE(cfg.Write(folder.c_str()));
+    EXPECT_TRUE(std::filesystem::is_directory(folder + "/inhalt"));
+    EXPECT_FALSE(CQoFile::Exists((folder + ".~tmp").c_str()));
+
+    // A folder that does not exist.
+    EXPECT_FALSE(cfg.Write(tmp.Path("fehlt/projekt.cfg").c_str()));
+
+    // And a good write replaces the old file completely.
+    EXPECT_TRUE(cfg.Write(path.c_str()));
+    EXPECT_EQ("[Neu]\r\nk=v\r\n", ReadBytes(path));
+}

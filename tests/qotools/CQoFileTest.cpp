@@ -1,0 +1,305 @@
+#include "CQoException.h"
+#include "CQoFile.h"
+
+#include "TempFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <string>
+#include <vector>
+
+namespace {
+
+// The umlauts and ß in Windows-1252 and in DOS code page 850.
+std::string const kAnsiUmlauts = "\344\366\374\304\326\334\337";
+std::string const kDosUmlauts = "\x84\x94\x81\x8E\x99\x9A\xE1";
+
+std::vector<std::string> ReadLines(std::string const &path, int mode, int blocks = 16)
+{
+    std::vector<std::string> lines;
+    CQoFile file(blocks);
+    EXPECT_TRUE(file.Open(path.c_str(), mode));
+    CQoString line;
+    while (file.ReadString(line))
+        lines.push_back(line.Str());
+    return lines;
+}
+
+int Code(void (*f)(CQoFile &), CQoFile &file)
+{
+    try {
+        f(file);
+    } catch (CQoException const &e) {
+        return e.Code();
+    }
+    return -1;
+}
+
+} // namespace
+
+// --- character sets --------------------------------------------------------
+
+TEST(CQoFileCharSet, AsciiWritesDos850AndReadsBackWindows1252)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("dos.txt");
+    {
+        CQoFile file;
+        ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary | CQoFile::ascii));
+        EXPECT_EQ(CQoFile::ascii, file.FileCharSet());
+        file.Write(CQoString(kAnsiUmlauts.c_str()));
+        file.Close();
+    }
+    EXPECT_EQ(kDosUmlauts, ReadBytes(path));
+    EXPECT_EQ(std::vector<std::string>{kAnsiUmlauts}, ReadLines(path, CQoFile::read | CQoFile::ascii));
+
+    // Every character of Windows-1252 from 0xA0 up exists in code page 850
+    // and survives the way there and back.
+    std::string latin;
+    for (int c = 0xA0; c <= 0xFF; ++c)
+        latin += static_cast<char>(c);
+    {
+        CQoFile file(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ascii);
+        file.Write(latin.data(), latin.size());
+    }
+    std::string onDisk = ReadBytes(path);
+    ASSERT_EQ(latin.size(), onDisk.size());
+    EXPECT_NE(latin, onDisk);
+    CQoFile file(path.c_str(), CQoFile::read | CQoFile::binary | CQoFile::ascii);
+    std::string back(latin.size(), '\0');
+    EXPECT_EQ(latin.size(), file.Read(&back[0], back.size()));
+    EXPECT_EQ(latin, back);
+}
+
+TEST(CQoFileCharSet, CharactersWithoutEquivalentGetTheirNearestForm)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("box.txt");
+    // DOS box drawing and shading: corner, horizontal, vertical, double lines, shade.
+    WriteBytes(path, "\xDA\xC4\xBF\r\n\xB3\xB0\xBA\r\n\xC0\xCD\xD9\r\n");
+    EXPECT_EQ((std::vector<std::string>{"+-+", "|#|", "+-+"}), ReadLines(path, CQoFile::read | CQoFile::ascii));
+
+    // Windows-1252 only: euro, s with caron, typographic quotes, dash, unassigned byte.
+    {
+        CQoFile file(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ascii);
+        file.Write(CQoString("\200 \232 \223x\224 \226 \201"));
+    }
+    EXPECT_EQ("E s \"x\" - ?", ReadBytes(path));
+}
+
+TEST(CQoFileCharSet, AnsimixReadsBothEncodingsAndWritesWindows1252)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("mix.txt");
+    // One line in Windows-1252, one in DOS, one mixed; é (0xE9) is plain 1252.
+    WriteBytes(path, "M\374ller Gr\366\337e\r\nM\x81ller Gr\x94\xE1" "e\r\nS\x84tze \344 \xE9t\xE9\r\n");
+    EXPECT_EQ((std::vector<std::string>{"M\374ller Gr\366\337e", "M\374ller Gr\366\337e", "S\344tze \344 \351t\351"}),
+              ReadLines(path, CQoFile::read | CQoFile::ansimix));
+    // The same file as plain Windows-1252 is left as it is.
+    EXPECT_EQ("M\x81ller Gr\x94\xE1" "e", ReadLines(path, CQoFile::read | CQoFile::ansi)[1]);
+
+    {
+        CQoFile file(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ansimix);
+        file.Write(CQoString(kAnsiUmlauts.c_str()));
+    }
+    EXPECT_EQ(kAnsiUmlauts, ReadBytes(path));
+}
+
+TEST(CQoFileCharSet, CanBeChosenAfterOpening)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("late.txt");
+    WriteBytes(path, kDosUmlauts + "\n");
+    CQoFile file(8);
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::read | CQoFile::binary));
+    EXPECT_EQ(CQoFile::ansi, file.FileCharSet());
+    file.FileCharSet(12345); // not a character set: ignored
+    EXPECT_EQ(CQoFile::ansi, file.FileCharSet());
+    file.FileCharSet(CQoFile::ascii);
+    CQoString line;
+    ASSERT_TRUE(file.ReadString(line, false));
+    EXPECT_EQ(kAnsiUmlauts, line.Str());
+
+    // Seeking back re-reads the file's bytes, converted once, not twice.
+    file.Seek(0, CQoFile::begin);
+    char buffer[7];
+    EXPECT_EQ(7u, file.Read(buffer, 7, false));
+    EXPECT_EQ(kAnsiUmlauts, std::string(buffer, 7));
+}
+
+// --- lines -----------------------------------------------------------------
+
+TEST(CQoFileLines, SplitsAtCrLfAndLfAndKeepsTheLastLine)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("lines.txt");
+    WriteBytes(path, "eins\r\nzwei\n\n\r\nf\xFCnf\rx\r\nlast");
+    EXPECT_EQ((std::vector<std::string>{"eins", "zwei", "", "", "f\xFCnf\rx", "last"}),
+              ReadLines(path, CQoFile::read));
+
+    WriteBytes(path, "");
+    EXPECT_TRUE(ReadLines(path, CQoFile::read).empty());
+    WriteBytes(path, "\n");
+    EXPECT_EQ(std::vector<std::string>{""}, ReadLines(path, CQoFile::read));
+    WriteBytes(path, "only\r");
+    EXPECT_EQ(std::vector<std::string>{"only"}, ReadLines(path, CQoFile::read));
+}
+
+TEST(CQoFileLines, LinesLongerThanTheBufferAndLineEndsAcrossItsEdge)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("long.txt");
+    std::size_t const block = 64 * 1024;
+    std::string longLine(3 * block + 17, 'x');
+    for (std::size_t i = 0; i < longLine.size(); i += 1000)
+        longLine[i] = static_cast<char>('a' + (i / 1000) % 26);
+    std::string first(block - 1, 'y'); // its CR is the buffer's last byte, the LF the next one's first
+    WriteBytes(path, first + "\r\n" + longLine + "\r\nend\n");
+    EXPECT_EQ((std::vector<std::string>{first, longLine, "end"}), ReadLines(path, CQoFile::read, 1));
+}
+
+TEST(CQoFileLines, TextModeTranslatesLineEndsAndBinaryModeDoesNot)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("mode.txt");
+    {
+        CQoFile file(path.c_str(), CQoFile::create);
+        file.Write(CQoString("a\nb\r\nc\r"));
+        file.Write(CQoString("\nd\n"));
+    }
+    EXPECT_EQ("a\r\nb\r\nc\r\nd\r\n", ReadBytes(path));
+
+    char buffer[32];
+    CQoFile text(path.c_str(), CQoFile::read);
+    std::size_t n = text.Read(buffer, sizeof buffer);
+    EXPECT_EQ("a\nb\nc\nd\n", std::string(buffer, n));
+
+    CQoFile binary(path.c_str(), CQoFile::read | CQoFile::binary);
+    n = binary.Read(buffer, sizeof buffer);
+    EXPECT_EQ("a\r\nb\r\nc\r\nd\r\n", std::string(buffer, n));
+
+    WriteBytes(path, "x\ry\r");
+    CQoFile lone(path.c_str(), CQoFile::read);
+    n = lone.Read(buffer, sizeof buffer);
+    EXPECT_EQ("x\ry\r", std::string(buffer, n));
+}
+
+// --- opening, positions, errors ---------------------------------------------
+
+TEST(CQoFileOpen, ModesCreateTruncateAppendAndOverwrite)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("modes.txt");
+    CQoFile file;
+    EXPECT_FALSE(file.Open(path.c_str(), CQoFile::read));
+    EXPECT_FALSE(file.IsOpen());
+    EXPECT_FALSE(file.Open(tmp.Folder().string().c_str(), CQoFile::read)); // a folder
+    EXPECT_FALSE(file.Open("", CQoFile::read));
+    try {
+        file.OpenOrThrow(path.c_str(), CQoFile::read);
+        FAIL();
+    } catch (CQoException const &e) {
+        EXPECT_EQ(CQoException::fileNotFound, e.Code());
+        EXPECT_NE(std::string::npos, std::string(e.Message()).find("modes.txt"));
+    }
+
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::binary)); // creates a missing file
+    EXPECT_STREQ(path.c_str(), file.FileName());
+    file.Write("12345", 5);
+    file.Close();
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::binary)); // appends
+    file.Write("678", 3);
+    file.Close();
+    EXPECT_EQ("12345678", ReadBytes(path));
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::begin | CQoFile::binary)); // in place
+    file.Write("ab", 2);
+    file.Close();
+    EXPECT_EQ("ab345678", ReadBytes(path));
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary)); // truncates
+    EXPECT_EQ(0, file.Length());
+    file.Close();
+    EXPECT_EQ("", ReadBytes(path));
+}
+
+TEST(CQoFileOpen, SeekTellAndLengthAre64Bit)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("pos.txt");
+    WriteBytes(path, "line0\nline1\nline2\nline3\n");
+    CQoFile file(1);
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::read | CQoFile::binary));
+    EXPECT_EQ(24, file.Length());
+    CQoString line;
+    ASSERT_TRUE(file.ReadString(line));
+    EXPECT_EQ(6, file.Tell());
+    std::int64_t third = 12;
+    ASSERT_TRUE(file.ReadString(line));
+    EXPECT_EQ(third, file.Tell());
+    ASSERT_TRUE(file.ReadString(line));
+    EXPECT_EQ(third, file.Seek(third, CQoFile::begin));
+    ASSERT_TRUE(file.ReadString(line));
+    EXPECT_STREQ("line2", line);
+    EXPECT_EQ(19, file.Seek(-5, CQoFile::end));
+    ASSERT_TRUE(file.ReadString(line));
+    EXPECT_STREQ("ine3", line);
+    EXPECT_FALSE(file.ReadString(line));
+    EXPECT_EQ(2, file.Seek(-22, CQoFile::current));
+    EXPECT_EQ(CQoException::seekError, Code([](CQoFile &f) { f.Seek(-1, CQoFile::begin); }, file));
+    file.Close();
+
+    // Beyond 4 GiB: a sparse file with one byte at 5 GiB.
+    std::int64_t const far = 5LL * 1024 * 1024 * 1024;
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::read | CQoFile::write | CQoFile::create | CQoFile::binary));
+    EXPECT_EQ(far, file.Seek(far));
+    file.Write("Z", 1);
+    EXPECT_EQ(far + 1, file.Tell());
+    EXPECT_EQ(far + 1, file.Length());
+    file.Seek(far);
+    char c = 0;
+    EXPECT_EQ(1u, file.Read(&c, 1));
+    EXPECT_EQ('Z', c);
+    file.Close();
+    std::filesystem::remove(path);
+}
+
+TEST(CQoFileOpen, ReadingAndWritingOneFileInTurn)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("rw.txt");
+    WriteBytes(path, "0123456789");
+    CQoFile file(path.c_str(), CQoFile::read | CQoFile::write | CQoFile::begin | CQoFile::binary);
+    ASSERT_TRUE(file.IsOpen());
+    char buffer[4];
+    EXPECT_EQ(4u, file.Read(buffer, 4));
+    file.Write("AB", 2); // lands after the bytes read, not after the buffered ones
+    EXPECT_EQ(6, file.Tell());
+    EXPECT_EQ(4u, file.Read(buffer, 4));
+    EXPECT_EQ("6789", std::string(buffer, 4));
+    file.Close();
+    EXPECT_EQ("0123AB6789", ReadBytes(path));
+}
+
+TEST(CQoFileOpen, ErrorsNameTheFileOrAreQuietOnRequest)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("err.txt");
+    CQoFile closed;
+    char buffer[4];
+    CQoString line("keep?");
+    EXPECT_EQ(0u, closed.Read(buffer, 4, false));
+    EXPECT_FALSE(closed.ReadString(line, false));
+    EXPECT_EQ(CQoException::notOpen, Code([](CQoFile &f) { char b[1]; f.Read(b, 1); }, closed));
+    EXPECT_EQ(CQoException::notOpen, Code([](CQoFile &f) { f.Write("x", 1); }, closed));
+
+    WriteBytes(path, "data");
+    CQoFile reader(path.c_str(), CQoFile::read);
+    try {
+        reader.Write("x", 1);
+        FAIL();
+    } catch (CQoException const &e) {
+        EXPECT_EQ(CQoException::writeError, e.Code());
+        EXPECT_NE(std::string::npos, std::string(e.Message()).find("err.txt"));
+    }
+    EXPECT_EQ("data", ReadBytes(path));
+}
