@@ -1,0 +1,72 @@
+#include "CMainDlg.h"
+
+#include <CQoConfigFile.h>
+
+#include "QoConvertApp.h"
+
+BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
+    ON_BN_CLICKED(IDC_CONVERT, OnConvert)
+END_MESSAGE_MAP()
+
+CMainDlg::CMainDlg(CWnd* pParent)
+    : CDialog(IDD, pParent), m_inputCharset(0), m_outputCharset(0)
+{
+}
+
+void CMainDlg::FillCharsets(int id)
+{
+    CComboBox* combo = (CComboBox*)GetDlgItem(id);
+    combo->ResetContent();
+    combo->AddString("Windows Ansi");
+    combo->AddString("DOS Ascii");
+    combo->AddString("Ansi/Ascii");
+}
+
+BOOL CMainDlg::OnInitDialog()
+{
+    FillCharsets(IDC_INPUT_CHARSET);
+    FillCharsets(IDC_OUTPUT_CHARSET);
+
+    CQoConfigFile config;
+    config.Open(theApp.m_projectFile);
+    CConversion job;
+    job.ReadConfig(config);
+    m_project = (const char*)theApp.m_projectFolder;
+    m_inputFile = (const char*)job.m_inputFile;
+    m_inputCharset = job.m_inputCharset;
+    m_outputFile = (const char*)job.m_outputFile;
+    m_outputCharset = job.m_outputCharset;
+
+    CDialog::OnInitDialog();
+    return TRUE;
+}
+
+void CMainDlg::DoDataExchange(CDataExchange* pDX)
+{
+    CDialog::DoDataExchange(pDX);
+    DDX_Text(pDX, IDC_PROJECT, m_project);
+    DDX_Text(pDX, IDC_INPUT_FILE, m_inputFile);
+    DDX_CBIndex(pDX, IDC_INPUT_CHARSET, m_inputCharset);
+    DDX_Text(pDX, IDC_OUTPUT_FILE, m_outputFile);
+    DDX_CBIndex(pDX, IDC_OUTPUT_CHARSET, m_outputCharset);
+}
+
+void CMainDlg::OnConvert()
+{
+    if (!UpdateData(TRUE))
+        return;
+
+    // The project keeps what the user chose.
+    CQoConfigFile config;
+    config.Open(theApp.m_projectFile);
+    CConversion job;
+    job.m_inputFile = (const char*)m_inputFile;
+    job.m_inputCharset = m_inputCharset;
+    job.m_outputFile = (const char*)m_outputFile;
+    job.m_outputCharset = m_outputCharset;
+    job.WriteConfig(config);
+    config.Write(theApp.m_projectFile);
+
+    CString status = theApp.Convert() ? "Konvertiert." : "Fehlgeschlagen.";
+    SetDlgItemText(IDC_STATUS, status);
+}

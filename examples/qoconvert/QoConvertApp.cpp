@@ -1,0 +1,117 @@
+#include "QoConvertApp.h"
+
+#include <CQoConfigFile.h>
+#include <CQoErrorDlg.h>
+#include <CQoException.h>
+#include <CQoInterActive.h>
+#include <CQoLog.h>
+#include <QoBatchMessageBox.h>
+
+#include "CConversion.h"
+#include "CMainDlg.h"
+#include "resource.h"
+
+CQoConvertApp theApp;
+
+namespace {
+// The program's own error numbers.
+const int kErrorConversion = 2100;
+
+// File names in the project may be relative to the project folder.
+CQoString InProject(const CQoString& folder, const CQoString& file)
+{
+    bool absolute = (file.GetLength() >= 2 && file.GetAt(1) == ':')
+                    || (!file.IsEmpty() && (file.GetAt(0) == '\\' || file.GetAt(0) == '/'));
+    return absolute || file.IsEmpty() ? file : folder + "\\" + file;
+}
+}
+
+CQoConvertApp::CQoConvertApp()
+    : m_batch(false), m_exitCode(0)
+{
+}
+
+void CQoConvertApp::ParseArguments()
+{
+    for (int i = 1; i < __argc; ++i) {
+        const char* arg = __argv[i];
+        if (_stricmp(arg, "/batch") == 0 || _stricmp(arg, "-batch") == 0)
+            m_batch = true;
+        else
+            m_projectFolder = arg;
+    }
+    if (m_projectFolder.IsEmpty()) {
+        char current[MAX_PATH];
+        GetCurrentDirectoryA(MAX_PATH, current);
+        m_projectFolder = current;
+    }
+    while (m_projectFolder.GetLength() > 3
+           && (m_projectFolder.Right(1) == "\\" || m_projectFolder.Right(1) == "/"))
+        m_projectFolder = m_projectFolder.Left(m_projectFolder.GetLength() - 1);
+    m_projectFile = m_projectFolder + "\\qoconvert.ini";
+}
+
+BOOL CQoConvertApp::InitInstance()
+{
+    ParseArguments();
+
+    CQoString log = m_projectFolder + "\\qoconvert.log";
+    _theLog.Open(log);
+    _theLog << "qoconvert gestartet, Projekt " << (const char*)m_projectFolder
+            << (m_batch ? " (Batch)" : "") << CQoLog::endl;
+
+    QoBatchMessageBoxSetMode(m_batch);
+    CQoInterActive::SetQuiet(m_batch);
+    CQoErrorDlg::AddMessage(kErrorConversion, "Die Konvertierung ist fehlgeschlagen.");
+
+    if (m_batch) {
+        m_exitCode = Convert() ? 0 : 1;
+        return FALSE;  // no window, no message loop
+    }
+
+    CMainDlg dlg;
+    m_pMainWnd = &dlg;
+    dlg.DoModal();
+    m_pMainWnd = NULL;
+    return FALSE;
+}
+
+int CQoConvertApp::ExitInstance()
+{
+    _theLog << "qoconvert beendet mit " << (long)m_exitCode << CQoLog::endl;
+    _theLog.Close();
+    CWinApp::ExitInstance();
+    return m_exitCode;
+}
+
+bool CQoConvertApp::Convert()
+{
+    CQoConfigFile config;
+    config.Open(m_projectFile);
+    CConversion job;
+    job.ReadConfig(config);
+    if (job.m_inputFile.IsEmpty() || job.m_outputFile.IsEmpty()) {
+        CString text;
+        text.Format(IDS_NO_PROJECT, (const char*)m_projectFile);
+        QoBatchMessageBox(2101, IDOK, text, MB_OK | MB_ICONSTOP, 0);
+        return false;
+    }
+
+    job.m_inputFile = InProject(m_projectFolder, job.m_inputFile);
+    job.m_outputFile = InProject(m_projectFolder, job.m_outputFile);
+    try {
+        CWaitCursor wait;
+        long records = job.Run();
+        CString done;
+        done.Format(IDS_DONE, records, (const char*)job.m_outputFile);
+        QoBatchMessageBox(1001, IDOK, done, MB_OK | MB_ICONINFORMATION, 0);
+        return true;
+    } catch (const CQoException& e) {
+        if (m_batch)
+            // No window in batch mode: the log keeps the reason.
+            QoBatchMessageBox(kErrorConversion, IDOK, e.Message(), MB_OK | MB_ICONSTOP, 0);
+        else
+            CQoErrorDlg::ShowError(kErrorConversion, e.Message());
+        return false;
+    }
+}

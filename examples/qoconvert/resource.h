@@ -1,0 +1,18 @@
+// Resource ids of the sample program. They stay clear of the library's
+// (strings 1-43 and 362, dialogs 189 and 4006-4044).
+#pragma once
+
+#define IDR_MAINFRAME        128
+#define IDD_MAIN             130
+
+#define IDC_PROJECT          1000
+#define IDC_INPUT_FILE       1001
+#define IDC_INPUT_CHARSET    1002
+#define IDC_OUTPUT_FILE      1003
+#define IDC_OUTPUT_CHARSET   1004
+#define IDC_CONVERT          1005
+#define IDC_STATUS           1006
+
+#define IDS_APP_TITLE        5000
+#define IDS_DONE             5001
+#define IDS_NO_PROJECT       5002

@@ -1,0 +1,139 @@
+// The error dialog as the user sees it (read from the real window) and the two
+// log lines it leaves.
+#include <afxwin.h>
+
+#include <CQoErrorDlg.h>
+#include <DialogDriver.h>
+#include <QoBatchMessageBox.h>
+#include <Capture.h>
+#include <resource.h>
+
+#include "FrameTestUtil.h"
+
+using namespace frametest;
+
+namespace {
+
+const char kBuiltIn[] = "Dies ist ein Testeintrag f\xFCr einen Fehler der qomfcext DLL";
+
+class ErrorDlg : public LogFixture
+{
+protected:
+    void TearDown() override
+    {
+        // Put the library's own registration back for the next test.
+        CQoErrorDlg::ClearAllMessages();
+        CQoErrorDlg::AddMessage(20001, kBuiltIn);
+        QoBatchMessageBoxSetMode(false);
+        LogFixture::TearDown();
+    }
+
+    // Shows the error and returns what the window showed.
+    struct Seen
+    {
+        std::string title, message, info;
+        bool cancelVisible = true, okVisible = false, hasIcon = false;
+    };
+    Seen Show(int code, const char* info)
+    {
+        Seen seen;
+        qotest::DialogDriver driver;
+        driver.Expect([&](qotest::Dialog& d) {
+            seen.title = d.Title();
+            seen.message = d.Text(IDC_ERROR_MESSAGE);
+            seen.info = d.Text(IDC_ERROR_INFO);
+            seen.cancelVisible = d.IsVisible(IDCANCEL);
+            seen.okVisible = d.IsVisible(IDOK);
+            seen.hasIcon = d.Send(0xFFFF, STM_GETICON) != 0;
+            d.Press(IDOK);
+        });
+        CQoErrorDlg::ShowError(code, info);
+        EXPECT_TRUE(driver.Done());
+        EXPECT_EQ(0, driver.Unanswered());
+        return seen;
+    }
+};
+
+}  // namespace
+
+TEST_F(ErrorDlg, ShowsNumberRegisteredTextAndInformation)
+{
+    Seen seen = Show(20001, "erste Zeile\nzweite Zeile");
+    EXPECT_EQ("Fehler", seen.title);
+    EXPECT_EQ(std::string("Es ist der Fehler 20001 aufgetreten.\n") + kBuiltIn, seen.message);
+    EXPECT_EQ("erste Zeile\r\nzweite Zeile", seen.info);
+    EXPECT_TRUE(seen.okVisible);
+    EXPECT_FALSE(seen.cancelVisible);
+    EXPECT_TRUE(seen.hasIcon);
+
+    std::vector<std::string> expected = {
+        std::string("ERR: Es ist der Fehler 20001 aufgetreten.;") + kBuiltIn,
+        "ERR: erste Zeile;zweite Zeile"};
+    EXPECT_EQ(expected, Entries());
+}
+
+TEST_F(ErrorDlg, InformationWithCrLfKeepsOneBreakPerLine)
+{
+    Seen seen = Show(20001, "a\r\nb\nc");
+    EXPECT_EQ("a\r\nb\r\nc", seen.info);
+    EXPECT_EQ("ERR: a;b;c", Entries().at(1));
+}
+
+TEST_F(ErrorDlg, UnregisteredNumberEndsAfterTheLineBreak)
+{
+    Seen seen = Show(777, "");
+    EXPECT_EQ("Es ist der Fehler 777 aufgetreten.\n", seen.message);
+    EXPECT_EQ("", seen.info);
+    std::vector<std::string> expected = {"ERR: Es ist der Fehler 777 aufgetreten.;", "ERR: "};
+    EXPECT_EQ(expected, Entries());
+}
+
+TEST_F(ErrorDlg, RegistrationsReplaceClearAndVanish)
+{
+    CQoErrorDlg::AddMessage(2107, "Die Eingabedatei fehlt.");
+    CQoErrorDlg::AddMessage(2107, "Die Eingabedatei ist leer.");
+    EXPECT_EQ("Es ist der Fehler 2107 aufgetreten.\nDie Eingabedatei ist leer.",
+              Show(2107, "x").message);
+
+    CQoErrorDlg::ClearMessage(2107);
+    EXPECT_EQ("Es ist der Fehler 2107 aufgetreten.\n", Show(2107, "x").message);
+
+    CQoErrorDlg::ClearAllMessages();
+    EXPECT_EQ("Es ist der Fehler 20001 aufgetreten.\n", Show(20001, "x").message);
+}
+
+TEST_F(ErrorDlg, MessageTextWithLineBreaksIsOneLogLine)
+{
+    CQoErrorDlg::AddMessage(2200, "Zeile eins\r\nZeile zwei\nZeile drei");
+    Show(2200, "info");
+    EXPECT_EQ("ERR: Es ist der Fehler 2200 aufgetreten.;Zeile eins;Zeile zwei;Zeile drei",
+              Entries().at(0));
+}
+
+TEST_F(ErrorDlg, StringIdFormAndBatchModeStillShow)
+{
+    QoBatchMessageBoxSetMode(true);
+    std::string info;
+    qotest::DialogDriver driver;
+    driver.Expect([&](qotest::Dialog& d) {
+        info = d.Text(IDC_ERROR_INFO);
+        d.Press(IDOK);
+    });
+    CQoErrorDlg::ShowError(20001, (UINT)IDS_COL_OFFSET);
+    EXPECT_EQ(1, driver.Seen());
+    EXPECT_EQ("Offset", info);
+    EXPECT_EQ("ERR: Offset", Entries().at(1));
+}
+
+TEST_F(ErrorDlg, CaptureOfTheDialog)
+{
+    std::string png;
+    qotest::DialogDriver driver;
+    driver.Expect([&](qotest::Dialog& d) {
+        png = qotest::CapturePath("error-dialog-4037.png");
+        EXPECT_TRUE(qotest::CaptureWindow(d.Hwnd(), png.c_str()));
+        d.Press(IDOK);
+    });
+    CQoErrorDlg::ShowError(20001, "Datei: C:\\daten\\kunden.txt\nZeile 17");
+    EXPECT_TRUE(FileExists(png));
+}

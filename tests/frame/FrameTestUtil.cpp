@@ -1,0 +1,121 @@
+#include "FrameTestUtil.h"
+
+#include <windows.h>
+#include <shellapi.h>
+
+#include <cctype>
+#include <cstdio>
+
+#include <CQoLog.h>
+
+namespace frametest {
+
+ScratchDir::ScratchDir()
+{
+    char temp[MAX_PATH];
+    GetTempPathA(MAX_PATH, temp);
+    static int counter = 0;
+    char name[MAX_PATH];
+    snprintf(name, sizeof name, "%sqoframe_%lu_%d", temp, GetCurrentProcessId(), ++counter);
+    m_path = name;
+    CreateDirectoryA(m_path.c_str(), NULL);
+}
+
+ScratchDir::~ScratchDir()
+{
+    std::string from = m_path + std::string(2, '\0');
+    SHFILEOPSTRUCTA op = {};
+    op.wFunc = FO_DELETE;
+    op.pFrom = from.c_str();
+    op.fFlags = FOF_NOCONFIRMATION | FOF_NOERRORUI | FOF_SILENT;
+    SHFileOperationA(&op);
+}
+
+std::string ReadFile(const std::string& path)
+{
+    std::string bytes;
+    FILE* f = fopen(path.c_str(), "rb");
+    if (!f)
+        return bytes;
+    char buffer[4096];
+    size_t n;
+    while ((n = fread(buffer, 1, sizeof buffer, f)) > 0)
+        bytes.append(buffer, n);
+    fclose(f);
+    return bytes;
+}
+
+void WriteFile(const std::string& path, const std::string& bytes)
+{
+    FILE* f = fopen(path.c_str(), "wb");
+    ASSERT_NE(nullptr, f) << path;
+    fwrite(bytes.data(), 1, bytes.size(), f);
+    fclose(f);
+}
+
+bool FileExists(const std::string& path)
+{
+    return GetFileAttributesA(path.c_str()) != INVALID_FILE_ATTRIBUTES;
+}
+
+std::vector<std::string> ReadLines(const std::string& path)
+{
+    std::vector<std::string> lines;
+    std::string bytes = ReadFile(path);
+    size_t start = 0;
+    while (start < bytes.size()) {
+        size_t end = bytes.find("\r\n", start);
+        if (end == std::string::npos) {
+            ADD_FAILURE() << "line without CR LF at the end of " << path;
+            lines.push_back(bytes.substr(start));
+            break;
+        }
+        lines.push_back(bytes.substr(start, end - start));
+        start = end + 2;
+    }
+    return lines;
+}
+
+std::string AfterPrefix(const std::string& line)
+{
+    // "Mmm dd yyyy, hh:mm:ss > "
+    static const char shape[] = "Aaa 00 0000, 00:00:00 > ";
+    const size_t n = sizeof shape - 1;
+    bool ok = line.size() >= n;
+    for (size_t i = 0; ok && i < n; ++i) {
+        unsigned char c = line[i];
+        switch (shape[i]) {
+        case 'A': ok = isupper(c); break;
+        case 'a': ok = islower(c); break;
+        case '0': ok = isdigit(c); break;
+        default: ok = c == (unsigned char)shape[i]; break;
+        }
+    }
+    if (!ok) {
+        ADD_FAILURE() << "no time prefix: '" << line << "'";
+        return line;
+    }
+    return line.substr(n);
+}
+
+void LogFixture::SetUp()
+{
+    m_log = m_dir.File("test.log");
+    _theLog.Close();
+    _theLog.Open(m_log.c_str());
+}
+
+void LogFixture::TearDown()
+{
+    _theLog.Close();
+}
+
+std::vector<std::string> LogFixture::Entries() const
+{
+    std::vector<std::string> entries;
+    for (const std::string& line : Lines())
+        entries.push_back(AfterPrefix(line));
+    return entries;
+}
+
+}  // namespace frametest

@@ -1,0 +1,31 @@
+#!/bin/sh
+# Builds the Windows binaries and runs the sample program qoconvert in batch
+# mode on the shipped sample project: a customer list in Windows-1252 is
+# converted to DOS code page 850. Prints the program's log and both files.
+set -e
+here=$(cd "$(dirname "$0")" && pwd)
+repo=$(dirname "$here")
+cd "$repo"
+
+cmake -S . -B build/win -DCMAKE_TOOLCHAIN_FILE=cmake/mingw-w64-x86_64.cmake >/dev/null
+cmake --build build/win -j "$(nproc)" --target qoconvert
+
+project=build/sample-project
+rm -rf "$project"
+mkdir -p "$project"
+iconv -f UTF-8 -t CP1252 examples/qoconvert/sample/kunden.txt.utf8 > "$project/kunden.txt"
+printf '[Eingabe]\r\nDatei=kunden.txt\r\nZeichensatz=0\r\n[Ausgabe]\r\nDatei=kunden-dos.txt\r\nZeichensatz=1\r\n' \
+  > "$project/qoconvert.ini"
+
+# The program runs in the project folder, so the files are named relative to it.
+"$here/session" sh -c "cd '$project' && wine '$repo/build/win/bin/qoconvert.exe' /batch ." && rc=0 || rc=$?
+
+echo "--- qoconvert.log"
+cat "$project/qoconvert.log"
+echo "--- kunden.txt (Windows-1252)"
+od -c "$project/kunden.txt" | head -n 4
+if [ -f "$project/kunden-dos.txt" ]; then
+  echo "--- kunden-dos.txt (code page 850), read back as UTF-8:"
+  iconv -f CP850 -t UTF-8 "$project/kunden-dos.txt"
+fi
+exit $rc
