@@ -1,0 +1,295 @@
+#include "Capture.h"
+
+#include "DialogDriver.h"
+#include "Input.h"
+
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+
+namespace qotest {
+
+namespace {
+
+uint32_t Crc32(const uint8_t* data, size_t n, uint32_t crc = 0)
+{
+    static uint32_t table[256];
+    static bool ready = false;
+    if (!ready) {
+        for (uint32_t i = 0; i < 256; ++i) {
+            uint32_t c = i;
+            for (int k = 0; k < 8; ++k) c = (c & 1) ? 0xEDB88320u ^ (c >> 1) : c >> 1;
+            table[i] = c;
+        }
+        ready = true;
+    }
+    crc = ~crc;
+    for (size_t i = 0; i < n; ++i) crc = table[(crc ^ data[i]) & 0xFF] ^ (crc >> 8);
+    return ~crc;
+}
+
+uint32_t Adler32(const uint8_t* data, size_t n)
+{
+    uint32_t a = 1, b = 0;
+    for (size_t i = 0; i < n; ++i) {
+        a = (a + data[i]) % 65521;
+        b = (b + a) % 65521;
+    }
+    return (b << 16) | a;
+}
+
+void Put32(std::vector<uint8_t>& v, uint32_t x)
+{
+    v.push_back(static_cast<uint8_t>(x >> 24));
+    v.push_back(static_cast<uint8_t>(x >> 16));
+    v.push_back(static_cast<uint8_t>(x >> 8));
+    v.push_back(static_cast<uint8_t>(x));
+}
+
+uint32_t Get32(const uint8_t* p)
+{
+    return (uint32_t(p[0]) << 24) | (uint32_t(p[1]) << 16) | (uint32_t(p[2]) << 8) | p[3];
+}
+
+void Chunk(std::vector<uint8_t>& png, const char* type, const std::vector<uint8_t>& data)
+{
+    Put32(png, static_cast<uint32_t>(data.size()));
+    size_t start = png.size();
+    png.insert(png.end(), type, type + 4);
+    png.insert(png.end(), data.begin(), data.end());
+    Put32(png, Crc32(&png[start], png.size() - start));
+}
+
+const uint8_t kSignature[8] = {0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'};
+
+int Paeth(int a, int b, int c)
+{
+    int p = a + b - c, pa = std::abs(p - a), pb = std::abs(p - b), pc = std::abs(p - c);
+    if (pa <= pb && pa <= pc) return a;
+    return pb <= pc ? b : c;
+}
+
+}  // namespace
+
+COLORREF Image::Pixel(int x, int y) const
+{
+    if (x < 0 || y < 0 || x >= width || y >= height) return CLR_INVALID;
+    const uint8_t* p = &rgb[(static_cast<size_t>(y) * width + x) * 3];
+    return RGB(p[0], p[1], p[2]);
+}
+
+// ---------------------------------------------------------------------------------------------
+// Encoding
+
+bool EncodePng(const Image& img, std::vector<uint8_t>& png)
+{
+    if (img.width <= 0 || img.height <= 0 ||
+        img.rgb.size() != static_cast<size_t>(img.width) * img.height * 3)
+        return false;
+    // Raw scan lines, each with filter type 0 (none).
+    const size_t row = static_cast<size_t>(img.width) * 3;
+    std::vector<uint8_t> raw;
+    raw.reserve((row + 1) * img.height);
+    for (int y = 0; y < img.height; ++y) {
+        raw.push_back(0);
+        raw.insert(raw.end(), img.rgb.begin() + y * row, img.rgb.begin() + (y + 1) * row);
+    }
+    // zlib stream of stored deflate blocks (at most 65535 bytes each).
+    std::vector<uint8_t> z = {0x78, 0x01};
+    size_t pos = 0;
+    do {
+        size_t n = std::min<size_t>(65535, raw.size() - pos);
+        bool last = pos + n == raw.size();
+        z.push_back(last ? 1 : 0);
+        z.push_back(static_cast<uint8_t>(n));
+        z.push_back(static_cast<uint8_t>(n >> 8));
+        z.push_back(static_cast<uint8_t>(~n));
+        z.push_back(static_cast<uint8_t>(~n >> 8));
+        z.insert(z.end(), raw.begin() + pos, raw.begin() + pos + n);
+        pos += n;
+    } while (pos < raw.size());
+    Put32(z, Adler32(raw.data(), raw.size()));
+
+    png.assign(kSignature, kSignature + 8);
+    std::vector<uint8_t> ihdr;
+    Put32(ihdr, static_cast<uint32_t>(img.width));
+    Put32(ihdr, static_cast<uint32_t>(img.height));
+    ihdr.insert(ihdr.end(), {8, 2, 0, 0, 0});  // 8 bits, RGB, deflate, adaptive filters, no interlace
+    Chunk(png, "IHDR", ihdr);
+    Chunk(png, "IDAT", z);
+    Chunk(png, "IEND", {});
+    return true;
+}
+
+bool WritePng(const Image& img, const char* path)
+{
+    std::vector<uint8_t> png;
+    if (!EncodePng(img, png)) return false;
+    FILE* f = std::fopen(path, "wb");
+    if (!f) return false;
+    bool ok = std::fwrite(png.data(), 1, png.size(), f) == png.size();
+    ok = std::fclose(f) == 0 && ok;
+    return ok;
+}
+
+// ---------------------------------------------------------------------------------------------
+// Decoding
+
+bool DecodePng(const std::vector<uint8_t>& png, Image& out)
+{
+    if (png.size() < 8 || std::memcmp(png.data(), kSignature, 8) != 0) return false;
+    size_t pos = 8;
+    int width = 0, height = 0;
+    bool header = false, end = false;
+    std::vector<uint8_t> z;
+    while (!end) {
+        if (png.size() - pos < 12) return false;
+        uint32_t len = Get32(&png[pos]);
+        if (len > png.size() - pos - 12) return false;
+        const uint8_t* type = &png[pos + 4];
+        const uint8_t* data = &png[pos + 8];
+        if (Crc32(type, len + 4) != Get32(data + len)) return false;
+        if (!std::memcmp(type, "IHDR", 4)) {
+            if (len != 13 || data[8] != 8 || data[9] != 2 || data[10] || data[11] || data[12]) return false;
+            width = static_cast<int>(Get32(data));
+            height = static_cast<int>(Get32(data + 4));
+            if (width <= 0 || height <= 0 || width > 1 << 15 || height > 1 << 15) return false;
+            header = true;
+        } else if (!std::memcmp(type, "IDAT", 4)) {
+            z.insert(z.end(), data, data + len);
+        } else if (!std::memcmp(type, "IEND", 4)) {
+            end = true;
+        } else if (!(type[0] & 0x20)) {
+            return false;  // an unknown critical chunk
+        }
+        pos += 12 + len;
+    }
+    if (!header || z.size() < 6) return false;
+    if ((z[0] & 0x0F) != 8 || ((z[0] << 8) | z[1]) % 31 != 0 || (z[1] & 0x20)) return false;
+
+    std::vector<uint8_t> raw;
+    size_t zp = 2;
+    for (bool last = false; !last;) {
+        if (zp + 5 > z.size()) return false;
+        uint8_t head = z[zp];
+        last = head & 1;
+        if ((head >> 1) & 3) return false;  // only stored blocks
+        size_t n = z[zp + 1] | (z[zp + 2] << 8);
+        size_t nn = z[zp + 3] | (z[zp + 4] << 8);
+        if ((n ^ 0xFFFF) != nn || zp + 5 + n > z.size()) return false;
+        raw.insert(raw.end(), z.begin() + zp + 5, z.begin() + zp + 5 + n);
+        zp += 5 + n;
+    }
+    if (zp + 4 > z.size() || Get32(&z[zp]) != Adler32(raw.data(), raw.size())) return false;
+
+    const size_t row = static_cast<size_t>(width) * 3;
+    if (raw.size() != (row + 1) * height) return false;
+    out.Resize(width, height);
+    for (int y = 0; y < height; ++y) {
+        const uint8_t* src = &raw[y * (row + 1)];
+        uint8_t* dst = &out.rgb[y * row];
+        const uint8_t* up = y ? dst - row : nullptr;
+        uint8_t filter = src[0];
+        for (size_t i = 0; i < row; ++i) {
+            int a = i >= 3 ? dst[i - 3] : 0, b = up ? up[i] : 0, c = (up && i >= 3) ? up[i - 3] : 0;
+            int v = src[1 + i];
+            switch (filter) {
+            case 0: break;
+            case 1: v += a; break;
+            case 2: v += b; break;
+            case 3: v += (a + b) / 2; break;
+            case 4: v += Paeth(a, b, c); break;
+            default: return false;
+            }
+            dst[i] = static_cast<uint8_t>(v);
+        }
+    }
+    return true;
+}
+
+bool ReadPng(const char* path, Image& out)
+{
+    FILE* f = std::fopen(path, "rb");
+    if (!f) return false;
+    std::vector<uint8_t> png;
+    uint8_t buf[65536];
+    size_t n;
+    while ((n = std::fread(buf, 1, sizeof buf, f)) > 0) png.insert(png.end(), buf, buf + n);
+    std::fclose(f);
+    return DecodePng(png, out);
+}
+
+// ---------------------------------------------------------------------------------------------
+// Capturing
+
+bool CaptureImage(HWND hwnd, Image& out, bool clientOnly)
+{
+    if (!IsWindow(hwnd)) return false;
+    BringToFront(hwnd);
+    RedrawWindow(hwnd, nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_FRAME | RDW_ALLCHILDREN | RDW_UPDATENOW);
+    PumpFor(150);
+
+    RECT rc;
+    if (clientOnly) {
+        GetClientRect(hwnd, &rc);
+        MapWindowPoints(hwnd, nullptr, reinterpret_cast<POINT*>(&rc), 2);
+    } else {
+        GetWindowRect(hwnd, &rc);
+    }
+    const int w = rc.right - rc.left, h = rc.bottom - rc.top;
+    if (w <= 0 || h <= 0) return false;
+
+    BITMAPINFO bi = {};
+    bi.bmiHeader.biSize = sizeof(BITMAPINFOHEADER);
+    bi.bmiHeader.biWidth = w;
+    bi.bmiHeader.biHeight = -h;  // top-down
+    bi.bmiHeader.biPlanes = 1;
+    bi.bmiHeader.biBitCount = 24;
+    bi.bmiHeader.biCompression = BI_RGB;
+    void* bits = nullptr;
+    HDC screen = GetDC(nullptr);
+    HDC mem = CreateCompatibleDC(screen);
+    HBITMAP dib = CreateDIBSection(screen, &bi, DIB_RGB_COLORS, &bits, nullptr, 0);
+    bool ok = false;
+    if (mem && dib && bits) {
+        HGDIOBJ old = SelectObject(mem, dib);
+        ok = BitBlt(mem, 0, 0, w, h, screen, rc.left, rc.top, SRCCOPY) != FALSE;
+        GdiFlush();
+        SelectObject(mem, old);
+        if (ok) {
+            out.Resize(w, h);
+            const size_t stride = (static_cast<size_t>(w) * 3 + 3) & ~size_t(3);
+            const uint8_t* src = static_cast<const uint8_t*>(bits);
+            for (int y = 0; y < h; ++y)
+                for (int x = 0; x < w; ++x) {
+                    const uint8_t* p = src + y * stride + x * 3;  // blue, green, red
+                    uint8_t* d = &out.rgb[(static_cast<size_t>(y) * w + x) * 3];
+                    d[0] = p[2];
+                    d[1] = p[1];
+                    d[2] = p[0];
+                }
+        }
+    }
+    if (dib) DeleteObject(dib);
+    if (mem) DeleteDC(mem);
+    ReleaseDC(nullptr, screen);
+    return ok;
+}
+
+bool CaptureWindow(HWND hwnd, const char* pngPath, bool clientOnly)
+{
+    Image img;
+    return CaptureImage(hwnd, img, clientOnly) && WritePng(img, pngPath);
+}
+
+std::string CapturePath(const std::string& fileName)
+{
+    const char* dir = std::getenv("QO_CAPTURE_DIR");
+    std::string folder = dir && *dir ? dir : ".";
+    CreateDirectoryA(folder.c_str(), nullptr);  // one level; an existing folder is fine
+    char last = folder.back();
+    if (last != '/' && last != '\\') folder += folder.find('/') != std::string::npos ? '/' : '\\';
+    return folder + fileName;
+}
+
+}  // namespace qotest

@@ -1,0 +1,166 @@
+// DialogDriver.h — answers the modal dialogs and message boxes that a test opens.
+//
+// A modal dialog or message box blocks the thread that opens it, so a test cannot answer it
+// "afterwards". Instead the test queues one script per expected dialog before it opens the first:
+//
+//     qotest::DialogDriver driver;                       // hooks the calling thread
+//     driver.Expect([](qotest::Dialog& d) {              // the first dialog that appears
+//         EXPECT_EQ("Frage", d.Title());
+//         EXPECT_EQ("Weiter?", d.MessageText());
+//         d.Press(IDYES);
+//     });
+//     int answer = MessageBoxA(nullptr, "Weiter?", "Frage", MB_YESNO);
+//     EXPECT_EQ(IDYES, answer);
+//     EXPECT_TRUE(driver.Done());                        // every queued script ran
+//     EXPECT_EQ(0, driver.Unanswered());                 // none had to be closed by force
+//
+// How it works: a thread CBT hook sees each top-level dialog (class "#32770") activate. A moment
+// later (a timer on the dialog, which the dialog's own modal loop dispatches, so the dialog is fully
+// initialised) the next queued script runs on it. Scripts run on the test thread, inside the
+// dialog's modal loop, so gtest's EXPECT_* work there. ASSERT_* cannot abort a script (it returns
+// from the lambda only); use EXPECT_* and plain returns.
+//
+// Pressing a button posts WM_COMMAND, as a click does; the dialog reacts when the script has
+// returned. A script that must see the reaction (a button that opens a nested box, a value that
+// changes) pumps with qotest::WaitFor/PumpFor inside the script; a nested dialog that opens during
+// that pump is handled by the next queued script.
+//
+// Robustness: if a dialog is still open some time after its script ran (or no script was queued
+// for it, or the script threw), the driver closes it (IDCANCEL, then WM_CLOSE, then EndDialog) and
+// counts it in Unanswered(); the reason is kept in Errors() and, unless switched off, the running
+// test fails. A dialog that is disabled because a
+// nested modal box is open over it is left alone until that box has gone.
+#pragma once
+
+#include <windows.h>
+
+#include <deque>
+#include <functional>
+#include <set>
+#include <string>
+#include <vector>
+
+namespace qotest {
+
+// Pumps the calling thread's messages for about `ms` milliseconds.
+void PumpFor(DWORD ms);
+
+// Pumps messages until `done()` is true or `ms` milliseconds have passed; answers `done()`.
+bool WaitFor(const std::function<bool()>& done, DWORD ms);
+
+// A control's position and size, relative to the dialog's client area.
+struct ControlRect {
+    int x = 0, y = 0, cx = 0, cy = 0;
+};
+
+// The icon that a message box shows.
+enum class IconKind { None, Information, Warning, Error, Question, Other };
+
+// A live dialog or message box handed to a script. Non-owning; valid while the script runs.
+// Every action on a missing or disabled control is a test failure (gtest ADD_FAILURE) naming the
+// dialog and the control, and answers false.
+class Dialog {
+public:
+    explicit Dialog(HWND hwnd) : m_hwnd(hwnd) {}
+
+    // Reading
+    HWND Hwnd() const { return m_hwnd; }
+    HWND Item(int id) const { return GetDlgItem(m_hwnd, id); }
+    std::string Title() const;
+    std::string Text(int id) const;        // window text of a control (empty if missing)
+    std::string MessageText() const;       // the text of a message box (control 0xFFFF)
+    bool Exists(int id) const { return Item(id) != nullptr; }
+    bool IsVisible(int id) const;
+    bool IsEnabled(int id) const;
+    bool IsChecked(int id) const;          // BM_GETCHECK == BST_CHECKED
+    int Selection(int comboOrListId) const;  // current selection index, -1 if none
+    std::vector<std::string> ComboItems(int id) const;
+    std::vector<std::string> ListItems(int id) const;
+    std::string ClassName(int id) const;
+    ControlRect RectPixels(int id) const;  // in the dialog's client coordinates
+    ControlRect RectDlu(int id) const;     // the same in dialog units (as a template states them)
+    std::vector<int> ButtonIds() const;    // visible push buttons of a message box (IDOK, IDYES, ...)
+    IconKind Icon() const;                 // icon of a message box
+
+    // Acting as a user would
+    // Replaces the text of an edit (or of a combo box's edit) the way typing does: the control
+    // itself sends EN_CHANGE (CBN_EDITCHANGE for a combo box). Other controls get WM_SETTEXT.
+    bool SetText(int id, const std::string& text);
+    // Gives the control the focus and sends one WM_CHAR per character; the text goes where the
+    // caret or selection is, exactly as keystrokes would.
+    bool Type(int id, const std::string& text);
+    // Clicks a check box or radio button (BM_CLICK) until its state is `checked`.
+    bool Check(int id, bool checked = true);
+    // Selects entry `index` of a combo box or list box and notifies the parent with
+    // CBN_SELCHANGE / LBN_SELCHANGE (the latter only with LBS_NOTIFY, as the list box itself does).
+    bool Select(int comboOrListId, int index);
+    bool SelectText(int comboOrListId, const std::string& text);  // by exact item text
+    // Posts WM_COMMAND(id, BN_CLICKED) as a click on the button does (IDYES etc. for a message box).
+    bool Press(int buttonId);
+    // Posts WM_COMMAND(IDCANCEL) as the Escape key does, whether or not a Cancel button exists.
+    void Cancel();
+    // Sends a message to a control (for what the helpers above do not cover).
+    LRESULT Send(int id, UINT msg, WPARAM wp = 0, LPARAM lp = 0) const;
+
+private:
+    HWND Control(int id, const char* action, bool mustBeEnabled) const;
+
+    HWND m_hwnd;
+};
+
+using DialogScript = std::function<void(Dialog&)>;
+
+// Runs queued scripts on the modal dialogs that appear on the thread that constructed it.
+// One driver per thread at a time; not copyable.
+class DialogDriver {
+public:
+    DialogDriver();
+    ~DialogDriver();
+    DialogDriver(const DialogDriver&) = delete;
+    DialogDriver& operator=(const DialogDriver&) = delete;
+
+    // Queues the script for the next dialog that appears (after the ones already queued).
+    void Expect(DialogScript script);
+
+    // Tuning: delay between activation and the script (default 80 ms); how long a dialog may stay
+    // open after its script before the driver closes it (default 3000 ms).
+    void SetDelay(UINT ms) { m_delay = ms; }
+    void SetTimeout(UINT ms) { m_timeout = ms; }
+    // Whether an unanswered or unexpected dialog and a throwing script also fail the running test
+    // at once (default true). Tests of the driver itself switch it off and check the counts.
+    void SetReportFailures(bool report) { m_reportFailures = report; }
+
+    // Results
+    bool Done() const { return m_queue.empty() && m_running == 0; }  // every script ran
+    int Pending() const { return static_cast<int>(m_queue.size()); }
+    int Seen() const { return static_cast<int>(m_titles.size()); }     // dialogs that appeared
+    const std::vector<std::string>& Titles() const { return m_titles; }
+    int Unanswered() const { return static_cast<int>(m_unanswered.size()); }
+    const std::vector<std::string>& UnansweredTitles() const { return m_unanswered; }
+    const std::vector<std::string>& Errors() const { return m_errors; }
+
+private:
+    struct Watch {
+        HWND hwnd;
+        bool scripted;   // a script ran (or is running) for it
+        int stage;       // how far the forced closing has gone
+    };
+    static LRESULT CALLBACK CbtProc(int code, WPARAM wp, LPARAM lp);
+    static void CALLBACK TimerProc(HWND hwnd, UINT msg, UINT_PTR id, DWORD time);
+    void OnActivate(HWND hwnd);
+    void OnDestroy(HWND hwnd);
+    void RunScript(HWND hwnd);
+    void CheckClosed(HWND hwnd);
+    Watch* Find(HWND hwnd);
+
+    HHOOK m_hook = nullptr;
+    DialogDriver* m_previous = nullptr;
+    std::deque<DialogScript> m_queue;
+    std::vector<Watch> m_watch;
+    std::vector<std::string> m_titles, m_unanswered, m_errors;
+    UINT m_delay = 80, m_timeout = 3000;
+    int m_running = 0;
+    bool m_reportFailures = true;
+};
+
+}  // namespace qotest

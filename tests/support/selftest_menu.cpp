@@ -1,0 +1,132 @@
+// The popup-menu driver on real menus shown by TrackPopupMenu, also from a real right click.
+#include "DialogDriver.h"
+#include "Input.h"
+#include "MenuDriver.h"
+#include "selftest_window.h"
+
+#include <gtest/gtest-spi.h>
+#include <gtest/gtest.h>
+
+namespace {
+
+using qotest::Menu;
+using qotest::MenuDriver;
+
+enum { kOpen = 201, kDelete = 202, kMarked = 203, kDeep = 204 };
+
+HMENU MakeMenu()
+{
+    HMENU sub = CreatePopupMenu();
+    AppendMenuA(sub, MF_STRING, kDeep, "Tiefer");
+    HMENU m = CreatePopupMenu();
+    AppendMenuA(m, MF_STRING, kOpen, "&\xd6" "ffnen\tStrg+O");
+    AppendMenuA(m, MF_SEPARATOR, 0, nullptr);
+    AppendMenuA(m, MF_STRING | MF_GRAYED, kDelete, "L\xf6schen");
+    AppendMenuA(m, MF_STRING | MF_CHECKED, kMarked, "&Markiert");
+    AppendMenuA(m, MF_POPUP, reinterpret_cast<UINT_PTR>(sub), "Mehr");
+    SetMenuDefaultItem(m, kOpen, FALSE);
+    return m;
+}
+
+int Track(HWND owner, HMENU menu, UINT flags = TPM_RETURNCMD)
+{
+    POINT pt = qotest::ToScreen(owner, 40, 40);
+    return TrackPopupMenu(menu, flags | TPM_LEFTALIGN | TPM_TOPALIGN, pt.x, pt.y, 0, owner, nullptr);
+}
+
+TEST(MenuDriver, ReadsTheItemsAndChoosesOneByClicking)
+{
+    selftest::RecordingWindow win(300, 200);
+    HMENU menu = MakeMenu();
+    MenuDriver menus;
+    menus.Expect([&](Menu& m) {
+        EXPECT_EQ(menu, m.Handle());
+        EXPECT_EQ(win.Hwnd(), m.Owner());
+        std::vector<qotest::MenuItem> items = m.Items();
+        ASSERT_EQ(5u, items.size());
+        EXPECT_EQ("&\xd6" "ffnen\tStrg+O", items[0].text);
+        EXPECT_EQ("\xd6" "ffnen", items[0].label);
+        EXPECT_TRUE(items[0].isDefault);
+        EXPECT_TRUE(items[0].enabled);
+        EXPECT_TRUE(items[1].separator);
+        EXPECT_EQ(UINT(kDelete), items[2].id);
+        EXPECT_FALSE(items[2].enabled);
+        EXPECT_TRUE(items[2].grayed);
+        EXPECT_TRUE(items[3].checked);
+        EXPECT_FALSE(items[3].isDefault);
+        EXPECT_NE(nullptr, items[4].submenu);
+        EXPECT_EQ((std::vector<std::string>{"\xd6" "ffnen", "", "L\xf6schen", "Markiert", "Mehr"}), m.Labels());
+        EXPECT_TRUE(m.Has(kMarked));
+        EXPECT_FALSE(m.Has(kDeep));  // in the submenu only
+        m.Choose(kMarked);
+    });
+    EXPECT_EQ(kMarked, Track(win.Hwnd(), menu));
+    EXPECT_TRUE(menus.Done());
+    EXPECT_EQ(1, menus.Seen());
+    EXPECT_EQ(0, menus.Unanswered());
+    DestroyMenu(menu);
+}
+
+TEST(MenuDriver, CancelAndRefusingADisabledItem)
+{
+    selftest::RecordingWindow win(300, 200);
+    HMENU menu = MakeMenu();
+    MenuDriver menus;
+    menus.Expect([&](Menu& m) {
+        EXPECT_NONFATAL_FAILURE(m.Choose(kDelete), "disabled");
+        m.Cancel();
+    });
+    menus.Expect([&](Menu& m) { m.ChooseLabel("\xd6" "ffnen"); });
+    EXPECT_EQ(0, Track(win.Hwnd(), menu));
+    // Without TPM_RETURNCMD the choice arrives as WM_COMMAND at the owner.
+    EXPECT_NE(0, Track(win.Hwnd(), menu, 0));
+    qotest::PumpFor(50);
+    std::vector<selftest::Event> commands = win.Of(WM_COMMAND);
+    ASSERT_EQ(1u, commands.size());
+    EXPECT_EQ(WPARAM(kOpen), LOWORD(commands[0].wp));
+    EXPECT_TRUE(menus.Done());
+    EXPECT_EQ(2, menus.Seen());
+    DestroyMenu(menu);
+}
+
+TEST(MenuDriver, ContextMenuFromARealRightClick)
+{
+    selftest::RecordingWindow win(300, 200);
+    HMENU menu = MakeMenu();
+    int chosen = -1;
+    POINT at = {};
+    win.onContextMenu = [&](int x, int y) {
+        at = {x, y};
+        chosen = TrackPopupMenu(menu, TPM_RETURNCMD | TPM_RIGHTBUTTON, x, y, 0, win.Hwnd(), nullptr);
+    };
+    MenuDriver menus;
+    menus.Expect([](Menu& m) { m.Choose(kOpen); });
+    qotest::RightClick(win.Hwnd(), 60, 70);
+    EXPECT_TRUE(qotest::WaitFor([&] { return chosen != -1; }, 3000));
+    EXPECT_EQ(kOpen, chosen);
+    POINT expected = qotest::ToScreen(win.Hwnd(), 60, 70);
+    EXPECT_EQ(expected.x, at.x);
+    EXPECT_EQ(expected.y, at.y);
+    EXPECT_TRUE(menus.Done());
+    DestroyMenu(menu);
+}
+
+TEST(MenuDriver, ClosesAMenuNoScriptAnswers)
+{
+    selftest::RecordingWindow win(300, 200);
+    HMENU menu = MakeMenu();
+    MenuDriver menus;
+    menus.SetReportFailures(false);
+    menus.SetTimeout(300);
+    menus.Expect([](Menu&) {});
+    DWORD start = GetTickCount();
+    EXPECT_EQ(0, Track(win.Hwnd(), menu));  // left open by its script
+    EXPECT_EQ(0, Track(win.Hwnd(), menu));  // no script at all
+    EXPECT_LT(GetTickCount() - start, 5000u);
+    EXPECT_EQ(2, menus.Unanswered());
+    EXPECT_EQ(2, menus.Seen());
+    EXPECT_EQ(2u, menus.Errors().size());
+    DestroyMenu(menu);
+}
+
+}  // namespace
