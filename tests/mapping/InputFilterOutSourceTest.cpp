@@ -1,0 +1,142 @@
+// Reading an output filter source back as an input filter: no source, the
+// rows and columns through the selection and conversions, and ownership.
+#include "MappingTestSource.h"
+
+#include <CQoInputFilterOutSource.h>
+
+#include <string>
+#include <vector>
+
+using mappingtest::TableSource;
+
+namespace {
+
+TableSource ThreeRows()
+{
+    return TableSource({"Name", "Ort"}, {{"Müller", "Köln"}, {"Weiß", ""}, {"", ""}});
+}
+
+std::string Field(CQoInputFilter& f, int col)
+{
+    CQoString value("vorher");
+    f.Value(col, value);
+    return value.GetString();
+}
+
+// Every row reached through FirstRow/NextRow, fields joined by '|'.
+std::vector<std::string> Walk(CQoInputFilter& f)
+{
+    std::vector<std::string> rows;
+    for (bool ok = f.FirstRow(); ok; ok = f.NextRow()) {
+        std::string row;
+        for (int c = 0; c < f.NumCols(); ++c)
+            row += (c ? "|" : "") + Field(f, c);
+        rows.push_back(row);
+    }
+    return rows;
+}
+
+} // namespace
+
+TEST(InputFilterOutSource, WithoutSourceThereIsNothingAndNothingIsWritten)
+{
+    CQoInputFilterOutSource f;
+    EXPECT_EQ(nullptr, f.GetOutputSource());
+    EXPECT_EQ(0, f.NumCols());
+    EXPECT_EQ(0L, f.NumRows());
+    EXPECT_FALSE(f.FirstRow());
+    EXPECT_FALSE(f.NextRow());
+    EXPECT_EQ("vorher", Field(f, 0));
+    CQoString name("vorher");
+    f.ColName(0, name);
+    EXPECT_STREQ("vorher", name);
+
+    TableSource s = ThreeRows();
+    f.SetOutputSource(&s);
+    f.SetOutputSource(nullptr);
+    EXPECT_EQ(0, f.NumCols());
+    EXPECT_EQ("vorher", Field(f, 0));
+}
+
+TEST(InputFilterOutSource, RowsAreTheSourceRowsFromRowZero)
+{
+    TableSource s = ThreeRows();
+    CQoInputFilterOutSource f;
+    f.SetOutputSource(&s);
+    EXPECT_EQ(2, f.NumCols());
+    EXPECT_EQ(3L, f.NumRows());
+    // Attaching stands on the first row.
+    EXPECT_EQ("Müller", Field(f, 0));
+    EXPECT_EQ((std::vector<std::string>{"Müller|Köln", "Weiß|", "|"}), Walk(f));
+    // After the last row NextRow stays there.
+    EXPECT_FALSE(f.NextRow());
+    EXPECT_EQ(2L, s.lastRow);
+    EXPECT_TRUE(f.EmptyRow());
+
+    EXPECT_TRUE(f.AbsoluteRow(1));
+    EXPECT_EQ("Weiß", Field(f, 0));
+    EXPECT_FALSE(f.EmptyRow());
+    EXPECT_FALSE(f.AbsoluteRow(3));
+}
+
+TEST(InputFilterOutSource, ColumnsFollowTheSelectionAndConversions)
+{
+    TableSource s = ThreeRows();
+    CQoInputFilterOutSource f;
+    f.SetOutputSource(&s);
+    s.ToFront("Ort");
+    s.SetNoUmlaute(true);
+    s.SetUseCapitals(true);
+    CQoString name;
+    f.ColName(0, name);
+    EXPECT_STREQ("Ort", name);
+    EXPECT_EQ((std::vector<std::string>{"KOELN|MUELLER", "|WEISS", "|"}), Walk(f));
+
+    s.SetSelected("Ort", false);
+    EXPECT_EQ(1, f.NumCols());
+    EXPECT_EQ("", Field(f, 1));   // beyond the selection: empty text
+    f.ColName(1, name);
+    EXPECT_STREQ("", name);
+}
+
+TEST(InputFilterOutSource, SmallSources)
+{
+    TableSource one({"A"}, {{"einzig"}});
+    CQoInputFilterOutSource f;
+    f.SetOutputSource(&one);
+    EXPECT_EQ((std::vector<std::string>{"einzig"}), Walk(f));
+
+    // No rows: no first row, and the host is never asked for a row.
+    TableSource none({"A"}, {});
+    f.SetOutputSource(&none);
+    EXPECT_FALSE(f.FirstRow());
+    EXPECT_FALSE(f.NextRow());
+    EXPECT_EQ("", Field(f, 0));
+    EXPECT_EQ(0, none.valueCalls);
+    EXPECT_TRUE(Walk(f).empty());
+}
+
+TEST(InputFilterOutSource, CopiesShareTheSourceAndNobodyDeletesIt)
+{
+    bool destroyed = false;
+    {
+        TableSource s = ThreeRows();
+        s.WatchDestruction(&destroyed);
+        {
+            CQoInputFilterOutSource f;
+            f.SetOutputSource(&s);
+            f.NextRow();
+            CQoInputFilterOutSource copy(f);
+            EXPECT_EQ(&s, copy.GetOutputSource());
+            EXPECT_EQ("Weiß", Field(copy, 0));
+            CQoInputFilterOutSource assigned;
+            assigned = copy;
+            EXPECT_EQ("Weiß", Field(assigned, 0));
+            assigned.FirstRow();
+            EXPECT_EQ("Weiß", Field(f, 0));   // each keeps its own row
+        }
+        EXPECT_FALSE(destroyed);
+        EXPECT_EQ(2, s.GetNumColumns());
+    }
+    EXPECT_TRUE(destroyed);
+}
