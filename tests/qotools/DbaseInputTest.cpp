@@ -1,0 +1,504 @@
+// The dBase input filter on real files: files written by python3-dbf and
+// checked against python3-dbfread, hand-made dBase III/IV files, and damaged
+// files of every kind.
+#include "CQoConfigFile.h"
+#include "CQoException.h"
+#include "CQoFile.h"
+#include "CQoInputFilterDbase34.h"
+
+#include "DbasePythonPeer.h"
+#include "TempFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <random>
+#include <string>
+#include <vector>
+
+namespace {
+
+struct Field {
+    std::string name;
+    char type;
+    int length;
+    int decimals;
+};
+
+// A dBase file built byte by byte here, independent of the library.
+std::string MakeDbf(std::vector<Field> const &fields, std::vector<std::string> const &records,
+                    unsigned char version = 0x03, unsigned char driver = 0x00, long declared = -1)
+{
+    int recordLength = 1;
+    for (Field const &f : fields)
+        recordLength += f.length;
+    int headerLength = 32 + 32 * int(fields.size()) + 1;
+    std::string h(std::size_t(headerLength), '\0');
+    unsigned long count = declared < 0 ? records.size() : std::size_t(declared);
+    h[0] = char(version);
+    h[1] = char(124);
+    h[2] = 5;
+    h[3] = 17;
+    for (int i = 0; i < 4; ++i)
+        h[4 + i] = char((count >> (8 * i)) & 0xFF);
+    h[8] = char(headerLength & 0xFF);
+    h[9] = char(headerLength >> 8);
+    h[10] = char(recordLength & 0xFF);
+    h[11] = char(recordLength >> 8);
+    h[29] = char(driver);
+    for (std::size_t i = 0; i < fields.size(); ++i) {
+        std::size_t d = 32 + 32 * i;
+        std::copy(fields[i].name.begin(), fields[i].name.end(), h.begin() + long(d));
+        h[d + 11] = fields[i].type;
+        h[d + 16] = char(fields[i].length);
+        h[d + 17] = char(fields[i].decimals);
+    }
+    h[std::size_t(headerLength) - 1] = 0x0D;
+    for (std::string const &r : records) {
+        EXPECT_EQ(std::size_t(recordLength), r.size()) << "test data: record length";
+        h += r;
+    }
+    return h + '\x1A';
+}
+
+std::string Pad(std::string text, std::size_t length, bool right = false)
+{
+    if (text.size() < length)
+        text = right ? std::string(length - text.size(), ' ') + text : text + std::string(length - text.size(), ' ');
+    return text;
+}
+
+std::vector<Field> const kTwoFields = {{"NAME", 'C', 10, 0}, {"NUM", 'N', 5, 0}};
+
+std::string Rec(std::string const &name, std::string const &num, bool deleted = false)
+{
+    return std::string(1, deleted ? '*' : ' ') + Pad(name, 10) + Pad(num, 5, true);
+}
+
+std::vector<std::string> Row(CQoInputFilterDbase34 &dbf)
+{
+    std::vector<std::string> row;
+    CQoString value;
+    for (int c = 0; c < dbf.NumCols(); ++c) {
+        dbf.Value(c, value);
+        row.push_back(value.Str());
+    }
+    return row;
+}
+
+std::vector<std::vector<std::string>> AllRows(CQoInputFilterDbase34 &dbf)
+{
+    std::vector<std::vector<std::string>> rows;
+    for (bool ok = dbf.FirstRow(); ok; ok = dbf.NextRow())
+        rows.push_back(Row(dbf));
+    return rows;
+}
+
+std::string InitError(std::string const &path)
+{
+    CQoInputFilterDbase34 dbf;
+    try {
+        dbf.Init(path.c_str());
+    } catch (CQoException const &e) {
+        return e.Message();
+    }
+    return std::string();
+}
+
+// Undoes the escaping of the peer scripts (\\ \t \n \r).
+std::string Unescape(std::string const &text)
+{
+    std::string out;
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == '\\' && i + 1 < text.size()) {
+            char c = text[++i];
+            out += c == 't' ? '\t' : c == 'n' ? '\n' : c == 'r' ? '\r' : c;
+        } else {
+            out += text[i];
+        }
+    }
+    return out;
+}
+
+std::vector<std::string> SplitTabs(std::string const &line)
+{
+    std::vector<std::string> parts;
+    std::string part;
+    for (char c : line) {
+        if (c == '\t') {
+            parts.push_back(Unescape(part));
+            part.clear();
+        } else {
+            part += c;
+        }
+    }
+    parts.push_back(Unescape(part));
+    return parts;
+}
+
+} // namespace
+
+// --- files written by python3-dbf -------------------------------------------------
+
+TEST(DbaseInputPeer, ReadsWhatPythonDbfWritesInBothCodePages)
+{
+    PeerFolder folder;
+    if (!folder.Usable())
+        PEER_UNAVAILABLE();
+    bool ran = RunPython(folder, "write", R"(
+import dbf, datetime
+for name, cp in (('dos.dbf', 'cp850'), ('win.dbf', 'cp1252')):
+    t = dbf.Table(os.path.join(folder, name), 'NAME C(20); BETRAG N(10,2); DATUM D; OK L',
+                  dbf_type='db3', codepage=cp)
+    t.open(dbf.READ_WRITE)
+    t.append(('M\u00fcller \u00c4\u00d6\u00dc\u00df', 12.5, datetime.date(2024, 1, 31), True))
+    t.append(('gel\u00f6scht', -3, None, False))
+    t.append(('  Dritter', None, None, None))
+    dbf.delete(t[1])
+    t.close()
+)");
+    if (!ran)
+        PEER_UNAVAILABLE();
+
+    for (char const *file : {"dos.dbf", "win.dbf"}) {
+        SCOPED_TRACE(file);
+        CQoInputFilterDbase34 dbf;
+        dbf.Init(folder.Path(file).c_str());
+        EXPECT_EQ(CQoInputFilter::filterDbase3, dbf.InputFilterType());
+        EXPECT_EQ(std::string(file) == "dos.dbf" ? CQoFile::ascii : CQoFile::ansi, dbf.RecordCharSet());
+        ASSERT_EQ(4, dbf.NumCols());
+        CQoString name;
+        dbf.ColName(1, name);
+        EXPECT_EQ("BETRAG", name);
+        CDbaseField field;
+        ASSERT_TRUE(dbf.GetFieldDesc(1, field));
+        EXPECT_EQ('N', field.Type());
+        EXPECT_EQ(10, field.Length());
+        EXPECT_EQ(2, field.Decimals());
+
+        // The deleted record is skipped.
+        EXPECT_EQ(2, dbf.NumRows());
+        auto rows = AllRows(dbf);
+        ASSERT_EQ(2u, rows.size());
+        EXPECT_EQ((std::vector<std::string>{"M\xFCller \xC4\xD6\xDC\xDF", "12.50", "20240131", "T"}), rows[0]);
+        EXPECT_EQ((std::vector<std::string>{"Dritter", "", "", "?"}), rows[1]);
+
+        // With deleted records read, the mark tells them apart.
+        dbf.SkipDeleted(false);
+        EXPECT_EQ(3, dbf.NumRows());
+        ASSERT_TRUE(dbf.AbsoluteRow(1));
+        EXPECT_TRUE(dbf.IsDeleted());
+        EXPECT_EQ("gel\xF6scht", Row(dbf)[0]);
+        ASSERT_TRUE(dbf.AbsoluteRow(2));
+        EXPECT_FALSE(dbf.IsDeleted());
+    }
+}
+
+TEST(DbaseInputPeer, EveryValueAndRowPositionAgreesWithDbfread)
+{
+    PeerFolder folder;
+    if (!folder.Usable())
+        PEER_UNAVAILABLE();
+    // 3000 records, every seventh deleted; dbfread (raw bytes) gives the
+    // expected text of every live record.
+    bool ran = RunPython(folder, "bigfile", R"(
+import dbf, dbfread, random
+random.seed(7)
+path = os.path.join(folder, 'big.dbf')
+t = dbf.Table(path, 'ID N(8,0); TEXT C(40); WERT N(12,3); TAG D', dbf_type='db3', codepage='cp850')
+t.open(dbf.READ_WRITE)
+letters = 'abc XYZ\u00e4\u00f6\u00fc\u00df;"\''
+for i in range(3000):
+    text = ''.join(random.choice(letters) for _ in range(random.randint(0, 40))).rstrip()
+    t.append((i, text, random.randint(-10**6, 10**6) / 1000.0, None))
+for i in range(0, 3000, 7):
+    dbf.delete(t[i])
+t.close()
+def esc(s):
+    return s.replace('\\', '\\\\').replace('\t', '\\t').replace('\n', '\\n').replace('\r', '\\r')
+with open(os.path.join(folder, 'expected.txt'), 'wb') as out:
+    table = dbfread.DBF(path, raw=True, encoding='cp850')
+    for rec in table:
+        vals = []
+        for name, value in rec.items():
+            text = value.decode('cp850')
+            text = text.rstrip(' \0') if name == 'TEXT' else text.strip(' \0')
+            vals.append(esc(text))
+        out.write(('\t'.join(vals) + '\n').encode('cp1252'))
+)");
+    if (!ran)
+        PEER_UNAVAILABLE();
+
+    std::vector<std::vector<std::string>> expected;
+    for (std::string const &line : ReadPeerLines(folder.Path("expected.txt")))
+        expected.push_back(SplitTabs(line));
+    ASSERT_EQ(3000u - 429u, expected.size());
+
+    CQoInputFilterDbase34 dbf;
+    dbf.Init(folder.Path("big.dbf").c_str());
+    EXPECT_EQ(long(expected.size()), dbf.NumRows());
+    EXPECT_EQ(expected, AllRows(dbf));
+
+    // Random positions agree with the sequential pass, and reading goes on
+    // from wherever AbsoluteRow put the filter.
+    std::mt19937 random(11);
+    for (int i = 0; i < 500; ++i) {
+        long row = long(random() % expected.size());
+        ASSERT_TRUE(dbf.AbsoluteRow(row)) << row;
+        ASSERT_EQ(expected[std::size_t(row)], Row(dbf)) << row;
+        if (std::size_t(row) + 1 < expected.size()) {
+            ASSERT_TRUE(dbf.NextRow());
+            ASSERT_EQ(expected[std::size_t(row) + 1], Row(dbf)) << row + 1;
+        }
+    }
+    EXPECT_TRUE(dbf.AbsoluteRow(long(expected.size()) - 1));
+    EXPECT_FALSE(dbf.NextRow());
+    EXPECT_FALSE(dbf.AbsoluteRow(long(expected.size())));
+    EXPECT_FALSE(dbf.AbsoluteRow(-1));
+}
+
+// --- hand-made files ----------------------------------------------------------
+
+TEST(DbaseInputFormat, DbaseFourAndTheCodePageOfTheFilter)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("four.dbf");
+    // Code page byte 0: the filter's character set decides (DOS by default).
+    WriteBytes(path, MakeDbf(kTwoFields, {Rec("\x84\x94\x81", "1"), Rec("  x", "-22")}, 0x04, 0x00));
+    CQoInputFilterDbase34 dbf;
+    EXPECT_EQ(CQoFile::ascii, dbf.CharSet());
+    dbf.Init(path.c_str());
+    EXPECT_EQ(CQoInputFilter::filterDbase4, dbf.InputFilterType());
+    EXPECT_EQ((std::vector<std::vector<std::string>>{{"\xE4\xF6\xFC", "1"}, {"  x", "-22"}}), AllRows(dbf));
+    // (text keeps its leading blanks, numbers lose theirs)
+
+    dbf.CharSet(CQoFile::ansi);
+    dbf.Init(path.c_str());
+    EXPECT_EQ("\x84\x94\x81", AllRows(dbf)[0][0]);
+}
+
+TEST(DbaseInputFormat, EmptyTableAndPositionsInTheFile)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("empty.dbf");
+    WriteBytes(path, MakeDbf(kTwoFields, {}));
+    CQoInputFilterDbase34 dbf;
+    dbf.Init(path.c_str());
+    EXPECT_EQ(2, dbf.NumCols());
+    EXPECT_EQ(0, dbf.NumRows());
+    EXPECT_FALSE(dbf.FirstRow());
+    EXPECT_FALSE(dbf.AbsoluteRow(0));
+    CQoString value("x");
+    dbf.Value(0, value);
+    EXPECT_TRUE(value.IsEmpty());
+    EXPECT_EQ(-1, dbf.getActPosInFile());
+
+    WriteBytes(path, MakeDbf(kTwoFields, {Rec("a", "1"), Rec("b", "2", true), Rec("c", "3")}));
+    dbf.Init(path.c_str());
+    ASSERT_TRUE(dbf.AbsoluteRow(1));
+    EXPECT_EQ("c", Row(dbf)[0]);
+    EXPECT_EQ(32 + 64 + 1 + 2 * 16, dbf.getActPosInFile());
+    EXPECT_TRUE(dbf.CreateIndexFile());
+    dbf.Value(7, value);
+    EXPECT_TRUE(value.IsEmpty());
+}
+
+TEST(DbaseInputFormat, DeletedRecordsEverywhere)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("del.dbf");
+    // Deleted at the start, in a run and at the end.
+    std::vector<std::string> recs;
+    std::vector<std::string> live;
+    for (int i = 0; i < 40; ++i) {
+        bool deleted = i < 3 || (i >= 10 && i < 20) || i >= 37 || i % 5 == 4;
+        recs.push_back(Rec("r" + std::to_string(i), std::to_string(i), deleted));
+        if (!deleted)
+            live.push_back("r" + std::to_string(i));
+    }
+    WriteBytes(path, MakeDbf(kTwoFields, recs));
+    CQoInputFilterDbase34 dbf;
+    dbf.Init(path.c_str());
+    ASSERT_EQ(long(live.size()), dbf.NumRows());
+    for (long r = long(live.size()) - 1; r >= 0; --r) {
+        ASSERT_TRUE(dbf.AbsoluteRow(r));
+        EXPECT_EQ(live[std::size_t(r)], Row(dbf)[0]);
+    }
+    // Without the index (NoCache) the same rows, found by walking.
+    dbf.NoCache(true);
+    ASSERT_TRUE(dbf.AbsoluteRow(5));
+    EXPECT_EQ(live[5], Row(dbf)[0]);
+}
+
+// --- damaged files ----------------------------------------------------------------
+
+TEST(DbaseInputDamaged, HeadersThatAreNotDbaseRaiseClearErrors)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("bad.dbf");
+    std::string good = MakeDbf(kTwoFields, {Rec("a", "1")});
+
+    EXPECT_NE(std::string::npos, InitError(tmp.Path("missing.dbf")).find("missing.dbf"));
+
+    struct Case {
+        char const *what;
+        std::string bytes;
+        char const *expect;
+    };
+    std::string wrongVersion = good;
+    wrongVersion[0] = char(0x30);
+    std::string longHeader = good;
+    longHeader[8] = char(0xFF);
+    longHeader[9] = char(0x7F);
+    std::string shortHeader = good;
+    shortHeader[8] = char(20);
+    shortHeader[9] = 0;
+    std::string cutDescriptor = good;
+    cutDescriptor[8] = char(32 + 32 + 16); // the second descriptor is cut
+    std::string zeroLength = good;
+    zeroLength[32 + 16] = 0;
+    std::string unknownType = good;
+    unknownType[32 + 11] = 'X';
+    std::string smallRecord = good;
+    smallRecord[10] = char(5);
+    std::string noFields = good;
+    noFields[32] = 0x0D;
+    std::string zeroRecordLength = good;
+    zeroRecordLength[10] = 0;
+
+    std::vector<Case> cases = {
+        {"zero bytes", "", "zu kurz"},
+        {"ten bytes", good.substr(0, 10), "zu kurz"},
+        {"header only half there", good.substr(0, 50), "abgeschnitten"},
+        {"version", wrongVersion, "Kennung 0x30"},
+        {"header longer than file", longHeader, "abgeschnitten"},
+        {"header shorter than possible", shortHeader, "L\xE4nge des dBase-Dateikopfs"},
+        {"descriptor cut", cutDescriptor, "Feldes 2 ist abgeschnitten"},
+        {"field of length 0", zeroLength, "NAME hat die L\xE4nge 0"},
+        {"unknown field type", unknownType, "0x58"},
+        {"fields longer than record", smallRecord, "passen nicht"},
+        {"no fields", noFields, "keine Felder"},
+        {"record length 0", zeroRecordLength, "Satzl\xE4nge"},
+    };
+    for (Case const &c : cases) {
+        SCOPED_TRACE(c.what);
+        WriteBytes(path, c.bytes);
+        std::string message = InitError(path);
+        EXPECT_NE(std::string::npos, message.find(c.expect)) << message;
+        EXPECT_NE(std::string::npos, message.find("bad.dbf")) << message;
+    }
+
+    // After a failed Init the filter is closed and harmless.
+    CQoInputFilterDbase34 dbf;
+    WriteBytes(path, cases[3].bytes);
+    EXPECT_THROW(dbf.Init(path.c_str()), CQoException);
+    EXPECT_FALSE(dbf.FirstRow());
+    EXPECT_FALSE(dbf.NextRow());
+    EXPECT_EQ(0, dbf.NumRows());
+}
+
+TEST(DbaseInputDamaged, RecordsMissingAtTheEndRaiseWhenReached)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("short.dbf");
+    // Declares 5 records; holds 3 and half of the fourth.
+    std::string bytes = MakeDbf(kTwoFields, {Rec("a", "1"), Rec("b", "2"), Rec("c", "3")}, 0x03, 0, 5);
+    bytes.pop_back(); // the end mark
+    bytes += Rec("d", "4").substr(0, 7);
+    WriteBytes(path, bytes);
+
+    CQoInputFilterDbase34 dbf;
+    dbf.SkipDeleted(false);
+    dbf.Init(path.c_str());
+    EXPECT_EQ(5, dbf.NumRows());
+    ASSERT_TRUE(dbf.FirstRow());
+    ASSERT_TRUE(dbf.NextRow());
+    ASSERT_TRUE(dbf.NextRow());
+    EXPECT_EQ("c", Row(dbf)[0]);
+    try {
+        dbf.NextRow();
+        FAIL() << "the missing record went unnoticed";
+    } catch (CQoException const &e) {
+        EXPECT_NE(std::string::npos, std::string(e.Message()).find("Satz 4 von 5")) << e.Message();
+    }
+    EXPECT_THROW(dbf.AbsoluteRow(4), CQoException);
+    EXPECT_TRUE(dbf.AbsoluteRow(0)); // what is there stays readable
+
+    // Counting the live rows meets the gap as well.
+    CQoInputFilterDbase34 counting;
+    counting.Init(path.c_str());
+    EXPECT_THROW(counting.NumRows(), CQoException);
+}
+
+TEST(DbaseInputDamaged, FileCutWhileReading)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("vanish.dbf");
+    std::vector<std::string> recs;
+    for (int i = 0; i < 20000; ++i)
+        recs.push_back(Rec("n" + std::to_string(i), std::to_string(i % 1000)));
+    WriteBytes(path, MakeDbf(kTwoFields, recs));
+    CQoInputFilterDbase34 dbf;
+    dbf.Init(path.c_str());
+    ASSERT_TRUE(dbf.FirstRow());
+    // Another program cuts the file down to its header.
+    std::filesystem::resize_file(path, 32 + 64 + 1);
+    bool raised = false;
+    try {
+        for (int i = 0; i < 20000 && dbf.NextRow(); ++i) {
+        }
+    } catch (CQoException const &e) {
+        raised = true;
+        EXPECT_NE(std::string::npos, std::string(e.Message()).find("vorzeitig")) << e.Message();
+    }
+    EXPECT_TRUE(raised);
+}
+
+// --- settings ------------------------------------------------------------------------
+
+TEST(DbaseInputConfig, SettingsRoundTripThroughTheConfigurationFile)
+{
+    CQoInputFilterDbase34 dbf;
+    dbf.SkipDeleted(false);
+    dbf.CharSet(CQoFile::ansi);
+    dbf.SetFirstRowHasNames(false);
+    CQoConfigFile cfg;
+    dbf.WriteConfig(cfg, "Eingabe");
+    CQoString text = cfg.ToText();
+
+    CQoConfigFile back;
+    back.FromText(text, std::size_t(text.GetLength()));
+    CQoInputFilterDbase34 copy;
+    EXPECT_TRUE(copy.SkipDeleted());
+    copy.ReadConfig(back, "Eingabe");
+    EXPECT_FALSE(copy.SkipDeleted());
+    EXPECT_EQ(CQoFile::ansi, copy.CharSet());
+
+    // A section without the keys keeps the settings.
+    CQoInputFilterDbase34 untouched;
+    untouched.ReadConfig(back, "Andere");
+    EXPECT_TRUE(untouched.SkipDeleted());
+    EXPECT_EQ(CQoFile::ascii, untouched.CharSet());
+
+    CQoInputFilterDbase34 copied;
+    copied.CopyFrom(dbf);
+    EXPECT_FALSE(copied.SkipDeleted());
+}
+
+TEST(DbaseInputConfig, DescriptionNamesFileAndFields)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("desc.dbf");
+    WriteBytes(path, MakeDbf({{"NAME", 'C', 10, 0}, {"BETRAG", 'N', 9, 2}}, {}, 0x03, 0x03));
+    CQoInputFilterDbase34 dbf;
+    dbf.Init(path.c_str());
+    std::vector<std::string> lines;
+    CQoString line;
+    for (bool ok = dbf.StartDescription(line); ok; ok = dbf.NextDescription(line))
+        lines.push_back(line.Str());
+    ASSERT_GE(lines.size(), 5u);
+    EXPECT_NE(std::string::npos, lines[0].find("dBase III"));
+    EXPECT_NE(std::string::npos, lines[2].find("Windows"));
+    EXPECT_EQ("BETRAG N(9,2)", lines.back());
+}

@@ -1,0 +1,112 @@
+// Independent peers for the file-format tests: the host's Python 3 with the
+// Debian packages python3-dbf (writes dBase files), python3-dbfread (reads
+// them) and the csv module.
+//
+// A test writes a Python script and its data into a PeerFolder and runs it
+// with RunPython; the script leaves its findings in files of the folder. On
+// Linux the folder is a temporary folder and Python runs directly. Under Wine
+// the folder is made below Z:\tmp (Wine's view of the host's /tmp) and
+// Python is started through Wine's `start /wait /unix`; when that is not
+// possible the peer check is skipped (and says so).
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <random>
+#include <sstream>
+#include <string>
+#include <vector>
+
+class PeerFolder {
+public:
+    PeerFolder()
+    {
+        std::random_device random;
+        std::string leaf = "qotools_peer_" + std::to_string(random()) + "_" + std::to_string(random());
+#ifdef _WIN32
+        std::error_code error;
+        if (std::filesystem::is_directory("Z:\\tmp", error)) {
+            m_path = std::filesystem::path("Z:\\tmp") / leaf;
+            m_unix = "/tmp/" + leaf;
+        }
+#else
+        m_path = std::filesystem::temp_directory_path() / leaf;
+        m_unix = m_path.string();
+#endif
+        if (!m_path.empty())
+            std::filesystem::create_directories(m_path);
+    }
+    ~PeerFolder()
+    {
+        std::error_code ignored;
+        if (!m_path.empty())
+            std::filesystem::remove_all(m_path, ignored);
+    }
+    PeerFolder(PeerFolder const &) = delete;
+    PeerFolder &operator=(PeerFolder const &) = delete;
+
+    bool Usable() const { return !m_path.empty(); }
+    // Path as this program opens it, and as the host's Python opens it.
+    std::string Path(char const *name) const { return (m_path / name).string(); }
+    std::string UnixPath(char const *name) const { return m_unix + "/" + name; }
+
+private:
+    std::filesystem::path m_path;
+    std::string m_unix;
+};
+
+// Writes `script` as <name>.py into the folder and runs it with the folder
+// (host path) as its only argument. Answers false when Python could not be
+// run at all; the script signals success by writing the file "done".
+inline bool RunPython(PeerFolder const &folder, char const *name, std::string const &script)
+{
+    std::string file = std::string(name) + ".py";
+    {
+        std::ofstream out(folder.Path(file.c_str()), std::ios::binary);
+        out << "import sys, os\nfolder = sys.argv[1]\n" << script
+            << "\nopen(os.path.join(folder, 'done'), 'w').write('ok')\n";
+    }
+    std::remove(folder.Path("done").c_str());
+#ifdef _WIN32
+    std::string command = "start /wait /unix /usr/bin/python3 " + folder.UnixPath(file.c_str()) + " " +
+                          folder.UnixPath("").substr(0, folder.UnixPath("").size() - 1) + " >NUL 2>&1";
+#else
+    std::string command = "/usr/bin/python3 " + folder.UnixPath(file.c_str()) + " " +
+                          folder.UnixPath("").substr(0, folder.UnixPath("").size() - 1) + " 2>" +
+                          folder.UnixPath("stderr.txt");
+#endif
+    std::system(command.c_str());
+    std::ifstream done(folder.Path("done"));
+    return done.good();
+}
+
+// The peer could not be run: fail natively (Python is part of the set-up),
+// skip under Wine, where starting a host program may be impossible.
+#ifdef _WIN32
+#define PEER_UNAVAILABLE() GTEST_SKIP() << "host Python cannot be started from this Wine session"
+#else
+#define PEER_UNAVAILABLE() FAIL() << "/usr/bin/python3 with dbf/dbfread did not run"
+#endif
+
+inline std::string ReadFileBytes(std::string const &path)
+{
+    std::ifstream in(path, std::ios::binary);
+    std::ostringstream all;
+    all << in.rdbuf();
+    return all.str();
+}
+
+// Lines of a file written by a peer script (LF separated, no trailing LF).
+inline std::vector<std::string> ReadPeerLines(std::string const &path)
+{
+    std::vector<std::string> lines;
+    std::string data = ReadFileBytes(path), line;
+    std::istringstream in(data);
+    while (std::getline(in, line))
+        lines.push_back(line);
+    return lines;
+}
