@@ -1,0 +1,333 @@
+#include "CQoConfigFile.h"
+#include "CQoException.h"
+#include "CQoFile.h"
+#include "CQoInputFilterTextVar.h"
+
+#include "TempFolder.h"
+#include "TextFilterTestSupport.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <filesystem>
+#include <random>
+#include <sstream>
+
+namespace {
+
+CQoInputFilterTextVar *OpenVar(std::string const &path, char delimiter = ';', bool names = false)
+{
+    auto *filter = new CQoInputFilterTextVar;
+    filter->Delimiter(delimiter);
+    filter->SetFirstRowHasNames(names);
+    filter->Init(path.c_str());
+    return filter;
+}
+
+struct Deleter {
+    void operator()(CQoInputFilter *f) const { f->Delete(); }
+};
+typedef std::unique_ptr<CQoInputFilterTextVar, Deleter> VarPtr;
+
+} // namespace
+
+TEST(TextVarReading, EnclosedFieldsHoldDelimitersQuotesAndLineBreaks)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("a.csv");
+    WriteBytes(path, "Name;Ort;Notiz\r\n"
+                     "\"M\xFCller; Hans\";Berlin;\"sagt \"\"hallo\"\"\"\r\n"
+                     "Meier;;\"zwei\r\nZeilen\"\r\n"
+                     ";;\n"
+                     "Schulz;Bonn;letzte ohne Zeilenende");
+    VarPtr f(OpenVar(path, ';', true));
+    ASSERT_EQ(3, f->NumCols());
+    CQoString name;
+    f->ColName(1, name);
+    EXPECT_EQ("Ort", name);
+    f->ColName(3, name);
+    EXPECT_EQ("", name);
+    std::vector<Row> rows = AllRows(*f);
+    ASSERT_EQ(4u, rows.size());
+    EXPECT_EQ((Row{"M\xFCller; Hans", "Berlin", "sagt \"hallo\""}), rows[0]);
+    EXPECT_EQ((Row{"Meier", "", "zwei\r\nZeilen"}), rows[1]);
+    EXPECT_EQ((Row{"", "", ""}), rows[2]);
+    EXPECT_TRUE(f->AbsoluteRow(2));
+    EXPECT_TRUE(f->EmptyRow());
+    EXPECT_EQ((Row{"Schulz", "Bonn", "letzte ohne Zeilenende"}), rows[3]);
+    EXPECT_EQ(4, f->NumRows());
+    EXPECT_EQ(CQoInputFilter::filterTextVar, f->InputFilterType());
+}
+
+TEST(TextVarReading, TabEscapeNoEncloserSkipAndShortRows)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("t.txt");
+    WriteBytes(path, "Kopfzeile \"ohne\" Ende\nnoch eine\n"
+                     "a\\\tb\t\"c\"\td\n"
+                     "x\n"
+                     "\"q\\\"q\"\t2\t3\t4\n");
+    CQoInputFilterTextVar f;
+    f.Delimiter('\t');
+    f.Escape('\\');
+    f.Skip(2);
+    f.Init(path.c_str());
+    ASSERT_EQ(4, f.NumCols());
+    std::vector<Row> rows = AllRows(f);
+    ASSERT_EQ(3u, rows.size());
+    EXPECT_EQ((Row{"a\tb", "c", "d", ""}), rows[0]);
+    EXPECT_EQ((Row{"x", "", "", ""}), rows[1]);
+    EXPECT_EQ((Row{"q\"q", "2", "3", "4"}), rows[2]);
+
+    f.Encloser(0);
+    f.Escape(0);
+    f.Init(path.c_str());
+    EXPECT_EQ((Row{"a\\", "b", "\"c\"", "d"}), AllRows(f)[0]);
+}
+
+TEST(TextVarReading, DosCharacterSetIsReadAsWindows1252)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("dos.csv");
+    WriteBytes(path, "Stra\xE1" "e;\x84rger\r\n\x8E;\x99\x9A\r\n");
+    CQoInputFilterTextVar f;
+    f.CharSet(CQoFile::ascii);
+    f.SetFirstRowHasNames(true);
+    f.Init(path.c_str());
+    CQoString name;
+    f.ColName(0, name);
+    EXPECT_EQ("Stra\xDF" "e", name);
+    ASSERT_TRUE(f.FirstRow());
+    EXPECT_EQ((Row{"\xC4", "\xD6\xDC"}), CurrentRow(f));
+}
+
+TEST(TextVarReading, EmptyAndMissingFiles)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("leer.csv");
+    WriteBytes(path, "");
+    CQoInputFilterTextVar f;
+    f.SetFirstRowHasNames(true);
+    f.Init(path.c_str());
+    EXPECT_EQ(0, f.NumCols());
+    EXPECT_EQ(0, f.NumRows());
+    EXPECT_FALSE(f.FirstRow());
+    EXPECT_FALSE(f.AbsoluteRow(0));
+    CQoString value("x");
+    f.Value(0, value);
+    EXPECT_EQ("", value);
+
+    try {
+        f.Init(tmp.Path("fehlt.csv").c_str());
+        FAIL() << "a missing file must raise";
+    } catch (CQoException const &e) {
+        EXPECT_NE(std::string::npos, std::string(e.Message()).find("fehlt.csv"));
+    }
+    EXPECT_FALSE(f.FirstRow());
+}
+
+TEST(TextVarIndex, AbsoluteRowSeeksToAnyRowInAnyOrder)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("n.csv");
+    std::string text = "id;wert\n";
+    for (int i = 0; i < 5000; ++i)
+        text += std::to_string(i) + ";\"w" + std::to_string(i * 7) + (i % 97 == 0 ? "\nx" : "") + "\"\n";
+    WriteBytes(path, text);
+    VarPtr f(OpenVar(path, ';', true));
+    EXPECT_TRUE(f->AbsoluteRow(4321)); // before any full pass: walks there
+    EXPECT_EQ("4321", CurrentRow(*f)[0]);
+    EXPECT_EQ(5000, f->NumRows());
+    EXPECT_EQ("4321", CurrentRow(*f)[0]) << "counting keeps the current row";
+    EXPECT_EQ(5000u * 8u, f->IndexBytes());
+    std::mt19937 random(7);
+    for (int k = 0; k < 2000; ++k) {
+        long row = static_cast<long>(random() % 5000);
+        ASSERT_TRUE(f->AbsoluteRow(row));
+        Row r = CurrentRow(*f);
+        ASSERT_EQ(std::to_string(row), r[0]);
+        ASSERT_EQ("w" + std::to_string(row * 7) + (row % 97 == 0 ? "\nx" : ""), r[1]);
+    }
+    EXPECT_FALSE(f->AbsoluteRow(5000));
+    EXPECT_FALSE(f->AbsoluteRow(-1));
+    ASSERT_TRUE(f->AbsoluteRow(4998));
+    EXPECT_TRUE(f->NextRow());
+    EXPECT_FALSE(f->NextRow());
+
+    f->NoCache(true);
+    EXPECT_EQ(0u, f->IndexBytes());
+    ASSERT_TRUE(f->AbsoluteRow(1234));
+    EXPECT_EQ("1234", CurrentRow(*f)[0]);
+    ASSERT_TRUE(f->AbsoluteRow(17));
+    EXPECT_EQ("17", CurrentRow(*f)[0]);
+}
+
+TEST(TextVarIndex, AFileCutShortWhileReadingRaises)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("kurz.csv");
+    std::string text;
+    for (int i = 0; i < 300000; ++i)
+        text += "zeile;" + std::to_string(i) + "\n";
+    WriteBytes(path, text);
+    VarPtr f(OpenVar(path));
+    ASSERT_EQ(300000, f->NumRows());
+    ASSERT_TRUE(f->AbsoluteRow(0)); // what is in memory now is the start
+    std::filesystem::resize_file(path, text.size() / 2);
+    EXPECT_THROW(f->AbsoluteRow(299999), CQoException);
+    // Still usable for what is left.
+    EXPECT_TRUE(f->AbsoluteRow(10));
+    EXPECT_EQ((Row{"zeile", "10"}), CurrentRow(*f));
+}
+
+TEST(TextVarDefects, WithoutHookADefectiveRecordRaisesWithItsRow)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("d.csv");
+    WriteBytes(path, "a;b\n1;2\n3;4;5\n6;7\n");
+    VarPtr f(OpenVar(path, ';', true));
+    ASSERT_TRUE(f->FirstRow());
+    try {
+        f->NextRow();
+        FAIL() << "three fields in a two-column file must raise";
+    } catch (CQoException const &e) {
+        EXPECT_EQ(CQoException::formatError, e.Code());
+        EXPECT_NE(std::string::npos, std::string(e.Message()).find("Satz 1"));
+    }
+    EXPECT_EQ(1, f->WrongInputCount());
+
+    WriteBytes(path, "a;b\n1;\"offen\n2;3\n");
+    f.reset(OpenVar(path, ';', true));
+    // The open encloser swallows the rest of the file: no record ends.
+    EXPECT_THROW(f->FirstRow(), CQoException);
+}
+
+TEST(TextVarDefects, HookSkipsTakesOverOrStops)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("r.csv");
+    WriteBytes(path, "a;b\n1;2\n3;4;5\n6;7\n8;9;10\n11;12\n");
+    {
+        RepairScript script({CQoInterActive::repairSkip, CQoInterActive::repairTakeOver},
+                            {"", "8;9+10\r\n"});
+        VarPtr f(OpenVar(path, ';', true));
+        std::vector<Row> rows = AllRows(*f);
+        ASSERT_EQ(2u, RepairScript::calls.size());
+        EXPECT_EQ("3;4;5\n6;7\n8;9;10\n11;12\n", RepairScript::calls[0].data);
+        EXPECT_EQ(6, RepairScript::calls[0].pos);
+        ASSERT_EQ(4u, rows.size());
+        EXPECT_EQ((Row{"6", "7"}), rows[1]);
+        EXPECT_EQ((Row{"8", "9+10"}), rows[2]);
+        EXPECT_EQ((Row{"11", "12"}), rows[3]);
+        // Going back does not ask again.
+        ASSERT_TRUE(f->AbsoluteRow(2));
+        EXPECT_EQ((Row{"8", "9+10"}), CurrentRow(*f));
+        EXPECT_EQ(4, f->NumRows());
+        EXPECT_EQ(2u, RepairScript::calls.size());
+    }
+    {
+        RepairScript script({CQoInterActive::repairStop});
+        VarPtr f(OpenVar(path, ';', true));
+        ASSERT_TRUE(f->FirstRow());
+        EXPECT_THROW(f->NextRow(), CQoException);
+    }
+}
+
+namespace {
+int correctionCalls = 0;
+int CorrectOnce(CQoString &record)
+{
+    ++correctionCalls;
+    record = "3;4,5";
+    return 1;
+}
+int GiveUp(CQoString &)
+{
+    ++correctionCalls;
+    return 0;
+}
+} // namespace
+
+TEST(TextVarDefects, ATakenOverRecordThatStillDoesNotFitGoesToTheCorrection)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("c.csv");
+    WriteBytes(path, "a;b\n3;4;5\n6;7\n");
+    {
+        RepairScript script({CQoInterActive::repairTakeOver}, {"3;4;5;6"});
+        CQoInterActive::SetCorrectRepair(&CorrectOnce);
+        correctionCalls = 0;
+        VarPtr f(OpenVar(path, ';', true));
+        std::vector<Row> rows = AllRows(*f);
+        EXPECT_EQ(1, correctionCalls);
+        ASSERT_EQ(2u, rows.size());
+        EXPECT_EQ((Row{"3", "4,5"}), rows[0]);
+        EXPECT_EQ((Row{"6", "7"}), rows[1]);
+    }
+    {
+        RepairScript script({CQoInterActive::repairTakeOver}, {"3;4;5;6"});
+        CQoInterActive::SetCorrectRepair(&GiveUp);
+        VarPtr f(OpenVar(path, ';', true));
+        EXPECT_THROW(f->FirstRow(), CQoException);
+    }
+}
+
+TEST(TextVarDefects, UnterminatedEncloserAtTheEndGoesToTheHook)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("u.csv");
+    WriteBytes(path, "1;2\n3;\"vier\n5;6");
+    RepairScript script({CQoInterActive::repairSkip});
+    VarPtr f(OpenVar(path));
+    // The offered next record is the line after the defective one.
+    std::vector<Row> rows = AllRows(*f);
+    ASSERT_EQ(1u, RepairScript::calls.size());
+    EXPECT_EQ("3;\"vier\n5;6", RepairScript::calls[0].data);
+    EXPECT_EQ(8, RepairScript::calls[0].pos);
+    ASSERT_EQ(2u, rows.size());
+    EXPECT_EQ((Row{"5", "6"}), rows[1]);
+}
+
+TEST(TextVarSettings, ConfigurationRoundTripAndCopy)
+{
+    CQoInputFilterTextVar a;
+    a.Delimiter('\t');
+    a.Encloser('\'');
+    a.Escape('\\');
+    a.Skip(3);
+    a.CharSet(CQoFile::ansimix);
+    a.SetFirstRowHasNames(true);
+    CQoConfigFile cfg;
+    a.WriteConfig(cfg, "Eingabe");
+    CQoConfigFile reread;
+    reread.FromText(cfg.ToText().GetString(), static_cast<std::size_t>(cfg.ToText().GetLength()));
+    CQoInputFilterTextVar b;
+    b.ReadConfig(reread, "Eingabe");
+    EXPECT_EQ('\t', b.Delimiter());
+    EXPECT_EQ('\'', b.Encloser());
+    EXPECT_EQ('\\', b.Escape());
+    EXPECT_EQ(3, b.Skip());
+    EXPECT_EQ(CQoFile::ansimix, b.CharSet());
+    EXPECT_TRUE(b.GetFirstRowHasNames());
+
+    CQoInputFilterTextVar c;
+    c.ReadConfig(reread, "Anderes"); // missing keys keep the presets
+    EXPECT_EQ(';', c.Delimiter());
+    EXPECT_EQ('"', c.Encloser());
+
+    c.CopyFrom(a);
+    EXPECT_EQ('\t', c.Delimiter());
+    EXPECT_EQ(3, c.Skip());
+    EXPECT_THROW(c.Delimiter('\n'), CQoException);
+
+    CQoString line;
+    ASSERT_TRUE(a.StartDescription(line));
+    int lines = 1;
+    bool sawTab = false;
+    while (a.NextDescription(line)) {
+        ++lines;
+        sawTab = sawTab || line == "Trennzeichen: [TAB]";
+    }
+    EXPECT_TRUE(sawTab);
+    EXPECT_GE(lines, 6);
+}
