@@ -89,8 +89,8 @@ public:
     CQoFile &operator=(CQoFile const &) = delete;
 
     // --- opening and closing -------------------------------------------------
-    // Closes a file that is open, then opens `path`. False when it cannot be
-    // opened (missing for read, no permission, a folder, ...).
+    // Closes a file that is open (as Close does), then opens `path`. False
+    // when it cannot be opened (missing for read, no permission, a folder, ...).
     bool Open(char const *path, int mode);
     // As Open, but raises CQoException (fileNotFound or cannotOpen) instead.
     void OpenOrThrow(char const *path, int mode);

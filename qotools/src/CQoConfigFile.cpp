@@ -193,24 +193,14 @@ bool CQoConfigFile::GetValue(char const *section, char const *key, int &value) c
 
 bool CQoConfigFile::SetValue(char const *section, char const *key, char const *value)
 {
-    if (!section || !*section || !key || !*key)
-        return false;
-    CQoString copy(value); // value may live inside this configuration
-    Section &s = MakeSection(section);
-    for (Entry &entry : s.entries)
-        if (entry.key.CompareNoCase(key) == 0) {
-            entry.value = copy;
-            return true;
-        }
-    s.entries.push_back(Entry{CQoString(key), copy});
-    return true;
+    return SetValue(section, key, CQoString(value));
 }
 
 bool CQoConfigFile::SetValue(char const *section, char const *key, CQoString const &value)
 {
     if (!section || !*section || !key || !*key)
         return false;
-    CQoString copy(value);
+    CQoString copy(value); // value may live inside this configuration
     Section &s = MakeSection(section);
     for (Entry &entry : s.entries)
         if (entry.key.CompareNoCase(key) == 0) {

@@ -42,10 +42,13 @@ TEST(CQoException, CodedErrorsCarryTheGermanTableText)
 
     // Every code of the table has its own text.
     int const codes[] = {1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 19};
-    for (int a : codes)
-        for (int b : codes)
-            if (a != b)
+    for (int a : codes) {
+        for (int b : codes) {
+            if (a != b) {
                 EXPECT_STRNE(CQoException::CodeText(a), CQoException::CodeText(b));
+            }
+        }
+    }
 
     e = Caught([] { CQoException::Throw(777, "x"); });
     EXPECT_EQ(777, e.Code());
