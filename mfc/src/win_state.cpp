@@ -130,7 +130,13 @@ HINSTANCE SearchChain(Pred has) {
     }
   }
   ReleaseSRWLockShared(&g_moduleState.m_lock);
-  return hFound;
+  if (hFound != NULL) return hFound;
+  // Last, MFC's own resources (its prompts) in this DLL.
+  HMODULE hSelf = NULL;
+  ::GetModuleHandleExA(GET_MODULE_HANDLE_EX_FLAG_FROM_ADDRESS | GET_MODULE_HANDLE_EX_FLAG_UNCHANGED_REFCOUNT,
+                       (LPCSTR)&AfxFindResourceHandle, &hSelf);
+  if (hSelf != NULL && has(hSelf)) return hSelf;
+  return NULL;
 }
 
 // TRUE if the string table of hInst has a non-empty string nID.

@@ -1,0 +1,393 @@
+// Message maps on real windows: commands, control notifications, ranges,
+// WM_NOTIFY, registered messages, window messages, reflection to the control,
+// owner-drawn controls, the handle map and exceptions in handlers.
+#include "afxwin.h"
+
+#include <gtest/gtest.h>
+
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#include "dialog_script.h"
+
+namespace {
+
+const UINT ID_BASE_ONLY = 100;
+const UINT ID_BOTH = 101;
+const UINT ID_RANGE_FIRST = 200;
+const UINT ID_RANGE_LAST = 209;
+const UINT IDC_BUTTON = 300;
+const UINT IDC_EDIT = 301;
+const UINT IDC_REFLECT_EDIT = 302;
+const UINT IDC_EX_BUTTON = 303;
+const UINT IDC_NOTIFIER = 304;
+const UINT IDC_DRAWLIST = 305;
+const UINT WM_APP_SUM = WM_APP + 1;
+const UINT WM_APP_THROW_STD = WM_APP + 2;
+const UINT WM_APP_THROW_USER = WM_APP + 3;
+const UINT WM_APP_THROW_INT = WM_APP + 4;
+const UINT WM_APP_THROW_MFC = WM_APP + 5;
+
+UINT g_nRegistered = ::RegisterWindowMessageA("QoMfcWndTests.Registered");
+
+class CProbeBase : public CWnd {
+public:
+  std::vector<std::string> m_log;
+  void Log(const std::string& s) { m_log.push_back(s); }
+
+protected:
+  afx_msg void OnBaseOnly() { Log("base-only"); }
+  afx_msg void OnBothInBase() { Log("both-in-base"); }
+  DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CProbeBase, CWnd)
+  ON_COMMAND(ID_BASE_ONLY, OnBaseOnly)
+  ON_COMMAND(ID_BOTH, OnBothInBase)
+END_MESSAGE_MAP()
+
+class CProbeWnd : public CProbeBase {
+public:
+  BOOL m_bAttachedInCreate = FALSE;
+  CSize m_size;
+  UINT m_nCtlColorType = 99;
+  CBrush m_brParent{RGB(1, 2, 3)};
+  BOOL m_bPostNcDestroy = FALSE;
+
+protected:
+  afx_msg int OnCreate(LPCREATESTRUCT lpcs) {
+    m_bAttachedInCreate = FromHandlePermanent(m_hWnd) == this;
+    return CWnd::OnCreate(lpcs);
+  }
+  afx_msg void OnBoth() { Log("both"); }
+  afx_msg void OnRange(UINT nID) { Log("range " + std::to_string(nID)); }
+  afx_msg void OnButton() { Log("button"); }
+  afx_msg void OnEditChange() { Log("edit-change"); }
+  afx_msg void OnReflectEditChange() { Log("parent-saw-reflected-edit"); }
+  afx_msg void OnExButton() { Log("parent-ex-button"); }
+  afx_msg void OnNotifier(NMHDR* pNMHDR, LRESULT* pResult) {
+    Log("notify " + std::to_string((int)pNMHDR->code));
+    *pResult = 5;
+  }
+  afx_msg void OnNotifyRange(UINT nID, NMHDR*, LRESULT* pResult) {
+    Log("notify-range " + std::to_string(nID));
+    *pResult = 6;
+  }
+  afx_msg BOOL OnNotifyEx(UINT nID, NMHDR*, LRESULT* pResult) {
+    Log("notify-ex " + std::to_string(nID));
+    *pResult = 8;
+    return TRUE;
+  }
+  afx_msg LRESULT OnSum(WPARAM wParam, LPARAM lParam) { return (LRESULT)(wParam + lParam); }
+  afx_msg LRESULT OnRegistered(WPARAM wParam, LPARAM) { return 1000 + (LRESULT)wParam; }
+  afx_msg LRESULT OnThrowStd(WPARAM, LPARAM) { throw std::runtime_error("kaputt im Handler"); }
+  afx_msg LRESULT OnThrowUser(WPARAM, LPARAM) { AfxThrowUserException(); return 1; }
+  afx_msg LRESULT OnThrowInt(WPARAM, LPARAM) { throw 42; }
+  afx_msg LRESULT OnThrowMfc(WPARAM, LPARAM) { AfxThrowNotSupportedException(); return 1; }
+  afx_msg void OnSize(UINT nType, int cx, int cy) {
+    CWnd::OnSize(nType, cx, cy);
+    m_size = CSize(cx, cy);
+  }
+  afx_msg HBRUSH OnCtlColor(CDC*, CWnd*, UINT nCtlColor) {
+    m_nCtlColorType = nCtlColor;
+    return m_brParent;
+  }
+  virtual void PostNcDestroy() { m_bPostNcDestroy = TRUE; }
+  DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CProbeWnd, CProbeBase)
+  ON_WM_CREATE()
+  ON_COMMAND(ID_BOTH, OnBoth)
+  ON_COMMAND_RANGE(ID_RANGE_FIRST, ID_RANGE_LAST, OnRange)
+  ON_BN_CLICKED(IDC_BUTTON, OnButton)
+  ON_EN_CHANGE(IDC_EDIT, OnEditChange)
+  ON_EN_CHANGE(IDC_REFLECT_EDIT, OnReflectEditChange)
+  ON_BN_CLICKED(IDC_EX_BUTTON, OnExButton)
+  ON_NOTIFY(NM_CLICK, IDC_NOTIFIER, OnNotifier)
+  ON_NOTIFY_RANGE(NM_DBLCLK, 400, 409, OnNotifyRange)
+  ON_NOTIFY_EX(NM_RCLICK, 410, OnNotifyEx)
+  ON_MESSAGE(WM_APP_SUM, OnSum)
+  ON_REGISTERED_MESSAGE(g_nRegistered, OnRegistered)
+  ON_MESSAGE(WM_APP_THROW_STD, OnThrowStd)
+  ON_MESSAGE(WM_APP_THROW_USER, OnThrowUser)
+  ON_MESSAGE(WM_APP_THROW_INT, OnThrowInt)
+  ON_MESSAGE(WM_APP_THROW_MFC, OnThrowMfc)
+  ON_WM_SIZE()
+  ON_WM_CTLCOLOR()
+END_MESSAGE_MAP()
+
+// An edit control that handles its own change notification and colour.
+class CReflectEdit : public CEdit {
+public:
+  int m_nChanges = 0;
+  CBrush m_brOwn{RGB(4, 5, 6)};
+
+protected:
+  afx_msg void OnChange() { m_nChanges++; }
+  afx_msg HBRUSH CtlColor(CDC*, UINT) { return m_brOwn; }
+  DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CReflectEdit, CEdit)
+  ON_CONTROL_REFLECT(EN_CHANGE, OnChange)
+  ON_WM_CTLCOLOR_REFLECT()
+END_MESSAGE_MAP()
+
+// A button that sees its click first but lets the parent see it too.
+class CReflectExButton : public CButton {
+public:
+  int m_nClicks = 0;
+
+protected:
+  afx_msg BOOL OnClicked() {
+    m_nClicks++;
+    return FALSE;
+  }
+  DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CReflectExButton, CButton)
+  ON_CONTROL_REFLECT_EX(BN_CLICKED, OnClicked)
+END_MESSAGE_MAP()
+
+// A control that handles its own WM_NOTIFY code.
+class CNotifyReflector : public CWnd {
+public:
+  int m_nClicks = 0;
+
+protected:
+  afx_msg void OnClick(NMHDR*, LRESULT* pResult) {
+    m_nClicks++;
+    *pResult = 3;
+  }
+  DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CNotifyReflector, CWnd)
+  ON_NOTIFY_REFLECT(NM_CLICK, OnClick)
+END_MESSAGE_MAP()
+
+class COwnerDrawList : public CListBox {
+public:
+  std::vector<int> m_drawn;
+  int m_nMeasured = 0;
+  virtual void DrawItem(LPDRAWITEMSTRUCT lpDIS) {
+    if ((int)lpDIS->itemID >= 0) m_drawn.push_back((int)lpDIS->itemID);
+  }
+  virtual void MeasureItem(LPMEASUREITEMSTRUCT lpMIS) {
+    m_nMeasured++;
+    lpMIS->itemHeight = 21;
+  }
+};
+
+class MessageMapTest : public ::testing::Test {
+protected:
+  void SetUp() override {
+    ASSERT_TRUE(m_wnd.CreateEx(0, NULL, "Probe", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 10, 10, 400, 300, NULL, NULL));
+  }
+  void TearDown() override {
+    if (::IsWindow(m_wnd.m_hWnd)) m_wnd.DestroyWindow();
+  }
+  HWND MakeChild(LPCSTR lpszClass, DWORD dwStyle, UINT nID, int y) {
+    return ::CreateWindowExA(0, lpszClass, "", WS_CHILD | WS_VISIBLE | dwStyle, 10, y, 120, 20, m_wnd.m_hWnd,
+                             (HMENU)(UINT_PTR)nID, ::GetModuleHandleA(NULL), NULL);
+  }
+  LRESULT SendNotify(HWND hWndFrom, UINT nID, int nCode) {
+    NMHDR hdr;
+    hdr.hwndFrom = hWndFrom;
+    hdr.idFrom = nID;
+    hdr.code = (UINT)nCode;
+    return m_wnd.SendMessage(WM_NOTIFY, nID, (LPARAM)&hdr);
+  }
+  CProbeWnd m_wnd;
+};
+
+TEST_F(MessageMapTest, WindowIsAttachedBeforeWmCreateAndUnknownMessagesReachTheWindowProcedure) {
+  EXPECT_TRUE(m_wnd.m_bAttachedInCreate);
+  EXPECT_EQ(&m_wnd, CWnd::FromHandlePermanent(m_wnd.m_hWnd));
+  m_wnd.SetWindowText("Neuer Titel");
+  CString strTitle;
+  m_wnd.GetWindowText(strTitle);
+  EXPECT_STREQ("Neuer Titel", strTitle);
+}
+
+TEST_F(MessageMapTest, CommandsGoToTheMostDerivedEntryAndFallBackToTheBaseMap) {
+  m_wnd.SendMessage(WM_COMMAND, ID_BOTH, 0);
+  m_wnd.SendMessage(WM_COMMAND, ID_BASE_ONLY, 0);
+  m_wnd.SendMessage(WM_COMMAND, ID_RANGE_FIRST + 3, 0);
+  m_wnd.SendMessage(WM_COMMAND, ID_RANGE_LAST + 1, 0); // no handler
+  EXPECT_EQ((std::vector<std::string>{"both", "base-only", "range 203"}), m_wnd.m_log);
+}
+
+TEST_F(MessageMapTest, ControlNotificationsFromRealControls) {
+  HWND hButton = MakeChild("BUTTON", BS_PUSHBUTTON, IDC_BUTTON, 10);
+  HWND hEdit = MakeChild("EDIT", ES_AUTOHSCROLL, IDC_EDIT, 40);
+  ::SendMessageA(hButton, BM_CLICK, 0, 0);
+  ::SetWindowTextA(hEdit, "abc");
+  EXPECT_EQ((std::vector<std::string>{"button", "edit-change"}), m_wnd.m_log);
+}
+
+TEST_F(MessageMapTest, NotificationsSingleRangeAndExtendedWithTheirResults) {
+  HWND hFrom = MakeChild("STATIC", 0, IDC_NOTIFIER, 10);
+  EXPECT_EQ(5, SendNotify(hFrom, IDC_NOTIFIER, NM_CLICK));
+  EXPECT_EQ(6, SendNotify(hFrom, 404, NM_DBLCLK));
+  EXPECT_EQ(8, SendNotify(hFrom, 410, NM_RCLICK));
+  EXPECT_EQ(0, SendNotify(hFrom, 411, NM_RCLICK));
+  EXPECT_EQ((std::vector<std::string>{"notify -2", "notify-range 404", "notify-ex 410"}), m_wnd.m_log);
+}
+
+TEST_F(MessageMapTest, UserAndRegisteredMessagesReturnTheHandlersResult) {
+  EXPECT_EQ(7, m_wnd.SendMessage(WM_APP_SUM, 3, 4));
+  EXPECT_EQ(1005, m_wnd.SendMessage(g_nRegistered, 5, 0));
+  UINT nOther = ::RegisterWindowMessageA("QoMfcWndTests.Other");
+  EXPECT_EQ(0, m_wnd.SendMessage(nOther, 5, 0));
+}
+
+TEST_F(MessageMapTest, WindowMessagesArriveWithMfcArguments) {
+  m_wnd.MoveWindow(20, 20, 300, 200);
+  CRect rc;
+  m_wnd.GetClientRect(&rc);
+  EXPECT_EQ(rc.Width(), m_wnd.m_size.cx);
+  EXPECT_EQ(rc.Height(), m_wnd.m_size.cy);
+}
+
+TEST_F(MessageMapTest, ControlHandlesItsOwnNotificationWhenItReflectsIt) {
+  CReflectEdit edit;
+  ASSERT_TRUE(edit.Create(WS_CHILD | WS_VISIBLE | ES_AUTOHSCROLL, CRect(10, 10, 100, 30), &m_wnd, IDC_REFLECT_EDIT));
+  edit.SetWindowText("x");
+  EXPECT_EQ(1, edit.m_nChanges);
+  EXPECT_TRUE(m_wnd.m_log.empty()) << "the parent must not see a reflected notification";
+
+  // Colour: the control's brush wins; a plain control gets the parent's.
+  HDC hDC = ::GetDC(m_wnd.m_hWnd);
+  LRESULT hbr = m_wnd.SendMessage(WM_CTLCOLOREDIT, (WPARAM)hDC, (LPARAM)edit.m_hWnd);
+  EXPECT_EQ((LRESULT)(HBRUSH)edit.m_brOwn, hbr);
+  EXPECT_EQ(99u, m_wnd.m_nCtlColorType);
+  HWND hPlain = MakeChild("BUTTON", BS_PUSHBUTTON, IDC_BUTTON, 40);
+  hbr = m_wnd.SendMessage(WM_CTLCOLORBTN, (WPARAM)hDC, (LPARAM)hPlain);
+  EXPECT_EQ((LRESULT)(HBRUSH)m_wnd.m_brParent, hbr);
+  EXPECT_EQ((UINT)CTLCOLOR_BTN, m_wnd.m_nCtlColorType);
+  ::ReleaseDC(m_wnd.m_hWnd, hDC);
+}
+
+TEST_F(MessageMapTest, ExtendedReflectionLetsTheParentSeeTheNotificationToo) {
+  CReflectExButton button;
+  ASSERT_TRUE(button.Create("Los", WS_CHILD | WS_VISIBLE | BS_PUSHBUTTON, CRect(10, 10, 100, 30), &m_wnd, IDC_EX_BUTTON));
+  button.SendMessage(BM_CLICK);
+  EXPECT_EQ(1, button.m_nClicks);
+  EXPECT_EQ((std::vector<std::string>{"parent-ex-button"}), m_wnd.m_log);
+}
+
+TEST_F(MessageMapTest, ReflectedNotifyIsHandledByTheSubclassedControl) {
+  CNotifyReflector ctl;
+  ASSERT_TRUE(ctl.SubclassWindow(MakeChild("STATIC", 0, IDC_NOTIFIER, 10)));
+  EXPECT_EQ(3, SendNotify(ctl.m_hWnd, IDC_NOTIFIER, NM_CLICK));
+  EXPECT_EQ(1, ctl.m_nClicks);
+  EXPECT_TRUE(m_wnd.m_log.empty());
+  // Unsubclassed, the parent's map gets it again.
+  HWND hCtl = ctl.UnsubclassWindow();
+  EXPECT_EQ(5, SendNotify(hCtl, IDC_NOTIFIER, NM_CLICK));
+  EXPECT_EQ(1, ctl.m_nClicks);
+}
+
+TEST_F(MessageMapTest, OwnerDrawnListBoxMeasuresAndDrawsItsItems) {
+  COwnerDrawList list;
+  ASSERT_TRUE(list.Create(WS_CHILD | WS_VISIBLE | LBS_OWNERDRAWVARIABLE | LBS_HASSTRINGS | LBS_NOTIFY,
+                          CRect(10, 10, 200, 150), &m_wnd, IDC_DRAWLIST));
+  list.AddString("eins");
+  list.AddString("zwei");
+  EXPECT_EQ(2, list.m_nMeasured);
+  EXPECT_EQ(21, list.GetItemHeight(1));
+  list.Invalidate();
+  list.UpdateWindow();
+  EXPECT_NE(list.m_drawn.end(), std::find(list.m_drawn.begin(), list.m_drawn.end(), 1));
+  CString str;
+  list.GetText(1, str);
+  EXPECT_STREQ("zwei", str);
+}
+
+TEST_F(MessageMapTest, ExceptionsInHandlersAreCaughtAndReported) {
+  CDialogScript script;
+  script.AnswerBox(IDOK).AnswerBox(IDOK).AnswerBox(IDOK);
+  EXPECT_EQ(0, m_wnd.SendMessage(WM_APP_THROW_STD));
+  EXPECT_EQ(0, m_wnd.SendMessage(WM_APP_THROW_USER)); // already told the user: no box
+  EXPECT_EQ(0, m_wnd.SendMessage(WM_APP_THROW_INT));
+  EXPECT_EQ(0, m_wnd.SendMessage(WM_APP_THROW_MFC));
+  EXPECT_TRUE(script.Done());
+  ASSERT_EQ(3u, script.Boxes().size());
+  EXPECT_NE(std::string::npos, script.Boxes()[0].text.find("kaputt im Handler"));
+  EXPECT_NE(std::string::npos, script.Boxes()[1].text.find("unbekannte Ausnahme"));
+  EXPECT_FALSE(script.Boxes()[2].text.empty());
+  // The window still works.
+  EXPECT_EQ(7, m_wnd.SendMessage(WM_APP_SUM, 3, 4));
+}
+
+class CFailingCreate : public CWnd {
+public:
+  BOOL m_bPostNcDestroy = FALSE;
+
+protected:
+  afx_msg int OnCreate(LPCREATESTRUCT) {
+    AfxThrowUserException();
+    return 0;
+  }
+  virtual void PostNcDestroy() { m_bPostNcDestroy = TRUE; }
+  DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CFailingCreate, CWnd)
+  ON_WM_CREATE()
+END_MESSAGE_MAP()
+
+TEST(WindowLifetimeTest, ExceptionInOnCreateFailsTheCreation) {
+  CFailingCreate wnd;
+  EXPECT_FALSE(wnd.CreateEx(0, NULL, "x", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
+  EXPECT_EQ(NULL, wnd.m_hWnd);
+  EXPECT_TRUE(wnd.m_bPostNcDestroy);
+}
+
+TEST(WindowLifetimeTest, DestroyDetachesAndCallsPostNcDestroy) {
+  CProbeWnd wnd;
+  ASSERT_TRUE(wnd.CreateEx(0, NULL, "x", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
+  HWND hWnd = wnd.m_hWnd;
+  EXPECT_TRUE(wnd.DestroyWindow());
+  EXPECT_FALSE(::IsWindow(hWnd));
+  EXPECT_EQ(NULL, wnd.m_hWnd);
+  EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
+  EXPECT_TRUE(wnd.m_bPostNcDestroy);
+}
+
+TEST(WindowLifetimeTest, TemporaryWrappersAndAttachDetach) {
+  HWND hWnd = ::CreateWindowExA(0, "STATIC", "fremd", WS_POPUP, 0, 0, 10, 10, NULL, NULL, NULL, NULL);
+  ASSERT_NE((HWND)NULL, hWnd);
+  EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
+  CWnd* pTemp = CWnd::FromHandle(hWnd);
+  ASSERT_NE(nullptr, pTemp);
+  EXPECT_EQ(pTemp, CWnd::FromHandle(hWnd)); // one wrapper per handle
+  EXPECT_EQ(hWnd, pTemp->m_hWnd);
+
+  CWnd wnd;
+  ASSERT_TRUE(wnd.Attach(hWnd));
+  EXPECT_EQ(&wnd, CWnd::FromHandle(hWnd)); // the permanent object wins
+  AfxDeleteTempMaps();
+  EXPECT_TRUE(::IsWindow(hWnd)); // freeing a wrapper never destroys the window
+  EXPECT_EQ(hWnd, wnd.Detach());
+  EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
+  ::DestroyWindow(hWnd);
+  EXPECT_EQ(nullptr, CWnd::FromHandle(NULL));
+}
+
+TEST(WindowLifetimeTest, ObjectDestroyedBeforeItsWindowDestroysTheWindow) {
+  HWND hWnd;
+  {
+    CProbeWnd wnd;
+    ASSERT_TRUE(wnd.CreateEx(0, NULL, "x", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
+    hWnd = wnd.m_hWnd;
+  }
+  EXPECT_FALSE(::IsWindow(hWnd));
+  EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
+}
+
+} // namespace
