@@ -1,0 +1,665 @@
+#include "CMultiColumnHandler.h"
+#include "CQoConfigFile.h"
+#include "CQoOutputSourceInputFilter.h"
+#include "MultiColumnTestData.h"
+#include "TempFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <random>
+
+namespace {
+
+struct FilterDeleter {
+    void operator()(CQoInputFilter *f) const { f->Delete(); }
+};
+struct SourceDeleter {
+    void operator()(CQoOutputSource *s) const { s->Delete(); }
+};
+typedef std::unique_ptr<CQoInputFilter, FilterDeleter> FilterPtr;
+typedef std::unique_ptr<CQoOutputSource, SourceDeleter> SourcePtr;
+
+std::string Val(CQoInputFilter &f, int col)
+{
+    CQoString v("unset");
+    f.Value(col, v);
+    return v.Str();
+}
+
+std::string Val(CQoOutputSource &s, long row, int col)
+{
+    CQoString v("unset");
+    s.GetValue(row, col, v);
+    return v.Str();
+}
+
+std::string Name(CQoInputFilter &f, int col)
+{
+    CQoString v("unset");
+    f.ColName(col, v);
+    return v.Str();
+}
+
+std::string Name(CQoOutputSource &s, int col)
+{
+    CQoString v("unset");
+    s.GetColumnName(col, v);
+    return v.Str();
+}
+
+// An address file: column 0 "Name, Vorname Titel", column 1 the town.
+MemoryInputFilter AddressFile()
+{
+    return MemoryInputFilter({"Person", "Ort"}, {{"Meier, Hans Dr.", "Bonn"},
+                                                  {"Schulz, Eva", "K\xF6ln"},
+                                                  {"Meier Prof.", "Ulm"},
+                                                  {"", ""},
+                                                  {", Otto", "Hof"}});
+}
+
+// Read mode as a configuration page fills it: column 0 holds the combination
+// Name / ", " Vorname / " " Titel, column 1 the plain function Ort.
+void FillSplit(CMultiColumnHandler &h)
+{
+    h.AddInnerColumn(0, 10001, "Name", -1);
+    h.AddAssignment(0, 0, "", false);
+    h.AddInnerColumn(1, 10002, "Vorname", -1);
+    h.AddAssignment(0, 1, ", ", false);
+    h.AddInnerColumn(2, 10003, "Titel", -1);
+    h.AddAssignment(0, 2, " ", false);
+    h.AddInnerColumn(3, 10004, "Ort", -1);
+    h.AddAssignment(1, 3, "", false);
+}
+
+} // namespace
+
+// --- splitting input columns ---------------------------------------------------
+
+TEST(MultiColumnSplit, CutsEachInputColumnIntoItsPartsRowByRow)
+{
+    MemoryInputFilter file = AddressFile();
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetReadFilter(&file);
+    FillSplit(h);
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    ASSERT_TRUE(split);
+    EXPECT_EQ(4, split->NumCols());
+    EXPECT_EQ(5, split->NumRows());
+
+    ASSERT_TRUE(split->FirstRow());
+    EXPECT_EQ("Meier", Val(*split, 0));
+    EXPECT_EQ("Hans", Val(*split, 1));
+    EXPECT_EQ("Dr.", Val(*split, 2));
+    EXPECT_EQ("Bonn", Val(*split, 3));
+
+    ASSERT_TRUE(split->NextRow());
+    EXPECT_EQ("Schulz", Val(*split, 0));
+    EXPECT_EQ("Eva", Val(*split, 1));
+    EXPECT_EQ("", Val(*split, 2));
+
+    // The first name was empty, so its separator was left out: the title still
+    // lands in its own column.
+    ASSERT_TRUE(split->NextRow());
+    EXPECT_EQ("Meier", Val(*split, 0));
+    EXPECT_EQ("", Val(*split, 1));
+    EXPECT_EQ("Prof.", Val(*split, 2));
+
+    ASSERT_TRUE(split->NextRow());
+    EXPECT_TRUE(split->EmptyRow());
+
+    ASSERT_TRUE(split->NextRow());
+    EXPECT_EQ("", Val(*split, 0));
+    EXPECT_EQ("Otto", Val(*split, 1));
+    EXPECT_FALSE(split->NextRow());
+
+    // Random access lands on the same values.
+    ASSERT_TRUE(split->AbsoluteRow(1));
+    EXPECT_EQ("K\xF6ln", Val(*split, 3));
+    EXPECT_EQ("Eva", Val(*split, 1));
+    EXPECT_FALSE(split->AbsoluteRow(5));
+    EXPECT_EQ("", Val(*split, 0)); // no current row
+    EXPECT_EQ("", Val(*split, 4)); // no such column
+    EXPECT_EQ("", Val(*split, -1));
+}
+
+TEST(MultiColumnSplit, ReadsEachInputFieldOncePerRow)
+{
+    MemoryInputFilter file = AddressFile();
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetReadFilter(&file);
+    FillSplit(h);
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    ASSERT_TRUE(split->FirstRow());
+    for (int round = 0; round < 3; ++round)
+        for (int c = 0; c < 4; ++c)
+            Val(*split, c);
+    EXPECT_EQ(2, file.reads);
+}
+
+TEST(MultiColumnSplit, AlwaysSeparatorsAndLeadingSeparatorsAreTakenOff)
+{
+    MemoryInputFilter file({"Nummer"}, {{"<12>-<>-<7>"}, {"<1>--<3>"}});
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetReadFilter(&file);
+    h.AddInnerColumn(0, 1, "a");
+    h.AddInnerColumn(1, 2, "b");
+    h.AddInnerColumn(2, 3, "c");
+    h.AddAssignment(0, 0, "<", true);
+    h.AddAssignment(0, 1, ">-<", true);
+    h.AddAssignment(0, 2, ">-<", true);
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    ASSERT_TRUE(split->FirstRow());
+    EXPECT_EQ("12", Val(*split, 0));
+    EXPECT_EQ("", Val(*split, 1));
+    EXPECT_EQ("7>", Val(*split, 2));
+    // A malformed value: what cannot be cut stays with the part before.
+    ASSERT_TRUE(split->NextRow());
+    EXPECT_EQ("1>--<3>", Val(*split, 0));
+    EXPECT_EQ("", Val(*split, 1));
+    EXPECT_EQ("", Val(*split, 2));
+}
+
+TEST(MultiColumnSplit, PartsWithoutSeparatorAndUnassignedColumnsStayEmpty)
+{
+    MemoryInputFilter file({"PLZOrt", "Rest"}, {{"53111Bonn", "x"}});
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetReadFilter(&file);
+    h.AddInnerColumn(0, 1, "PLZ");
+    h.AddInnerColumn(1, 2, "Ort");
+    h.AddInnerColumn(2, 3, "frei");
+    h.AddAssignment(0, 0, "", false);
+    h.AddAssignment(0, 1, "", false); // nothing marks where it starts
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    ASSERT_TRUE(split->FirstRow());
+    EXPECT_EQ("53111Bonn", Val(*split, 0));
+    EXPECT_EQ("", Val(*split, 1));
+    EXPECT_EQ("", Val(*split, 2));
+}
+
+TEST(MultiColumnSplit, SplittingUndoesComposingWhenValuesHoldNoSeparator)
+{
+    // Compose random values through the writing type, then split the result
+    // through the reading type with the same parts: the values come back.
+    std::mt19937 random(7);
+    char const *const separators[] = {"", ", ", " ", " / "};
+    for (int round = 0; round < 200; ++round) {
+        int const parts = 1 + static_cast<int>(random() % 4);
+        Rows innerRows(1);
+        for (int p = 0; p < parts; ++p) {
+            std::string value;
+            int const length = static_cast<int>(random() % 4); // empty values too
+            for (int i = 0; i < length; ++i)
+                value += static_cast<char>('a' + random() % 26);
+            innerRows[0].push_back(value);
+        }
+        MemoryOutputSource inner(std::vector<std::string>(parts, "f"), innerRows);
+        CMultiColumnHandler write(CMultiColumnHandler::composeOutput);
+        CMultiColumnHandler read(CMultiColumnHandler::splitInput);
+        write.SetWriteOutputSource(&inner);
+        write.AddOuterColumn(0, "aus");
+        for (int p = 0; p < parts; ++p) {
+            char const *sep = p == 0 ? "" : separators[1 + random() % 3];
+            bool const always = random() % 2 == 0;
+            write.AddInnerColumn(p, p, "f");
+            write.AddAssignment(0, p, sep, always);
+            read.AddInnerColumn(p, p, "f");
+            read.AddAssignment(0, p, sep, always);
+        }
+        SourcePtr composed(write.CreateMultiColumnOutputSource());
+        MemoryInputFilter file({"aus"}, {{Val(*composed, 0, 0)}});
+        read.SetReadFilter(&file);
+        FilterPtr split(read.CreateMultiColumnInputFilter());
+        ASSERT_TRUE(split->FirstRow());
+        // With separators that are prefixes of each other (" " and " / ") an
+        // empty value can be ambiguous; check only the unambiguous cases.
+        bool ambiguous = false;
+        for (int p = 1; p < parts; ++p)
+            ambiguous = ambiguous || innerRows[0][p].empty();
+        if (ambiguous)
+            continue;
+        for (int p = 0; p < parts; ++p)
+            EXPECT_EQ(innerRows[0][p], Val(*split, p)) << "composed: " << Val(*composed, 0, 0);
+    }
+}
+
+TEST(MultiColumnSplit, FilterFollowsLaterChangesAndOutlivesTheHandler)
+{
+    MemoryInputFilter file = AddressFile();
+    FilterPtr split;
+    {
+        CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+        h.SetReadFilter(&file);
+        h.AddInnerColumn(0, 10001, "Ganz");
+        h.AddAssignment(0, 0, "", false);
+        split.reset(h.CreateMultiColumnInputFilter());
+        ASSERT_TRUE(split->FirstRow());
+        EXPECT_EQ("Meier, Hans Dr.", Val(*split, 0));
+
+        // The current row's values follow a change of the mapping at once.
+        h.AddInnerColumn(1, 10002, "Vorname");
+        h.AddAssignment(0, 1, ", ", false);
+        EXPECT_EQ(2, split->NumCols());
+        EXPECT_EQ("Meier", Val(*split, 0));
+        EXPECT_EQ("Hans Dr.", Val(*split, 1));
+    }
+    ASSERT_TRUE(split->AbsoluteRow(1));
+    EXPECT_EQ("Eva", Val(*split, 1));
+    EXPECT_STREQ("memory", split->FileName());
+    EXPECT_EQ(CQoInputFilter::filterUnknown, split->InputFilterType());
+}
+
+TEST(MultiColumnSplit, WithoutReadFilterThereAreNoRows)
+{
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.AddInnerColumn(0, 1, "a");
+    EXPECT_TRUE(h.AddAssignment(3, 0, "", false)); // columns not known yet
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    EXPECT_EQ(0, split->NumRows());
+    EXPECT_FALSE(split->FirstRow());
+    EXPECT_FALSE(split->NextRow());
+    EXPECT_FALSE(split->AbsoluteRow(0));
+    EXPECT_EQ("", Val(*split, 0));
+    EXPECT_EQ(0, h.NumOuterColumns());
+    EXPECT_EQ(nullptr, h.CreateMultiColumnOutputSource());
+}
+
+// --- names and lookups ----------------------------------------------------------
+
+TEST(MultiColumnNames, SplitFilterNamesItsColumnsAfterInnerOrOuterColumns)
+{
+    MemoryInputFilter file = AddressFile();
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetReadFilter(&file);
+    FillSplit(h);
+    h.AddInnerColumn(4, 10005, "");     // unassigned, no name
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    EXPECT_EQ("Vorname", Name(*split, 1));
+    EXPECT_EQ("Feld 5", Name(*split, 4));
+    EXPECT_EQ("", Name(*split, 5));
+
+    h.SetAlwaysUseOuterNames(true);
+    EXPECT_EQ("Person", Name(*split, 0));
+    EXPECT_EQ("Person", Name(*split, 2));
+    EXPECT_EQ("Ort", Name(*split, 3));
+    EXPECT_EQ("Feld 5", Name(*split, 4));
+
+    // A name given to an outer column is the handler's; the file keeps its own.
+    EXPECT_TRUE(h.ChangeColumnName(true, 0, "Kunde"));
+    EXPECT_EQ("Kunde", Name(*split, 1));
+    CQoString name;
+    file.ColName(0, name);
+    EXPECT_STREQ("Person", name);
+    EXPECT_TRUE(h.GetOuterColName(0, name));
+    EXPECT_STREQ("Kunde", name);
+    // A new read filter drops such names.
+    h.SetReadFilter(&file);
+    h.GetOuterColName(0, name);
+    EXPECT_STREQ("Person", name);
+}
+
+TEST(MultiColumnNames, LookupsBetweenInnerAndOuterColumns)
+{
+    MemoryInputFilter file = AddressFile();
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetReadFilter(&file);
+    FillSplit(h);
+    h.AddInnerColumn(9, 10009, "frei");
+
+    EXPECT_EQ(2, h.NumOuterColumns());
+    EXPECT_EQ(5, h.NumInnerColumns());
+    CQoString text("unset");
+    EXPECT_TRUE(h.GetInnerNamesOfOuterColumn(0, text));
+    EXPECT_STREQ("Name, Vorname Titel", text);
+    EXPECT_TRUE(h.GetInnerNamesOfOuterColumn(1, text));
+    EXPECT_STREQ("Ort", text);
+    EXPECT_FALSE(h.GetInnerNamesOfOuterColumn(2, text));
+    EXPECT_STREQ("", text);
+
+    EXPECT_TRUE(h.GetInnerColName(1, text, true));
+    EXPECT_STREQ("Vorname", text);
+    EXPECT_TRUE(h.GetInnerColName(1, text, false));
+    EXPECT_STREQ(", Vorname", text);
+    EXPECT_FALSE(h.GetInnerColName(5, text, true));
+
+    text = "unset";
+    EXPECT_EQ(0, h.GetOuterNameOfInnerColumn(2, text));
+    EXPECT_STREQ("Person", text);
+    EXPECT_EQ(1, h.GetOuterNameOfInnerColumn(3, text));
+    EXPECT_STREQ("Ort", text);
+    text = "unset";
+    EXPECT_EQ(-1, h.GetOuterNameOfInnerColumn(4, text)); // not assigned
+    EXPECT_EQ(-1, h.GetOuterNameOfInnerColumn(-1, text));
+    EXPECT_STREQ("unset", text);
+
+    EXPECT_EQ(10003, h.GetInnerFunction(2));
+    EXPECT_EQ(-1, h.GetInnerFunction(5));
+    EXPECT_EQ(9, h.GetInnerColumnId(4));
+    EXPECT_EQ(4, h.FindInnerColumn(9));
+    EXPECT_EQ(-1, h.FindInnerColumn(5));
+    EXPECT_EQ(2, h.GetNextFreeOuterColumnId());
+}
+
+// --- rules of the mapping ---------------------------------------------------------
+
+TEST(MultiColumnRules, RefusesWhatCannotBeMapped)
+{
+    MemoryInputFilter file = AddressFile();
+    CMultiColumnHandler split(CMultiColumnHandler::splitInput);
+    split.SetReadFilter(&file);
+    EXPECT_TRUE(split.AddInnerColumn(0, 1, "a"));
+    EXPECT_FALSE(split.AddInnerColumn(0, 2, "b")); // id in use
+    EXPECT_FALSE(split.AddOuterColumn(5, "x"));   // outer columns are the file's
+    EXPECT_FALSE(split.AddAssignment(2, 0, "", false)); // the file has 2 columns
+    EXPECT_FALSE(split.AddAssignment(0, 7, "", false)); // no such inner column
+    EXPECT_TRUE(split.AddAssignment(1, 0, "", false));
+    EXPECT_FALSE(split.AddAssignment(0, 0, "", false)); // a value comes from one place
+    EXPECT_FALSE(split.DeleteColumn(false, 0));
+    EXPECT_EQ(1, split.NumAssignments());
+
+    CMultiColumnHandler compose(CMultiColumnHandler::composeOutput);
+    EXPECT_EQ(CMultiColumnHandler::composeOutput, compose.GetType());
+    EXPECT_EQ(0, compose.GetNextFreeOuterColumnId());
+    EXPECT_TRUE(compose.AddOuterColumn(4, "A"));
+    EXPECT_FALSE(compose.AddOuterColumn(4, "B"));
+    EXPECT_TRUE(compose.AddOuterColumn(1, "C"));
+    EXPECT_EQ(5, compose.GetNextFreeOuterColumnId());
+    EXPECT_EQ(1, compose.FindOuterColumn(1));
+    EXPECT_EQ(-1, compose.FindOuterColumn(0));
+    EXPECT_TRUE(compose.AddInnerColumn(10, 10, "x"));
+    EXPECT_FALSE(compose.AddAssignment(0, 10, "", false)); // outer ids, not indexes
+    EXPECT_TRUE(compose.AddAssignment(4, 10, "", false));
+    EXPECT_TRUE(compose.AddAssignment(1, 10, "-", false)); // one value, two places
+    EXPECT_EQ(nullptr, compose.CreateMultiColumnInputFilter());
+
+    int outer = -1, inner = -1;
+    CQoString sep;
+    bool always = true;
+    ASSERT_TRUE(compose.GetAssignment(1, outer, inner, sep, always));
+    EXPECT_EQ(1, outer);
+    EXPECT_EQ(10, inner);
+    EXPECT_STREQ("-", sep);
+    EXPECT_FALSE(always);
+    EXPECT_FALSE(compose.GetAssignment(2, outer, inner, sep, always));
+
+    CMultiColumnHandler odd(42);
+    EXPECT_EQ(CMultiColumnHandler::splitInput, odd.GetType());
+}
+
+TEST(MultiColumnRules, RemovingColumnsRemovesTheirAssignments)
+{
+    CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+    h.AddOuterColumn(0, "A");
+    h.AddOuterColumn(1, "B");
+    h.AddInnerColumn(10, 10, "x");
+    h.AddInnerColumn(11, 11, "y");
+    h.AddAssignment(0, 10, "", false);
+    h.AddAssignment(0, 11, " ", false);
+    h.AddAssignment(1, 11, "", false);
+
+    EXPECT_TRUE(h.DeleteColumn(true, 1)); // inner y
+    EXPECT_EQ(1, h.NumAssignments());
+    EXPECT_FALSE(h.DeleteColumn(true, 1));
+    EXPECT_TRUE(h.DeleteColumn(false, 0)); // outer A
+    EXPECT_EQ(0, h.NumAssignments());
+    EXPECT_EQ(1, h.NumOuterColumns());
+    CQoString name;
+    h.GetOuterColName(0, name);
+    EXPECT_STREQ("B", name);
+    EXPECT_FALSE(h.DeleteColumn(false, 1));
+
+    h.AddAssignment(1, 10, "", false);
+    h.DeleteColumns(false);
+    EXPECT_EQ(0, h.NumOuterColumns());
+    EXPECT_EQ(1, h.NumInnerColumns());
+    EXPECT_EQ(0, h.NumAssignments());
+    h.DeleteColumns(true);
+    EXPECT_EQ(0, h.NumInnerColumns());
+
+    EXPECT_FALSE(h.ChangeColumnName(true, 0, "x"));
+    EXPECT_FALSE(h.ChangeColumnName(false, 0, "x"));
+}
+
+// --- composing output columns ---------------------------------------------------------
+
+namespace {
+
+// The functions' values: Name, Vorname, Titel, PLZ, Ort.
+MemoryOutputSource PersonSource()
+{
+    return MemoryOutputSource({"Name", "Vorname", "Titel", "PLZ", "Ort"},
+                              {{"Meier", "Hans", "Dr.", "53111", "Bonn"},
+                               {"Schulz", "", "", "", "K\xF6ln"},
+                               {"", "Otto", "", "95028", ""}},
+                              {30, 20, 10, 5, 25});
+}
+
+// Write mode as a configuration page fills it: inner columns are the functions
+// (id = function id), outer columns with ids of their own.
+void FillCompose(CMultiColumnHandler &h)
+{
+    h.AddInnerColumn(10001, 10001, "Name");
+    h.AddInnerColumn(10002, 10002, "Vorname");
+    h.AddInnerColumn(10003, 10003, "Titel");
+    h.AddInnerColumn(10004, 10004, "PLZ");
+    h.AddInnerColumn(10005, 10005, "Ort");
+    h.AddOuterColumn(7, "Person");
+    h.AddAssignment(7, 10001, "", false);
+    h.AddAssignment(7, 10002, ", ", false);
+    h.AddAssignment(7, 10003, " ", false);
+    h.AddOuterColumn(3, "");
+    h.AddAssignment(3, 10004, "D-", false);
+    h.AddAssignment(3, 10005, " ", true);
+}
+
+} // namespace
+
+TEST(MultiColumnCompose, SeparatorsStandOnlyBeforeValuesUnlessAlways)
+{
+    MemoryOutputSource values = PersonSource();
+    CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+    h.SetWriteOutputSource(&values);
+    FillCompose(h);
+    SourcePtr out(h.CreateMultiColumnOutputSource());
+    ASSERT_TRUE(out);
+    EXPECT_EQ(2, out->GetNumColumns());
+    EXPECT_EQ(3, out->GetNumRows());
+
+    EXPECT_EQ("Meier, Hans Dr.", Val(*out, 0, 0));
+    EXPECT_EQ("D-53111 Bonn", Val(*out, 0, 1));
+    EXPECT_EQ("Schulz", Val(*out, 1, 0));
+    EXPECT_EQ(" K\xF6ln", Val(*out, 1, 1)); // no postcode: no "D-", but the always blank
+    EXPECT_EQ(", Otto", Val(*out, 2, 0));
+    EXPECT_EQ("D-95028 ", Val(*out, 2, 1));
+    EXPECT_EQ("", Val(*out, 0, 2));
+    EXPECT_EQ("", Val(*out, 3, 0));
+    EXPECT_EQ("", Val(*out, -1, 0));
+}
+
+TEST(MultiColumnCompose, NamesAndLengthsOfComposedColumns)
+{
+    MemoryOutputSource values = PersonSource();
+    CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+    h.SetWriteOutputSource(&values);
+    FillCompose(h);
+    SourcePtr out(h.CreateMultiColumnOutputSource());
+    EXPECT_EQ("Person", Name(*out, 0));
+    EXPECT_EQ("D-PLZ Ort", Name(*out, 1)); // no name of its own: its parts
+    EXPECT_EQ("", Name(*out, 2));
+    h.SetAlwaysUseOuterNames(true);
+    EXPECT_EQ("", Name(*out, 1));
+
+    EXPECT_EQ(30 + 20 + 2 + 10 + 1, out->GetDataLength(0));
+    EXPECT_EQ(2 + 5 + 1 + 25, out->GetDataLength(1));
+    EXPECT_EQ(-1, out->GetDataLength(2));
+    values.m_lengths.resize(4); // Ort's length no longer known
+    EXPECT_EQ(-1, out->GetDataLength(1));
+}
+
+TEST(MultiColumnCompose, InnerColumnsReadTheirPositionOrAGivenSourceColumn)
+{
+    MemoryOutputSource values = PersonSource();
+    CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+    h.SetWriteOutputSource(&values);
+    h.AddInnerColumn(50, 50, "Ort", 4);
+    h.AddInnerColumn(51, 51, "Vorname"); // second inner column: source column 1
+    h.AddOuterColumn(0, "A");
+    h.AddAssignment(0, 50, "", false);
+    h.AddAssignment(0, 51, "/", false);
+    h.AddAssignment(0, 50, "/", false); // the same value twice is allowed
+    SourcePtr out(h.CreateMultiColumnOutputSource());
+    EXPECT_EQ("Bonn/Hans/Bonn", Val(*out, 0, 0));
+}
+
+TEST(MultiColumnCompose, SourceMadeFirstFollowsTheMappingAsAPageBuildsIt)
+{
+    // A page makes the source first and fills the handler afterwards, again on
+    // every change; the preview reads the source through an input filter.
+    MemoryOutputSource values = PersonSource();
+    CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+    h.SetAlwaysUseOuterNames(false);
+    h.SetWriteOutputSource(&values);
+    SourcePtr out(h.CreateMultiColumnOutputSource());
+    CQoOutputSourceInputFilter preview(out.get());
+    EXPECT_EQ(0, preview.NumCols());
+
+    FillCompose(h);
+    EXPECT_EQ(2, preview.NumCols());
+    ASSERT_TRUE(preview.AbsoluteRow(0));
+    EXPECT_EQ("Meier, Hans Dr.", Val(preview, 0));
+
+    // Reordering as the page does: clear, add the outer columns anew.
+    h.ClearAssignments();
+    h.DeleteColumns(false);
+    h.AddOuterColumn(3, "Ort");
+    h.AddAssignment(3, 10005, "", false);
+    h.AddOuterColumn(7, "Name");
+    h.AddAssignment(7, 10001, "", false);
+    ASSERT_TRUE(preview.AbsoluteRow(1));
+    EXPECT_EQ("K\xF6ln", Val(preview, 0));
+    EXPECT_EQ("Schulz", Val(preview, 1));
+    EXPECT_EQ("Name", Name(preview, 1));
+
+    // Without an output source nothing is delivered.
+    h.SetWriteOutputSource(nullptr);
+    EXPECT_EQ(0, out->GetNumRows());
+    EXPECT_EQ("", Val(*out, 0, 0));
+}
+
+// --- settings ----------------------------------------------------------------------------
+
+TEST(MultiColumnConfig, MappingRoundTripsThroughAConfigurationFile)
+{
+    TempFolder folder;
+    std::string const path = folder.Path("projekt.cfg");
+    MemoryOutputSource values = PersonSource();
+    {
+        CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+        FillCompose(h);
+        h.ChangeColumnName(false, 1, " Vor name "); // blanks at both ends
+        h.SetAlwaysUseOuterNames(true);
+        CQoConfigFile cfg;
+        h.WriteConfig(cfg, "Ausgabe");
+        ASSERT_TRUE(cfg.Write(path.c_str()));
+    }
+    CQoConfigFile cfg;
+    ASSERT_TRUE(cfg.Open(path.c_str()));
+    CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+    h.SetWriteOutputSource(&values);
+    SourcePtr out(h.CreateMultiColumnOutputSource());
+    ASSERT_TRUE(h.ReadConfig(cfg, "Ausgabe"));
+    EXPECT_TRUE(h.GetAlwaysUseOuterNames());
+    EXPECT_EQ(5, h.NumInnerColumns());
+    EXPECT_EQ(2, h.NumOuterColumns());
+    EXPECT_EQ(5, h.NumAssignments());
+    CQoString name;
+    h.GetInnerColName(1, name, true);
+    EXPECT_STREQ(" Vor name ", name);
+    EXPECT_EQ(3, h.GetOuterColumnId(1));
+    // The source made before reading follows the mapping read.
+    EXPECT_EQ("Meier, Hans Dr.", Val(*out, 0, 0));
+    EXPECT_EQ(" K\xF6ln", Val(*out, 1, 1));
+
+    // A handler of the other type does not take it.
+    CMultiColumnHandler other(CMultiColumnHandler::splitInput);
+    other.AddInnerColumn(0, 1, "bleibt");
+    EXPECT_FALSE(other.ReadConfig(cfg, "Ausgabe"));
+    EXPECT_FALSE(other.ReadConfig(cfg, "fehlt"));
+    EXPECT_EQ(1, other.NumInnerColumns());
+}
+
+TEST(MultiColumnConfig, SplitFilterStoresItsMappingAndShrinkingLeavesNoStaleKeys)
+{
+    MemoryInputFilter file = AddressFile();
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetReadFilter(&file);
+    FillSplit(h);
+    h.ChangeColumnName(true, 1, "Stadt");
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    CQoConfigFile cfg;
+    split->WriteConfig(cfg, "Eingabe");
+
+    CMultiColumnHandler copy(CMultiColumnHandler::splitInput);
+    copy.SetReadFilter(&file);
+    ASSERT_TRUE(copy.ReadConfig(cfg, "Eingabe"));
+    FilterPtr again(copy.CreateMultiColumnInputFilter());
+    ASSERT_TRUE(again->FirstRow());
+    EXPECT_EQ("Hans", Val(*again, 1));
+    CQoString name;
+    copy.GetOuterColName(1, name);
+    EXPECT_STREQ("Stadt", name);
+
+    // Fewer columns written over the same section: the old numbered keys go.
+    h.DeleteColumns(true);
+    h.AddInnerColumn(0, 1, "nur");
+    h.AddAssignment(1, 0, "", false);
+    split->WriteConfig(cfg, "Eingabe");
+    EXPECT_FALSE(cfg.HasKey("Eingabe", "Inner1Id"));
+    EXPECT_FALSE(cfg.HasKey("Eingabe", "Assign1Inner"));
+
+    // Reading through the filter changes the mapping it shares.
+    split->ReadConfig(cfg, "Eingabe");
+    EXPECT_EQ(1, h.NumInnerColumns());
+    EXPECT_TRUE(split->IsModified());
+}
+
+TEST(MultiColumnConfig, DamagedSettingsAreLeftOutNotFollowed)
+{
+    CQoConfigFile cfg;
+    cfg.SetValue("M", "MultiColumnType", 1);
+    cfg.SetValue("M", "InnerColumns", 2000000000); // would take ages if trusted
+    cfg.SetValue("M", "Inner0Id", 5);
+    cfg.SetValue("M", "Inner0Name", "a");
+    cfg.SetValue("M", "Inner1Id", "kaputt");
+    cfg.SetValue("M", "OuterColumns", 2);
+    cfg.SetValue("M", "Outer0Id", 1);
+    cfg.SetValue("M", "Outer1Id", 1); // the same id twice
+    cfg.SetValue("M", "Assignments", 2);
+    cfg.SetValue("M", "Assign0Outer", 1);
+    cfg.SetValue("M", "Assign0Inner", 5);
+    cfg.SetValue("M", "Assign1Outer", 1);
+    cfg.SetValue("M", "Assign1Inner", 6); // no such inner column
+    CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
+    ASSERT_TRUE(h.ReadConfig(cfg, "M"));
+    EXPECT_EQ(1, h.NumInnerColumns());
+    EXPECT_EQ(1, h.NumOuterColumns());
+    EXPECT_EQ(1, h.NumAssignments());
+}
+
+TEST(MultiColumnConfig, CopiesAreIndependent)
+{
+    CMultiColumnHandler a(CMultiColumnHandler::composeOutput);
+    FillCompose(a);
+    CMultiColumnHandler b(a);
+    b.DeleteColumns(true);
+    EXPECT_EQ(5, a.NumInnerColumns());
+    EXPECT_EQ(0, b.NumInnerColumns());
+
+    // Assigning into a handler keeps the sources it made following it.
+    MemoryOutputSource values = PersonSource();
+    b.SetWriteOutputSource(&values);
+    SourcePtr out(b.CreateMultiColumnOutputSource());
+    a.SetWriteOutputSource(&values);
+    b = a;
+    EXPECT_EQ("Meier, Hans Dr.", Val(*out, 0, 0));
+}
