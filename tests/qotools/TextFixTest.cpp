@@ -1,0 +1,174 @@
+#include "CQoConfigFile.h"
+#include "CQoException.h"
+#include "CQoInputFilterTextFix.h"
+#include "CQoInputFilterTextVF.h"
+
+#include "TempFolder.h"
+#include "TextFilterTestSupport.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+void SetColumns(CQoInputFilterTextFix &f, std::vector<int> const &lengths)
+{
+    f.SetNumCols(static_cast<int>(lengths.size()));
+    for (std::size_t i = 0; i < lengths.size(); ++i)
+        f.ColLen(static_cast<int>(i), lengths[i]);
+}
+void SetColumns(CQoInputFilterTextVF &f, std::vector<int> const &lengths)
+{
+    f.SetNumCols(static_cast<int>(lengths.size()));
+    for (std::size_t i = 0; i < lengths.size(); ++i)
+        f.ColLen(static_cast<int>(i), lengths[i]);
+}
+} // namespace
+
+TEST(TextFixRecords, RecordsFollowEachOtherAndRowsAreComputed)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("fix.dat");
+    // Record length 12: name 6, city 4, code 2; the first record holds names.
+    WriteBytes(path, "NAME  ORT CD"
+                     "Meier Bonn01"
+                     "M\xFCllerK\xF6ln02"
+                     "Li    Ulm  3");
+    CQoInputFilterTextFix f;
+    f.RecordLen(12);
+    SetColumns(f, {6, 4, 2});
+    f.SetFirstRowHasNames(true);
+    f.Init(path.c_str());
+    EXPECT_EQ(CQoInputFilter::filterTextFix, f.InputFilterType());
+    CQoString name;
+    f.ColName(1, name);
+    EXPECT_EQ("ORT", name);
+    EXPECT_EQ(3, f.NumRows());
+    std::vector<Row> rows = AllRows(f);
+    ASSERT_EQ(3u, rows.size());
+    EXPECT_EQ((Row{"Meier", "Bonn", "01"}), rows[0]);
+    EXPECT_EQ((Row{"M\xFCller", "K\xF6ln", "02"}), rows[1]);
+    EXPECT_EQ((Row{"Li", "Ulm", " 3"}), rows[2]);
+    ASSERT_TRUE(f.AbsoluteRow(1));
+    EXPECT_EQ(24, f.getActPosInFile());
+    EXPECT_FALSE(f.AbsoluteRow(3));
+
+    // A column beyond the record is cut at its end.
+    f.ColLen(2, 5);
+    ASSERT_TRUE(f.AbsoluteRow(0));
+    EXPECT_EQ((Row{"Meier", "Bonn", "01"}), CurrentRow(f));
+}
+
+TEST(TextFixRecords, AShortLastRecordIsReportedTrailingLineEndsAreNot)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("kurz.dat");
+    WriteBytes(path, "aaaabbbbccc");
+    CQoInputFilterTextFix f;
+    f.RecordLen(4);
+    SetColumns(f, {2, 2});
+    f.Init(path.c_str());
+    ASSERT_TRUE(f.AbsoluteRow(1));
+    EXPECT_THROW(f.NextRow(), CQoException);
+    {
+        RepairScript script({CQoInterActive::repairTakeOver}, {"cc"});
+        f.Init(path.c_str());
+        std::vector<Row> rows = AllRows(f);
+        ASSERT_EQ(3u, rows.size());
+        EXPECT_EQ((Row{"cc", ""}), rows[2]);
+        EXPECT_EQ("ccc", RepairScript::calls.at(0).data);
+        EXPECT_EQ(3, f.NumRows());
+    }
+    {
+        RepairScript script({CQoInterActive::repairSkip});
+        f.Init(path.c_str());
+        EXPECT_EQ(2u, AllRows(f).size());
+        EXPECT_EQ(2, f.NumRows());
+    }
+    WriteBytes(path, "aaaabbbb\r\n\x1A");
+    f.Init(path.c_str());
+    EXPECT_EQ(2, f.NumRows());
+    EXPECT_EQ(2u, AllRows(f).size());
+}
+
+TEST(TextFixRecords, SettingsRoundTripThroughTheConfiguration)
+{
+    CQoInputFilterTextFix a;
+    a.RecordLen(80);
+    SetColumns(a, {10, 30, 40});
+    a.SetFirstRowHasNames(true);
+    CQoConfigFile cfg;
+    a.WriteConfig(cfg, "fix");
+    CQoInputFilterTextFix b;
+    b.ReadConfig(cfg, "fix");
+    EXPECT_EQ(80, b.RecordLen());
+    ASSERT_EQ(3, b.NumCols());
+    EXPECT_EQ(30, b.ColLen(1));
+    EXPECT_EQ(0, b.ColLen(3));
+    EXPECT_TRUE(b.GetFirstRowHasNames());
+    b.RecordLen(-5);
+    EXPECT_EQ(1, b.RecordLen());
+}
+
+TEST(TextVFLines, LinesAreCutIntoColumnsAndIndexed)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("vf.txt");
+    WriteBytes(path, "Vorspann\r\n"
+                     "Name      PLZ  Ort\r\n"
+                     "Meier     53111Bonn\r\n"
+                     "Li\n"
+                     "Schulz    10115Berlin    \r"
+                     "Ende      99999X");
+    CQoInputFilterTextVF f;
+    SetColumns(f, {10, 5, 10});
+    f.Skip(1);
+    f.SetFirstRowHasNames(true);
+    f.Init(path.c_str());
+    EXPECT_EQ(CQoInputFilter::filterTextVF, f.InputFilterType());
+    ASSERT_EQ(3, f.NumCols());
+    CQoString name;
+    f.ColName(2, name);
+    EXPECT_EQ("Ort", name);
+    std::vector<Row> rows = AllRows(f);
+    ASSERT_EQ(4u, rows.size());
+    EXPECT_EQ((Row{"Meier", "53111", "Bonn"}), rows[0]);
+    EXPECT_EQ((Row{"Li", "", ""}), rows[1]);
+    EXPECT_EQ((Row{"Schulz", "10115", "Berlin"}), rows[2]);
+    EXPECT_EQ((Row{"Ende", "99999", "X"}), rows[3]);
+    EXPECT_EQ(4, f.NumRows());
+    EXPECT_EQ(4u * 8u, f.IndexBytes());
+    ASSERT_TRUE(f.AbsoluteRow(2));
+    EXPECT_EQ("Schulz", CurrentRow(f)[0]);
+}
+
+TEST(TextVFLines, TextBeyondTheLastColumnIsDefective)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("lang.txt");
+    WriteBytes(path, "abcd\nabcdEF\nab  \n");
+    CQoInputFilterTextVF f;
+    SetColumns(f, {2, 2});
+    f.Init(path.c_str());
+    ASSERT_TRUE(f.FirstRow());
+    EXPECT_THROW(f.NextRow(), CQoException);
+    RepairScript script({CQoInterActive::repairTakeOver}, {"abEF"});
+    f.Init(path.c_str());
+    std::vector<Row> rows = AllRows(f);
+    ASSERT_EQ(3u, rows.size());
+    EXPECT_EQ((Row{"ab", "EF"}), rows[1]);
+    EXPECT_EQ((Row{"ab", ""}), rows[2]);
+}
+
+TEST(TextVFLines, SettingsRoundTripThroughTheConfiguration)
+{
+    CQoInputFilterTextVF a;
+    SetColumns(a, {3, 7});
+    a.Skip(2);
+    CQoConfigFile cfg;
+    a.WriteConfig(cfg, "vf");
+    CQoInputFilterTextVF b;
+    b.ReadConfig(cfg, "vf");
+    ASSERT_EQ(2, b.NumCols());
+    EXPECT_EQ(7, b.ColLen(1));
+    EXPECT_EQ(10, b.RecordWidth());
+    EXPECT_EQ(2, b.Skip());
+}
