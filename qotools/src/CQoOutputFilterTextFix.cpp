@@ -1,0 +1,119 @@
+#include "CQoOutputFilterTextFix.h"
+
+#include "CQoConfigFile.h"
+#include "CQoException.h"
+#include "CQoFile.h"
+
+#include <cstring>
+
+CQoOutputFilterTextFix::CQoOutputFilterTextFix() = default;
+
+CQoOutputFilterTextFix::~CQoOutputFilterTextFix()
+{
+    try {
+        ReleaseFile();
+    } catch (CQoException const &) {
+        // a destructor cannot report; callers who care call ReleaseFile
+    }
+}
+
+bool CQoOutputFilterTextFix::Init()
+{
+    m_llTruncated = 0;
+    if (!m_pFile || !m_pFile->IsOpen())
+        return false;
+    m_pFile->FileCharSet(m_nFileCharSet);
+    return true;
+}
+
+void CQoOutputFilterTextFix::NumCols(int cols)
+{
+    CQoOutputFilter::NumCols(cols);
+    m_lengths.resize(m_columnNames.size(), defaultLength);
+}
+
+int CQoOutputFilterTextFix::NumCols() const { return CQoOutputFilter::NumCols(); }
+
+void CQoOutputFilterTextFix::SetLength(int col, int length)
+{
+    CheckColumn(col);
+    m_lengths[std::size_t(col)] = length;
+}
+
+int CQoOutputFilterTextFix::GetLength(int col)
+{
+    CheckColumn(col);
+    return m_lengths[std::size_t(col)];
+}
+
+void CQoOutputFilterTextFix::CrLf(bool on) { m_bCrLf = on; }
+
+bool CQoOutputFilterTextFix::GetCrLf() const { return m_bCrLf; }
+
+int CQoOutputFilterTextFix::RecordLength() const
+{
+    int sum = 0;
+    for (int length : m_lengths)
+        sum += length > 0 ? length : 0;
+    return sum;
+}
+
+void CQoOutputFilterTextFix::BuildRecord(std::string &record)
+{
+    record.assign(std::size_t(RecordLength()) + (m_bCrLf ? 2 : 0), ' ');
+    char *out = &record[0];
+    for (std::size_t c = 0; c < m_lengths.size(); ++c) {
+        std::size_t length = m_lengths[c] > 0 ? std::size_t(m_lengths[c]) : 0;
+        std::string const &value = m_values[c].Str();
+        std::size_t n = value.size();
+        if (n > length) {
+            n = length;
+            ++m_llTruncated;
+        }
+        std::memcpy(out, value.data(), n);
+        if (m_bCrLf)
+            for (std::size_t k = 0; k < n; ++k)
+                if (out[k] == '\r' || out[k] == '\n')
+                    out[k] = ' ';
+        out += length;
+    }
+    if (m_bCrLf) {
+        out[0] = '\r';
+        out[1] = '\n';
+    }
+}
+
+bool CQoOutputFilterTextFix::WriteRow(CQoString *text)
+{
+    BuildRecord(m_record);
+    if (text) {
+        text->Assign(m_record.data(), m_record.size());
+        return true;
+    }
+    WriteToFile(m_record.data(), m_record.size());
+    return true;
+}
+
+void CQoOutputFilterTextFix::WriteConfig(CQoConfigFile &cfg, CQoString const &section)
+{
+    CQoOutputFilter::WriteConfig(cfg, section);
+    cfg.SetValue(section, "crlf", m_bCrLf ? 1 : 0);
+    CQoString key;
+    for (int c = 0; c < NumCols(); ++c) {
+        key.Format("column%d_len", c);
+        cfg.SetValue(section, key, m_lengths[std::size_t(c)]);
+    }
+}
+
+void CQoOutputFilterTextFix::ReadConfig(CQoConfigFile &cfg, CQoString const &section)
+{
+    CQoOutputFilter::ReadConfig(cfg, section); // sets the column count (virtual NumCols)
+    int crlf = m_bCrLf ? 1 : 0;
+    cfg.GetValue(section, "crlf", crlf);
+    m_bCrLf = crlf != 0;
+    CQoString key;
+    for (int c = 0; c < NumCols(); ++c) {
+        key.Format("column%d_len", c);
+        cfg.GetValue(section, key, m_lengths[std::size_t(c)]);
+    }
+}

@@ -1,0 +1,132 @@
+// The fixed-length text output: record layout, cutting, line breaks,
+// character sets and its settings.
+#include "CQoConfigFile.h"
+#include "CQoException.h"
+#include "CQoFile.h"
+#include "CQoOutputFilterTextFix.h"
+
+#include "TempFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+namespace {
+
+void Row(CQoOutputFilter &out, std::vector<std::string> const &values, CQoString *text = nullptr)
+{
+    out.InitRow();
+    for (std::size_t c = 0; c < values.size(); ++c)
+        out.Value(int(c), values[c].c_str());
+    ASSERT_TRUE(out.WriteRow(text));
+}
+
+} // namespace
+
+TEST(TextOutputFix, RecordsArePaddedCutAndEndedAsSet)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("fix.txt");
+    CQoOutputFilterTextFix out;
+    out.NumCols(3);
+    out.SetLength(0, 4);
+    out.SetLength(1, 6);
+    EXPECT_EQ(CQoOutputFilterTextFix::defaultLength, out.GetLength(2));
+    out.SetLength(2, 2);
+    EXPECT_EQ(12, out.RecordLength());
+
+    CQoFile file;
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary | CQoFile::ascii));
+    out.FileCharSet(CQoFile::ascii);
+    out.UseFile(&file, true);
+    ASSERT_TRUE(out.Init());
+    EXPECT_TRUE(out.WriteHeader()); // the format has none
+    Row(out, {"ab", "M\xFCller", "x"});
+    Row(out, {"abcdef", "a\r\nb", "123"});
+    Row(out, {});
+    out.ReleaseFile();
+    EXPECT_EQ(2, out.TruncatedValues());
+    EXPECT_EQ("ab  M\x81llerx \r\n"
+              "abcda  b  12\r\n"
+              "            \r\n",
+              ReadBytes(path));
+    EXPECT_EQ(3 * 14, out.wroteBytes());
+
+    // Without line breaks the records follow one another and keep their bytes.
+    out.CrLf(false);
+    EXPECT_FALSE(out.GetCrLf());
+    CQoString text;
+    Row(out, {"a\nb", "", "z"}, &text);
+    EXPECT_EQ(std::string("a\nb ") + "      " + "z ", text.Str());
+}
+
+TEST(TextOutputFix, LengthsOutsideTheColumnsAndOddLengths)
+{
+    CQoOutputFilterTextFix out;
+    out.NumCols(2);
+    try {
+        out.SetLength(2, 5);
+        FAIL() << "no error for column 2";
+    } catch (CQoException const &e) {
+        EXPECT_EQ(CQoException::indexError, e.Code());
+    }
+    EXPECT_THROW(out.GetLength(-1), CQoException);
+    out.SetLength(0, -5); // kept as given, written as 0
+    out.SetLength(1, 3);
+    EXPECT_EQ(-5, out.GetLength(0));
+    EXPECT_EQ(3, out.RecordLength());
+    CQoString text;
+    Row(out, {"weg", "da"}, &text);
+    EXPECT_EQ("da \r\n", text.Str());
+
+    // Growing keeps the lengths set and gives new columns the default.
+    out.NumCols(3);
+    EXPECT_EQ(3, out.GetLength(1));
+    EXPECT_EQ(30, out.GetLength(2));
+    out.NumCols(1);
+    EXPECT_THROW(out.GetLength(1), CQoException);
+
+    // Writing needs a file.
+    EXPECT_FALSE(out.Init());
+    out.InitRow();
+    EXPECT_THROW(out.WriteRow(), CQoException);
+}
+
+TEST(TextOutputFix, SettingsRoundTripThroughTheConfigurationFile)
+{
+    CQoOutputFilterTextFix out;
+    out.NumCols(3);
+    out.ColumnName(0, "Name");
+    out.ColumnName(2, "Ort");
+    out.SetLength(0, 12);
+    out.SetLength(1, 0);
+    out.SetLength(2, 255);
+    out.CrLf(false);
+    out.FileCharSet(CQoFile::ascii);
+    CQoConfigFile cfg;
+    out.WriteConfig(cfg, "Fix");
+    CQoString text = cfg.ToText();
+    CQoConfigFile back;
+    back.FromText(text, std::size_t(text.GetLength()));
+
+    CQoOutputFilterTextFix copy;
+    copy.ReadConfig(back, "Fix");
+    ASSERT_EQ(3, copy.NumCols());
+    EXPECT_EQ(12, copy.GetLength(0));
+    EXPECT_EQ(0, copy.GetLength(1));
+    EXPECT_EQ(255, copy.GetLength(2));
+    EXPECT_FALSE(copy.GetCrLf());
+    EXPECT_EQ(CQoFile::ascii, copy.FileCharSet());
+    CQoString name;
+    copy.GetColumnName(2, name);
+    EXPECT_EQ("Ort", name);
+
+    // Keys that are missing keep what the filter had.
+    CQoOutputFilterTextFix other;
+    other.NumCols(1);
+    other.SetLength(0, 7);
+    other.ReadConfig(back, "Fehlt");
+    EXPECT_EQ(7, other.GetLength(0));
+    EXPECT_TRUE(other.GetCrLf());
+}

@@ -1,0 +1,263 @@
+// The delimited text output: its dialects read back by Python's csv module,
+// the preview text, bad settings and the configuration keys.
+#include "CQoConfigFile.h"
+#include "CQoException.h"
+#include "CQoFile.h"
+#include "CQoOutputFilterTextVar.h"
+
+#include "DbasePythonPeer.h"
+#include "TempFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+namespace {
+
+std::string Line(CQoOutputFilterTextVar &out, std::vector<std::string> const &values)
+{
+    out.NumCols(int(values.size()));
+    out.InitRow();
+    for (std::size_t c = 0; c < values.size(); ++c)
+        out.Value(int(c), values[c].c_str());
+    CQoString text;
+    EXPECT_TRUE(out.WriteRow(&text));
+    return text.Str();
+}
+
+// Values that test the quoting: delimiters, enclosers, escapes, line
+// breaks, blanks, empty fields and umlauts.
+std::vector<std::vector<std::string>> const kRows = {
+    {"a", "b;c", "say \"hi\"", ""},
+    {"", "", "", ""},
+    {"zwei\r\nZeilen", "nur\nLF", "back\\slash", "tab\there"},
+    {" blank ", "\"", "'quoted'", "\xE4\xF6\xFC\xDF\xC4"},
+    {"a,b", "x|y", "\\\"", "end;"},
+};
+
+struct Dialect {
+    char const *name;
+    char delimiter, encloser, escape;
+    bool force;
+    char const *python; // the csv.reader arguments that read it
+};
+
+std::vector<Dialect> const kDialects = {
+    {"semicolon", ';', '"', 0, false, "delimiter=';', quotechar='\"', doublequote=True"},
+    {"forced", ';', '"', 0, true, "delimiter=';', quotechar='\"', doublequote=True"},
+    {"escape", ';', '"', '\\', false, "delimiter=';', quotechar='\"', doublequote=False, escapechar='\\\\'"},
+    {"tab", '\t', '\'', 0, false, "delimiter='\\t', quotechar=\"'\", doublequote=True"},
+    {"no encloser", ',', 0, '\\', false, "delimiter=',', quoting=csv.QUOTE_NONE, escapechar='\\\\'"},
+};
+
+} // namespace
+
+TEST(TextOutputVarPeer, PythonCsvReadsEveryDialectBack)
+{
+    PeerFolder folder;
+    if (!folder.Usable())
+        PEER_UNAVAILABLE();
+    std::string script = "import csv\nresults = []\n";
+    for (Dialect const &d : kDialects) {
+        std::string path = folder.Path((std::string(d.name) + ".csv").c_str());
+        CQoFile file;
+        ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
+        CQoOutputFilterTextVar out;
+        out.Delimiter(d.delimiter);
+        out.Encloser(d.encloser);
+        out.Escape(d.escape);
+        out.ForceEncloser(d.force);
+        out.WriteHeaderFlag(true);
+        out.NumCols(4);
+        char const *names[] = {"Name", "Stra\337e", "a;b", "\"x\""};
+        for (int c = 0; c < 4; ++c)
+            out.ColumnName(c, names[c]);
+        out.UseFile(&file, true);
+        ASSERT_TRUE(out.Init()) << d.name;
+        ASSERT_TRUE(out.WriteHeader());
+        for (auto const &row : kRows) {
+            out.InitRow();
+            for (std::size_t c = 0; c < row.size(); ++c)
+                out.Value(int(c), row[c].c_str());
+            ASSERT_TRUE(out.WriteRow());
+        }
+        out.ReleaseFile();
+        script += std::string("with open(os.path.join(folder, '") + d.name +
+                  ".csv'), newline='', encoding='cp1252') as f:\n    results.append(list(csv.reader(f, " +
+                  d.python + ")))\n";
+    }
+    script += "with open(os.path.join(folder, 'rows.txt'), 'w', encoding='cp1252', newline='\\n') as out:\n"
+              "    for rows in results:\n"
+              "        out.write(repr(rows) + '\\n')\n";
+    if (!RunPython(folder, "readcsv", script))
+        PEER_UNAVAILABLE();
+
+    // What the file should read as, in Python's notation.
+    auto repr = [](std::string const &s) {
+        std::string out = "'";
+        for (char c : s) {
+            if (c == '\\')
+                out += "\\\\";
+            else if (c == '\'')
+                out += "\\'";
+            else if (c == '\n')
+                out += "\\n";
+            else if (c == '\r')
+                out += "\\r";
+            else if (c == '\t')
+                out += "\\t";
+            else
+                out += c;
+        }
+        return out + "'";
+    };
+    std::string expected = "[['Name', 'Stra\xDF" "e', 'a;b', " + repr("\"x\"") + "]";
+    for (auto const &row : kRows) {
+        expected += ", [";
+        for (std::size_t c = 0; c < row.size(); ++c)
+            expected += (c ? ", " : "") + repr(row[c]);
+        expected += "]";
+    }
+    expected += "]";
+    std::vector<std::string> lines = ReadPeerLines(folder.Path("rows.txt"));
+    ASSERT_EQ(kDialects.size(), lines.size());
+    for (std::size_t i = 0; i < kDialects.size(); ++i) {
+        // Python's repr picks double quotes for a text holding a single quote.
+        std::string want = expected;
+        std::string got = lines[i];
+        for (std::string *s : {&want, &got})
+            for (std::size_t p; (p = s->find("\"'quoted'\"")) != std::string::npos;)
+                s->replace(p, 10, "'\\'quoted\\''");
+        EXPECT_EQ(want, got) << kDialects[i].name;
+    }
+}
+
+TEST(TextOutputVar, PreviewTextIsExactlyTheLine)
+{
+    CQoOutputFilterTextVar out;
+    EXPECT_EQ(';', out.Delimiter());
+    EXPECT_EQ('"', out.Encloser());
+    EXPECT_EQ(0, out.Escape());
+    EXPECT_EQ("a;\"b;c\";\"x\"\"y\";\r\n", Line(out, {"a", "b;c", "x\"y", ""}));
+    out.ForceEncloser(true);
+    EXPECT_EQ("\"a\";\"\"\r\n", Line(out, {"a", ""}));
+    out.ForceEncloser(false);
+
+    // A single empty column is not an empty line.
+    EXPECT_EQ("\"\"\r\n", Line(out, {""}));
+
+    // Header only when asked for; the preview writes nothing anywhere.
+    out.NumCols(2);
+    out.ColumnName(0, "Name");
+    out.ColumnName(1, "Vor;name");
+    CQoString header("alt");
+    EXPECT_TRUE(out.WriteHeader(&header));
+    EXPECT_TRUE(header.IsEmpty());
+    out.WriteHeaderFlag(true);
+    EXPECT_TRUE(out.WriteHeader(&header));
+    EXPECT_EQ("Name;\"Vor;name\"\r\n", header.Str());
+    EXPECT_EQ(0, out.wroteBytes());
+
+    out.Delimiter('\t');
+    out.Encloser(0);
+    out.Escape('\\');
+    EXPECT_EQ("a\\\tb\t\\\\\tz\\\r\\\n\r\n", Line(out, {"a\tb", "\\", "z\r\n"}));
+}
+
+TEST(TextOutputVar, SettingsThatCannotMakeAReadableFileAreRefused)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("bad.csv");
+    CQoFile file;
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
+    CQoOutputFilterTextVar out;
+    out.UseFile(&file, false);
+    auto initError = [&]() {
+        try {
+            out.Init();
+        } catch (CQoException const &e) {
+            return std::string(e.Message());
+        }
+        return std::string();
+    };
+    out.Delimiter(0);
+    EXPECT_NE(std::string::npos, initError().find("kein Trennzeichen"));
+    out.Delimiter('"');
+    EXPECT_NE(std::string::npos, initError().find("nicht gleich"));
+    out.Delimiter(';');
+    out.Escape(';');
+    EXPECT_NE(std::string::npos, initError().find("Escape"));
+    out.Escape(0);
+    out.Encloser('\n');
+    EXPECT_NE(std::string::npos, initError().find("Zeilenumbr"));
+
+    // Neither encloser nor escape: a value with the delimiter cannot be written.
+    out.Encloser(0);
+    ASSERT_TRUE(out.Init());
+    out.NumCols(2);
+    out.InitRow();
+    out.Value(0, "ok");
+    ASSERT_TRUE(out.WriteRow());
+    out.Value(1, "a;b");
+    EXPECT_THROW(out.WriteRow(), CQoException);
+    out.Value(1, "zwei\nZeilen");
+    EXPECT_THROW(out.WriteRow(), CQoException);
+    out.ReleaseFile();
+    file.Close();
+    EXPECT_EQ("ok;\r\n", ReadBytes(path));
+
+    CQoOutputFilterTextVar nofile;
+    EXPECT_FALSE(nofile.Init());
+}
+
+TEST(TextOutputVar, DosCharacterSetAndSettingsRoundTrip)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("dos.csv");
+    CQoFile file;
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create));
+    CQoOutputFilterTextVar out;
+    out.FileCharSet(CQoFile::ascii);
+    out.Delimiter('|');
+    out.Encloser('\'');
+    out.Escape('\\');
+    out.ForceEncloser(true);
+    out.WriteHeaderFlag(true);
+    out.NumCols(1);
+    out.ColumnName(0, "Gr\xF6\xDF" "e");
+    out.UseFile(&file, true);
+    ASSERT_TRUE(out.Init());
+    out.WriteHeader();
+    out.InitRow();
+    out.Value(0, "\xC4rger's");
+    out.WriteRow();
+    out.ReleaseFile();
+    EXPECT_EQ("'Gr\x94\xE1" "e'\r\n'\x8Erger\\'s'\r\n", ReadBytes(path));
+
+    CQoConfigFile cfg;
+    out.WriteConfig(cfg, "Csv");
+    CQoString text = cfg.ToText();
+    CQoConfigFile back;
+    back.FromText(text, std::size_t(text.GetLength()));
+    CQoOutputFilterTextVar copy;
+    copy.ReadConfig(back, "Csv");
+    EXPECT_EQ('|', copy.Delimiter());
+    EXPECT_EQ('\'', copy.Encloser());
+    EXPECT_EQ('\\', copy.Escape());
+    EXPECT_TRUE(copy.ForceEncloser());
+    EXPECT_TRUE(copy.WriteHeaderFlag());
+    EXPECT_EQ(CQoFile::ascii, copy.FileCharSet());
+    ASSERT_EQ(1, copy.NumCols());
+    CQoString name;
+    copy.GetColumnName(0, name);
+    EXPECT_EQ("Gr\xF6\xDF" "e", name);
+
+    // A tab survives as a tab, "none" as none.
+    out.Delimiter('\t');
+    out.Escape(0);
+    out.WriteConfig(cfg, "Csv");
+    copy.ReadConfig(cfg, "Csv");
+    EXPECT_EQ('\t', copy.Delimiter());
+    EXPECT_EQ(0, copy.Escape());
+}
