@@ -1,0 +1,265 @@
+// The filter bases as derived filters and hosts see them.
+#include "CQoConfigFile.h"
+#include "CQoDatabase.h"
+#include "CQoException.h"
+#include "CQoFile.h"
+#include "CQoInputFilterDB.h"
+#include "CQoOutputFilterDB.h"
+#include "CQoOutputSource.h"
+#include "CQoOutputSourceInputFilter.h"
+
+#include "TempFolder.h"
+#include "TextFilterTestSupport.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+// A table of rows held in memory, as the smallest input filter there is: it
+// relies on the base for row counting, walking and names.
+class ListFilter : public CQoInputFilter {
+public:
+    explicit ListFilter(std::vector<Row> rows, int cols) : m_rows(std::move(rows)) { SetNumColsInternal(cols); }
+    bool FirstRow() override { return Go(0); }
+    bool NextRow() override { return m_lCurrentRow >= 0 && Go(m_lCurrentRow + 1); }
+    void Value(int col, CQoString &value) override
+    {
+        value.Empty();
+        if (m_lCurrentRow >= 0 && col >= 0 && col < static_cast<int>(m_rows[m_lCurrentRow].size()))
+            value = m_rows[m_lCurrentRow][col].c_str();
+    }
+    int walks = 0;
+
+private:
+    bool Go(long row)
+    {
+        ++walks;
+        if (row >= static_cast<long>(m_rows.size()))
+            return false;
+        m_lCurrentRow = row;
+        return true;
+    }
+    std::vector<Row> m_rows;
+};
+
+class Source : public CQoOutputSource {
+public:
+    int GetNumColumns() override { return 2; }
+    long GetNumRows() override { return rows; }
+    void GetValue(long row, int col, CQoString &value) override { value.Format("r%ldc%d", row, col); }
+    void GetColumnName(int col, CQoString &name) override { name.Format("S%d", col); }
+    long rows = 3;
+};
+
+class OutDB : public CQoOutputFilterDB {
+public:
+    bool Init() override { return true; }
+    bool WriteRow(CQoString *text = nullptr) override
+    {
+        std::string line;
+        for (CQoString const &v : m_values)
+            line += v.Str() + ";";
+        line += "\n";
+        if (text)
+            *text = line.c_str();
+        else
+            WriteToFile(line.data(), line.size());
+        return true;
+    }
+};
+
+class MemoryDB : public CQoDatabase {
+public:
+    using CQoDatabase::CQoDatabase;
+    bool Open(bool) override { return open = true; }
+    bool IsOpen() override { return open; }
+    void Close() override { open = false; }
+    void ExecuteSql(char const *sql) override { statements.push_back(sql); }
+    bool open = false;
+    std::vector<std::string> statements;
+};
+
+} // namespace
+
+TEST(FilterBaseInput, CountsWalksAndNamesRowsForADerivedFilter)
+{
+    ListFilter f({{"a", "b"}, {"", ""}, {"c"}}, 2);
+    EXPECT_EQ(3, f.NumRows());
+    int walks = f.walks;
+    EXPECT_EQ(3, f.NumRows()) << "the count is kept";
+    EXPECT_EQ(walks, f.walks);
+    f.SetNumRows(0);
+    EXPECT_EQ(3, f.NumRows()) << "SetNumRows(0) counts anew";
+    EXPECT_GT(f.walks, walks);
+
+    ASSERT_TRUE(f.AbsoluteRow(2));
+    EXPECT_EQ((Row{"c", ""}), CurrentRow(f));
+    ASSERT_TRUE(f.AbsoluteRow(1));
+    EXPECT_TRUE(f.EmptyRow());
+    EXPECT_FALSE(f.AbsoluteRow(3));
+    EXPECT_FALSE(f.AbsoluteRow(-1));
+
+    CQoString name;
+    f.ColName(1, name);
+    EXPECT_EQ("Feld 2", name);
+    f.SetColName(1, "Ort");
+    f.ColName(1, name);
+    EXPECT_EQ("Ort", name);
+    EXPECT_TRUE(f.IsModified());
+    f.SetColName(5, "nichts");
+    f.ColName(5, name);
+    EXPECT_EQ("", name);
+    EXPECT_EQ(CQoInputFilter::filterUnknown, f.InputFilterType());
+    EXPECT_EQ(-1, f.getActPosInFile());
+}
+
+TEST(FilterBaseInput, CommonSettingsRoundTripAndRefuseUnknownCharSets)
+{
+    ListFilter a({}, 0);
+    a.CharSet(CQoFile::ascii);
+    a.SetFirstRowHasNames(true);
+    a.CharSet(12345);
+    EXPECT_EQ(CQoFile::ascii, a.CharSet());
+    CQoConfigFile cfg;
+    a.WriteConfig(cfg, "in");
+    ListFilter b({}, 0);
+    b.ReadConfig(cfg, "in");
+    EXPECT_EQ(CQoFile::ascii, b.CharSet());
+    EXPECT_TRUE(b.GetFirstRowHasNames());
+    ListFilter c({}, 0);
+    c.CopyFrom(a);
+    EXPECT_EQ(CQoFile::ascii, c.CharSet());
+}
+
+TEST(FilterBaseInput, ReportWrongInputCountsAndAsksTheHook)
+{
+    ListFilter f({}, 0);
+    CQoString data("kaputt\nnaechster");
+    int pos = 7;
+    EXPECT_EQ(CQoInterActive::repairNoHandler, f.ReportWrongInput(data, pos));
+    EXPECT_EQ(1, f.WrongInputCount());
+    EXPECT_NE(std::string::npos, std::string(f.LastWrongInput()).find("kaputt"));
+    RepairScript script({CQoInterActive::repairSkip}, {}, 3);
+    EXPECT_EQ(CQoInterActive::repairSkip, f.ReportWrongInput(data, pos));
+    EXPECT_EQ(3, pos);
+    EXPECT_EQ("kaputt\nnaechster", RepairScript::calls.at(0).data);
+}
+
+TEST(FilterBaseInput, DatabaseFilterKeepsTableSelection)
+{
+    struct DB : CQoInputFilterDB {
+    } f;
+    f.InitTable("select * from t", CQoInputFilterDB::tableSql, false);
+    EXPECT_EQ("select * from t", f.GetTableName());
+    EXPECT_EQ(CQoInputFilterDB::tableSql, f.GetTableType());
+    EXPECT_TRUE(f.IsModified());
+}
+
+TEST(FilterBaseOutput, ColumnsRowsAndTheIndexError)
+{
+    OutDB out;
+    out.NumCols(2);
+    out.ColumnName(0, "A");
+    out.ColumnName(1, "B");
+    CQoString name;
+    out.GetColumnName(1, name);
+    EXPECT_EQ("B", name);
+    EXPECT_EQ(OutDB::dbtypeText, out.GetType(1));
+    EXPECT_EQ(OutDB::defaultLength, out.GetLength(0));
+    EXPECT_FALSE(out.GetIndexed(0));
+    out.SetType(0, OutDB::dbtypeInteger);
+    out.SetIndexed(1, true);
+    out.SetLength(1, 12);
+    for (auto call : {+[](OutDB &o) { o.GetType(2); }, +[](OutDB &o) { o.GetLength(-1); },
+                      +[](OutDB &o) { o.SetIndexed(2, true); }, +[](OutDB &o) { CQoString n; o.GetColumnName(7, n); },
+                      +[](OutDB &o) { o.Value(2, "x"); }}) {
+        try {
+            call(out);
+            ADD_FAILURE() << "an index outside the columns must raise";
+        } catch (CQoException const &e) {
+            EXPECT_EQ(CQoException::indexError, e.Code());
+        }
+    }
+    out.InitRow();
+    out.Value(0, "1");
+    CQoString text;
+    out.WriteRow(&text);
+    EXPECT_EQ("1;;\n", text);
+    CQoString header("x");
+    EXPECT_TRUE(out.WriteHeader(&header));
+    EXPECT_EQ("", header);
+
+    out.NumCols(3);
+    EXPECT_EQ(OutDB::dbtypeInteger, out.GetType(0)) << "growing keeps the settings";
+    EXPECT_EQ(12, out.GetLength(1));
+    EXPECT_EQ(OutDB::dbtypeText, out.GetType(2));
+
+    MemoryDB db("speicher");
+    out.UseDB(&db);
+    EXPECT_EQ(&db, out.GetDB());
+    EXPECT_EQ("speicher", db.GetConnectString());
+    out.ReleaseDB();
+    EXPECT_EQ(nullptr, out.GetDB());
+    out.SetTableName("T");
+    EXPECT_EQ("T", out.GetTableName());
+}
+
+TEST(FilterBaseOutput, WritesThroughTheFileItUsesAndCountsBytes)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("o.txt");
+    OutDB out;
+    out.NumCols(1);
+    out.InitRow();
+    EXPECT_THROW(out.WriteRow(), CQoException) << "no file in use";
+    CQoFile file(path.c_str(), CQoFile::create | CQoFile::binary);
+    out.FileCharSet(CQoFile::ascii);
+    out.UseFile(&file, true);
+    EXPECT_EQ(CQoFile::ascii, file.FileCharSet());
+    out.Value(0, "\xE4");
+    out.WriteRow();
+    out.Value(0, "z");
+    out.WriteRow();
+    EXPECT_EQ(6, out.wroteBytes());
+    out.ReleaseFile();
+    EXPECT_FALSE(file.IsOpen());
+    EXPECT_EQ("\x84;\nz;\n", ReadBytes(path));
+
+    CQoConfigFile cfg;
+    out.ColumnName(0, "N");
+    out.WriteConfig(cfg, "out");
+    OutDB back;
+    back.ReadConfig(cfg, "out");
+    ASSERT_EQ(1, back.NumCols());
+    CQoString name;
+    back.GetColumnName(0, name);
+    EXPECT_EQ("N", name);
+    EXPECT_EQ(CQoFile::ascii, back.FileCharSet());
+}
+
+TEST(FilterBaseSource, AnOutputSourceReadsAsAnInputFilter)
+{
+    Source source;
+    CQoOutputSourceInputFilter f(&source);
+    EXPECT_EQ(2, f.NumCols());
+    EXPECT_EQ(3, f.NumRows());
+    std::vector<Row> rows = AllRows(f);
+    ASSERT_EQ(3u, rows.size());
+    EXPECT_EQ((Row{"r2c0", "r2c1"}), rows[2]);
+    CQoString name;
+    f.ColName(1, name);
+    EXPECT_EQ("S1", name);
+    source.rows = 5;
+    EXPECT_EQ(5, f.NumRows()) << "the source is asked each time";
+    ASSERT_TRUE(f.AbsoluteRow(4));
+    EXPECT_EQ("r4c1", CurrentRow(f)[1]);
+    EXPECT_FALSE(f.AbsoluteRow(5));
+    EXPECT_EQ(-1, source.GetDataLength(0));
+
+    f.SetOutputSource(nullptr);
+    EXPECT_EQ(0, f.NumCols());
+    EXPECT_FALSE(f.FirstRow());
+
+    CQoOutputSource *made = new Source;
+    made->Delete(); // deletes inside the library; the sanitizer sees leaks
+}
