@@ -363,6 +363,8 @@ DialogDriver::DialogDriver()
 DialogDriver::~DialogDriver()
 {
     if (m_hook) UnhookWindowsHookEx(m_hook);
+    if (m_reportFailures && !m_queue.empty())
+        ADD_FAILURE() << m_queue.size() << " dialog script(s) never ran: the dialogs did not appear";
     for (const Watch& w : m_watch) {
         if (!IsWindow(w.hwnd)) continue;
         KillTimer(w.hwnd, kScriptTimer);

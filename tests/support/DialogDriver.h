@@ -28,7 +28,7 @@
 // Robustness: if a dialog is still open some time after its script ran (or no script was queued
 // for it, or the script threw), the driver closes it (IDCANCEL, then WM_CLOSE, then EndDialog) and
 // counts it in Unanswered(); the reason is kept in Errors() and, unless switched off, the running
-// test fails. A dialog that is disabled because a
+// test fails. Scripts still queued when the driver is destroyed fail the test as well. A dialog that is disabled because a
 // nested modal box is open over it is left alone until that box has gone.
 #pragma once
 

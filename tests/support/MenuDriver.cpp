@@ -182,6 +182,8 @@ MenuDriver::MenuDriver()
 MenuDriver::~MenuDriver()
 {
     if (m_hook) UnhookWindowsHookEx(m_hook);
+    if (m_reportFailures && !m_queue.empty())
+        ADD_FAILURE() << m_queue.size() << " menu script(s) never ran: the menus did not appear";
     if (m_timer) KillTimer(nullptr, m_timer);
     t_menuDriver = m_previous;
 }

@@ -129,4 +129,15 @@ TEST(MenuDriver, ClosesAMenuNoScriptAnswers)
     DestroyMenu(menu);
 }
 
+TEST(MenuDriver, ScriptsThatNeverRanAreReported)
+{
+    EXPECT_NONFATAL_FAILURE(
+        {
+            MenuDriver menus;
+            menus.Expect([](Menu& m) { m.Cancel(); });
+            EXPECT_FALSE(menus.Done());
+        },
+        "1 menu script(s) never ran");
+}
+
 }  // namespace
