@@ -244,7 +244,7 @@ AFX_API CObject* AFXAPI AfxStaticDownCast(CRuntimeClass* pClass, CObject* pObjec
 // Collate/CollateNoCase compare by the user locale's collation through
 // CompareStringA (so "Ä" sorts next to "A", not after "Z").
 // MakeUpper/MakeLower fold ASCII letters and the letters of Windows-1252
-// (ä/Ä, ö/Ö, ü/Ü, é/É, ...); "ß" and "ÿ" have no upper-case form in that
+// (ä/Ä, ö/Ö, ü/Ü, é/É, ...); "ß" and "µ" have no upper-case form in that
 // code page and stay unchanged under MakeUpper.
 // ---------------------------------------------------------------------------
 
@@ -628,6 +628,11 @@ public:
 private:
   __time64_t m_timeSpan;
 };
+
+// windows.h maps GetCurrentTime to GetTickCount; here it is CTime's member.
+#ifdef GetCurrentTime
+#undef GetCurrentTime
+#endif
 
 class AFX_API CTime {
 public:

@@ -1,0 +1,178 @@
+// Exceptions thrown as pointers: Delete for heap and stack objects, the MFC
+// macros, messages, cause codes, and exceptions that cross a DLL boundary.
+#include <afx.h>
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "core_testdll.h"
+
+namespace {
+
+class CCountedException : public CException {
+public:
+  static int destroyed;
+  CCountedException() {}
+  explicit CCountedException(BOOL bAutoDelete) : CException(bAutoDelete) {}
+  ~CCountedException() { ++destroyed; }
+};
+int CCountedException::destroyed = 0;
+
+std::string Message(const CException& e, UINT nMax = 512) {
+  char sz[512];
+  memset(sz, 'x', sizeof(sz));
+  BOOL bOk = e.GetErrorMessage(sz, nMax);
+  return bOk ? std::string(sz) : std::string("<none:") + sz + ">";
+}
+
+TEST(ExceptionDelete, HeapExceptionsAreFreedStackOnesAreNot) {
+  CCountedException::destroyed = 0;
+  try {
+    throw new CCountedException;
+  } catch (CException* e) {
+    e->Delete();
+  }
+  EXPECT_EQ(1, CCountedException::destroyed);
+
+  {
+    CCountedException onStack;
+    onStack.Delete(); // must not free a stack object
+    EXPECT_EQ(1, CCountedException::destroyed);
+  }
+  EXPECT_EQ(2, CCountedException::destroyed);
+
+  CCountedException* pKept = new CCountedException(FALSE); // auto-deletion off
+  pKept->Delete();
+  EXPECT_EQ(2, CCountedException::destroyed);
+  delete pKept;
+  EXPECT_EQ(3, CCountedException::destroyed);
+
+  // The static memory exception survives any number of Delete calls.
+  for (int i = 0; i < 3; ++i) {
+    try {
+      AfxThrowMemoryException();
+    } catch (CException* e) {
+      EXPECT_TRUE(e->IsKindOf(RUNTIME_CLASS(CMemoryException)));
+      e->Delete();
+    }
+  }
+}
+
+TEST(ExceptionMacros, CatchDeletesUnlessRethrown) {
+  CCountedException::destroyed = 0;
+  bool bCaught = false;
+  TRY {
+    THROW(new CCountedException);
+  }
+  CATCH(CFileException, e) {
+    ADD_FAILURE() << "wrong handler";
+  }
+  AND_CATCH(CException, e) {
+    bCaught = e != NULL;
+  }
+  END_CATCH
+  EXPECT_TRUE(bCaught);
+  EXPECT_EQ(1, CCountedException::destroyed);
+
+  CException* pOuter = NULL;
+  try {
+    TRY {
+      AfxThrowFileException(CFileException::diskFull, ERROR_DISK_FULL, "a.txt");
+    }
+    CATCH_ALL(e) {
+      THROW_LAST();
+    }
+    END_CATCH_ALL
+  } catch (CException* e) {
+    pOuter = e; // still alive after the inner block
+  }
+  ASSERT_NE(nullptr, pOuter);
+  CFileException* pFile = DYNAMIC_DOWNCAST(CFileException, pOuter);
+  ASSERT_NE(nullptr, pFile);
+  EXPECT_EQ(CFileException::diskFull, pFile->m_cause);
+  EXPECT_TRUE(pFile->m_strFileName == "a.txt");
+  pOuter->Delete();
+}
+
+TEST(ExceptionAcrossDll, ThrownInTheDllCaughtHere) {
+  try {
+    TestDllThrowFileException("C:\\fehlt.txt");
+    ADD_FAILURE() << "nothing thrown";
+  } catch (CException* e) {
+    ASSERT_TRUE(e->IsKindOf(RUNTIME_CLASS(CFileException)));
+    CFileException* pFile = static_cast<CFileException*>(e);
+    EXPECT_EQ(CFileException::fileNotFound, pFile->m_cause);
+    EXPECT_EQ((LONG)ERROR_FILE_NOT_FOUND, pFile->m_lOsError);
+    e->Delete();
+  }
+}
+
+TEST(ExceptionMessages, GermanTextsAndTruncation) {
+  CFileException e(CFileException::fileNotFound, ERROR_FILE_NOT_FOUND, "C:\\daten\\kunden.txt");
+  EXPECT_EQ("Die Datei C:\\daten\\kunden.txt wurde nicht gefunden.", Message(e));
+  EXPECT_EQ("Die Datei", Message(e, 10)); // 9 characters and the NUL
+  UINT nHelp = 99;
+  char sz[8];
+  e.GetErrorMessage(sz, sizeof(sz), &nHelp);
+  EXPECT_EQ(0u, nHelp);
+
+  CFileException denied(CFileException::accessDenied, ERROR_ACCESS_DENIED, "x.dbf");
+  EXPECT_EQ("Der Zugriff auf die Datei x.dbf wurde verweigert.", Message(denied));
+  CFileException unnamed(CFileException::diskFull);
+  EXPECT_NE(std::string::npos, Message(unnamed).find("(ohne Namen)"));
+  EXPECT_NE(std::string::npos, Message(unnamed).find("Datentr\xe4ger ist voll"));
+
+  EXPECT_EQ("Nicht gen\xfcgend Arbeitsspeicher.", Message(CMemoryException(FALSE)));
+  EXPECT_EQ("Dieser Vorgang wird nicht unterst\xfctzt.", Message(CNotSupportedException(FALSE)));
+  EXPECT_EQ("<none:>", Message(CUserException(FALSE)));
+  EXPECT_EQ("<none:>", Message(CCountedException(FALSE)));
+}
+
+TEST(ExceptionMessages, OsErrorsMapToCauses) {
+  EXPECT_EQ(CFileException::none, CFileException::OsErrorToException(NO_ERROR));
+  EXPECT_EQ(CFileException::fileNotFound, CFileException::OsErrorToException(ERROR_FILE_NOT_FOUND));
+  EXPECT_EQ(CFileException::badPath, CFileException::OsErrorToException(ERROR_PATH_NOT_FOUND));
+  EXPECT_EQ(CFileException::badPath, CFileException::OsErrorToException(ERROR_INVALID_NAME));
+  EXPECT_EQ(CFileException::tooManyOpenFiles, CFileException::OsErrorToException(ERROR_TOO_MANY_OPEN_FILES));
+  EXPECT_EQ(CFileException::accessDenied, CFileException::OsErrorToException(ERROR_ACCESS_DENIED));
+  EXPECT_EQ(CFileException::sharingViolation, CFileException::OsErrorToException(ERROR_SHARING_VIOLATION));
+  EXPECT_EQ(CFileException::lockViolation, CFileException::OsErrorToException(ERROR_LOCK_VIOLATION));
+  EXPECT_EQ(CFileException::diskFull, CFileException::OsErrorToException(ERROR_DISK_FULL));
+  EXPECT_EQ(CFileException::endOfFile, CFileException::OsErrorToException(ERROR_HANDLE_EOF));
+  EXPECT_EQ(CFileException::badSeek, CFileException::OsErrorToException(ERROR_NEGATIVE_SEEK));
+  EXPECT_EQ(CFileException::genericException, CFileException::OsErrorToException(ERROR_NOT_ENOUGH_QUOTA));
+
+  EXPECT_NO_THROW(CFileException::ThrowOsError(NO_ERROR, "x"));
+  try {
+    CFileException::ThrowOsError(ERROR_SHARING_VIOLATION, "offen.txt");
+    ADD_FAILURE() << "nothing thrown";
+  } catch (CFileException* e) {
+    EXPECT_EQ(CFileException::sharingViolation, e->m_cause);
+    EXPECT_TRUE(e->m_strFileName == "offen.txt");
+    e->Delete();
+  }
+}
+
+TEST(ExceptionThrowers, EachThrowsItsClass) {
+  struct Case {
+    void (*pfn)();
+    CRuntimeClass* pClass;
+  } cases[] = {
+      {AfxThrowNotSupportedException, RUNTIME_CLASS(CNotSupportedException)},
+      {AfxThrowInvalidArgException, RUNTIME_CLASS(CInvalidArgException)},
+      {AfxThrowResourceException, RUNTIME_CLASS(CResourceException)},
+      {AfxThrowUserException, RUNTIME_CLASS(CUserException)},
+  };
+  for (const Case& c : cases) {
+    try {
+      c.pfn();
+      ADD_FAILURE() << "nothing thrown";
+    } catch (CException* e) {
+      EXPECT_EQ(c.pClass, e->GetRuntimeClass());
+      e->Delete();
+    }
+  }
+}
+
+} // namespace

@@ -1,0 +1,283 @@
+// CFile and CStdioFile on real files in a temporary folder, and CTime.
+#include <afx.h>
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+namespace {
+
+class FileTest : public ::testing::Test {
+protected:
+  void SetUp() override {
+    char szTemp[MAX_PATH];
+    GetTempPathA(MAX_PATH, szTemp);
+    m_strDir.Format("%sqomfc_core_%lu_%lu", szTemp, GetCurrentProcessId(), GetTickCount());
+    ASSERT_TRUE(CreateDirectoryA(m_strDir, NULL));
+    m_strDir += "\\";
+  }
+  void TearDown() override {
+    WIN32_FIND_DATAA fd;
+    HANDLE h = FindFirstFileA(m_strDir + "*", &fd);
+    if (h != INVALID_HANDLE_VALUE) {
+      do {
+        if (!(fd.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY)) DeleteFileA(m_strDir + fd.cFileName);
+      } while (FindNextFileA(h, &fd));
+      FindClose(h);
+    }
+    RemoveDirectoryA(m_strDir);
+  }
+  CString Path(LPCSTR lpszName) const { return m_strDir + lpszName; }
+  std::string ReadAll(LPCSTR lpszName) const {
+    std::string s;
+    CFile f;
+    if (!f.Open(Path(lpszName), CFile::modeRead | CFile::shareDenyNone)) return "<missing>";
+    char buf[4096];
+    UINT n;
+    while ((n = f.Read(buf, sizeof(buf))) > 0) s.append(buf, n);
+    return s;
+  }
+  void WriteAll(LPCSTR lpszName, const std::string& data) const {
+    CFile f(Path(lpszName), CFile::modeCreate | CFile::modeWrite);
+    f.Write(data.data(), (UINT)data.size());
+  }
+
+  CString m_strDir;
+};
+
+TEST_F(FileTest, WriteReadSeekLength) {
+  std::string data;
+  for (int i = 0; i < 100000; ++i) data += (char)(i * 7);
+  {
+    CFile f;
+    ASSERT_TRUE(f.Open(Path("daten.bin"), CFile::modeCreate | CFile::modeReadWrite));
+    f.Write(data.data(), (UINT)data.size());
+    EXPECT_EQ(100000u, f.GetLength());
+    EXPECT_EQ(100000u, f.GetPosition());
+    EXPECT_EQ(10u, f.Seek(10, CFile::begin));
+    char buf[5];
+    EXPECT_EQ(5u, f.Read(buf, 5));
+    EXPECT_EQ(data.substr(10, 5), std::string(buf, 5));
+    EXPECT_EQ(13u, f.Seek(-2, CFile::current));
+    EXPECT_EQ(99990u, f.Seek(-10, CFile::end));
+    EXPECT_EQ(10u, f.Read(buf, 5) + f.Read(buf, 5));
+    EXPECT_EQ(0u, f.Read(buf, 5)); // at the end
+    f.SetLength(50);
+    EXPECT_EQ(50u, f.GetLength());
+    EXPECT_EQ(50u, f.SeekToEnd());
+    f.SeekToBegin();
+    EXPECT_EQ(0u, f.GetPosition());
+    f.Flush();
+    f.Close();
+    EXPECT_EQ(CFile::hFileNull, f.m_hFile);
+  }
+  EXPECT_EQ(data.substr(0, 50), ReadAll("daten.bin"));
+}
+
+TEST_F(FileTest, MissingFileGivesCauseCodes) {
+  CFile f;
+  CFileException e;
+  CString strMissing = Path("fehlt.txt");
+  EXPECT_FALSE(f.Open(strMissing, CFile::modeRead, &e));
+  EXPECT_EQ(CFileException::fileNotFound, e.m_cause);
+  EXPECT_EQ((LONG)ERROR_FILE_NOT_FOUND, e.m_lOsError);
+  EXPECT_TRUE(e.m_strFileName == strMissing);
+  EXPECT_EQ(CFile::hFileNull, f.m_hFile);
+  char szMsg[512];
+  ASSERT_TRUE(e.GetErrorMessage(szMsg, sizeof(szMsg)));
+  EXPECT_EQ("Die Datei " + std::string(strMissing) + " wurde nicht gefunden.", std::string(szMsg));
+
+  CFileException e2;
+  EXPECT_FALSE(f.Open(Path("gibtsnicht\\x.txt"), CFile::modeCreate | CFile::modeWrite, &e2));
+  EXPECT_EQ(CFileException::badPath, e2.m_cause);
+  EXPECT_EQ((LONG)ERROR_PATH_NOT_FOUND, e2.m_lOsError);
+
+  EXPECT_FALSE(f.Open(strMissing, CFile::modeRead)); // no exception object: just FALSE
+
+  try {
+    CFile thrower(strMissing, CFile::modeRead);
+    ADD_FAILURE() << "nothing thrown";
+  } catch (CFileException* pe) {
+    EXPECT_EQ(CFileException::fileNotFound, pe->m_cause);
+    EXPECT_TRUE(pe->m_strFileName == strMissing);
+    pe->Delete();
+  }
+
+  try {
+    CFile::Remove(strMissing);
+    ADD_FAILURE() << "nothing thrown";
+  } catch (CFileException* pe) {
+    EXPECT_EQ(CFileException::fileNotFound, pe->m_cause);
+    pe->Delete();
+  }
+}
+
+TEST_F(FileTest, CreateTruncatesUnlessNoTruncate) {
+  WriteAll("a.txt", "alter Inhalt");
+  {
+    CFile f(Path("a.txt"), CFile::modeCreate | CFile::modeNoTruncate | CFile::modeWrite);
+    EXPECT_EQ(12u, f.GetLength());
+    f.SeekToEnd();
+    f.Write("!", 1);
+  }
+  EXPECT_EQ("alter Inhalt!", ReadAll("a.txt"));
+  {
+    CFile f(Path("a.txt"), CFile::modeCreate | CFile::modeWrite);
+    EXPECT_EQ(0u, f.GetLength());
+  }
+  EXPECT_EQ("", ReadAll("a.txt"));
+}
+
+TEST_F(FileTest, SharingAndAccess) {
+  WriteAll("s.txt", "x");
+  CFile first;
+  ASSERT_TRUE(first.Open(Path("s.txt"), CFile::modeRead | CFile::shareDenyWrite));
+  CFile second;
+  CFileException e;
+  EXPECT_FALSE(second.Open(Path("s.txt"), CFile::modeWrite | CFile::shareDenyNone, &e));
+  EXPECT_EQ(CFileException::sharingViolation, e.m_cause);
+  EXPECT_TRUE(second.Open(Path("s.txt"), CFile::modeRead | CFile::shareDenyNone));
+  second.Close();
+  first.Close();
+
+  CFile writeOnly(Path("s.txt"), CFile::modeWrite);
+  char c;
+  try {
+    writeOnly.Read(&c, 1);
+    ADD_FAILURE() << "nothing thrown";
+  } catch (CFileException* pe) {
+    EXPECT_EQ(CFileException::accessDenied, pe->m_cause);
+    EXPECT_TRUE(pe->m_strFileName == Path("s.txt"));
+    pe->Delete();
+  }
+}
+
+TEST_F(FileTest, DestructorClosesTheFile) {
+  {
+    CFile f(Path("d.txt"), CFile::modeCreate | CFile::modeWrite | CFile::shareExclusive);
+    f.Write("abc", 3);
+  }
+  CFile again;
+  EXPECT_TRUE(again.Open(Path("d.txt"), CFile::modeReadWrite | CFile::shareExclusive));
+}
+
+TEST_F(FileTest, NamesStatusRenameRemove) {
+  WriteAll("Bericht.2024.txt", "12345");
+  CFile f(Path("Bericht.2024.txt"), CFile::modeRead);
+  EXPECT_TRUE(f.GetFileName() == "Bericht.2024.txt");
+  EXPECT_TRUE(f.GetFileTitle() == "Bericht.2024");
+  EXPECT_TRUE(f.GetFilePath() == Path("Bericht.2024.txt"));
+  CFileStatus st;
+  ASSERT_TRUE(f.GetStatus(st));
+  EXPECT_EQ(5u, st.m_size);
+  f.Close();
+
+  CFileStatus status;
+  ASSERT_TRUE(CFile::GetStatus(Path("Bericht.2024.txt"), status));
+  EXPECT_EQ(5u, status.m_size);
+  EXPECT_EQ(0, status.m_attribute & CFile::directory);
+  EXPECT_STREQ(Path("Bericht.2024.txt"), status.m_szFullName);
+  EXPECT_LT(llabs((long long)(status.m_mtime.GetTime() - CTime::GetCurrentTime().GetTime())), 3600);
+  EXPECT_FALSE(CFile::GetStatus(Path("fehlt.txt"), status));
+  EXPECT_FALSE(CFile::GetStatus(Path("*.txt"), status));
+  CFileStatus dirStatus;
+  ASSERT_TRUE(CFile::GetStatus(m_strDir.Left(m_strDir.GetLength() - 1), dirStatus));
+  EXPECT_NE(0, dirStatus.m_attribute & CFile::directory);
+
+  CFile::Rename(Path("Bericht.2024.txt"), Path("neu.txt"));
+  EXPECT_EQ("12345", ReadAll("neu.txt"));
+  EXPECT_EQ("<missing>", ReadAll("Bericht.2024.txt"));
+  CFile::Remove(Path("neu.txt"));
+  EXPECT_EQ("<missing>", ReadAll("neu.txt"));
+}
+
+TEST_F(FileTest, StdioFileTextMode) {
+  {
+    CStdioFile f(Path("t.txt"), CFile::modeCreate | CFile::modeWrite | CFile::typeText);
+    f.WriteString("erste Zeile\n");
+    f.WriteString("\n");
+    f.WriteString("Gr\xf6\xdf" "e\nohne Ende");
+  }
+  EXPECT_EQ("erste Zeile\r\n\r\nGr\xf6\xdf" "e\r\nohne Ende", ReadAll("t.txt"));
+
+  CStdioFile f;
+  ASSERT_TRUE(f.Open(Path("t.txt"), CFile::modeRead | CFile::typeText));
+  CString line;
+  ASSERT_TRUE(f.ReadString(line));
+  EXPECT_TRUE(line == "erste Zeile");
+  ASSERT_TRUE(f.ReadString(line));
+  EXPECT_TRUE(line.IsEmpty()); // an empty line is still a line
+  ASSERT_TRUE(f.ReadString(line));
+  EXPECT_TRUE(line == "Gr\xf6\xdf" "e");
+  ASSERT_TRUE(f.ReadString(line));
+  EXPECT_TRUE(line == "ohne Ende");
+  EXPECT_FALSE(f.ReadString(line));
+  EXPECT_TRUE(line.IsEmpty());
+  f.Close();
+
+  std::string longLine(3000, 'L');
+  WriteAll("lang.txt", longLine + "\r\nx\r\n");
+  CStdioFile g(Path("lang.txt"), CFile::modeRead);
+  ASSERT_TRUE(g.ReadString(line));
+  EXPECT_EQ(3000, line.GetLength());
+  char sz[8];
+  ASSERT_NE(nullptr, g.ReadString(sz, sizeof(sz)));
+  EXPECT_STREQ("x\n", sz);
+  EXPECT_EQ(nullptr, g.ReadString(sz, sizeof(sz)));
+}
+
+TEST_F(FileTest, StdioFileBinaryAndAppend) {
+  {
+    CStdioFile f(Path("b.txt"), CFile::modeCreate | CFile::modeWrite | CFile::typeBinary);
+    f.WriteString("a\nb\n");
+  }
+  EXPECT_EQ("a\nb\n", ReadAll("b.txt"));
+  {
+    CStdioFile f(Path("b.txt"), CFile::modeCreate | CFile::modeNoTruncate | CFile::modeWrite | CFile::typeBinary);
+    f.WriteString("c\n"); // writes go to the end of an existing file
+    EXPECT_EQ(6u, f.GetLength());
+  }
+  EXPECT_EQ("a\nb\nc\n", ReadAll("b.txt"));
+
+  CStdioFile missing;
+  CFileException e;
+  EXPECT_FALSE(missing.Open(Path("fehlt.txt"), CFile::modeRead, &e));
+  EXPECT_EQ(CFileException::fileNotFound, e.m_cause);
+}
+
+TEST(CTimeTest, LocalPartsFormatAndSpans) {
+  CTime t(2024, 2, 29, 13, 5, 9);
+  EXPECT_EQ(2024, t.GetYear());
+  EXPECT_EQ(2, t.GetMonth());
+  EXPECT_EQ(29, t.GetDay());
+  EXPECT_EQ(13, t.GetHour());
+  EXPECT_EQ(5, t.GetMinute());
+  EXPECT_EQ(9, t.GetSecond());
+  EXPECT_EQ(5, t.GetDayOfWeek()); // Thursday
+  EXPECT_TRUE(t.Format("%d.%m.%Y %H:%M:%S") == "29.02.2024 13:05:09");
+
+  CTime later = t + CTimeSpan(1, 2, 3, 4);
+  EXPECT_TRUE(later.Format("%d.%m.%Y %H:%M:%S") == "01.03.2024 15:08:13");
+  CTimeSpan span = later - t;
+  EXPECT_EQ(1, span.GetDays());
+  EXPECT_EQ(2, span.GetHours());
+  EXPECT_EQ(3, span.GetMinutes());
+  EXPECT_EQ(4, span.GetSeconds());
+  EXPECT_TRUE(later > t);
+
+  FILETIME ft; // 1970-01-02 00:00:00 UTC
+  ULARGE_INTEGER u;
+  u.QuadPart = 116444736000000000ULL + 86400ULL * 10000000ULL;
+  ft.dwLowDateTime = u.LowPart;
+  ft.dwHighDateTime = u.HighPart;
+  EXPECT_EQ(86400, CTime(ft).GetTime());
+  EXPECT_TRUE(CTime(86400).FormatGmt("%Y-%m-%d %H:%M") == "1970-01-02 00:00");
+
+  SYSTEMTIME st;
+  ASSERT_TRUE(t.GetAsSystemTime(st));
+  EXPECT_EQ(2024, st.wYear);
+  EXPECT_EQ(29, st.wDay);
+  EXPECT_EQ(t, CTime(st));
+}
+
+} // namespace
