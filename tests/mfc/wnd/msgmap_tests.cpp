@@ -185,7 +185,8 @@ public:
 class MessageMapTest : public ::testing::Test {
 protected:
   void SetUp() override {
-    ASSERT_TRUE(m_wnd.CreateEx(0, NULL, "Probe", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 10, 10, 400, 300, NULL, NULL));
+    // Hidden unless a test paints: showing top-level windows is slow under Xvfb.
+    ASSERT_TRUE(m_wnd.CreateEx(0, NULL, "Probe", WS_OVERLAPPEDWINDOW, 10, 10, 400, 300, NULL, NULL));
   }
   void TearDown() override {
     if (::IsWindow(m_wnd.m_hWnd)) m_wnd.DestroyWindow();
@@ -293,6 +294,7 @@ TEST_F(MessageMapTest, ReflectedNotifyIsHandledByTheSubclassedControl) {
 }
 
 TEST_F(MessageMapTest, OwnerDrawnListBoxMeasuresAndDrawsItsItems) {
+  m_wnd.ShowWindow(SW_SHOWNOACTIVATE);
   COwnerDrawList list;
   ASSERT_TRUE(list.Create(WS_CHILD | WS_VISIBLE | LBS_OWNERDRAWVARIABLE | LBS_HASSTRINGS | LBS_NOTIFY,
                           CRect(10, 10, 200, 150), &m_wnd, IDC_DRAWLIST));
