@@ -1,5 +1,6 @@
 #include "CMultiColumnHandler.h"
 #include "CQoConfigFile.h"
+#include "CQoInputFilterTextVar.h"
 #include "CQoOutputSourceInputFilter.h"
 #include "MultiColumnTestData.h"
 #include "TempFolder.h"
@@ -262,6 +263,43 @@ TEST(MultiColumnSplit, WithoutReadFilterThereAreNoRows)
     EXPECT_EQ("", Val(*split, 0));
     EXPECT_EQ(0, h.NumOuterColumns());
     EXPECT_EQ(nullptr, h.CreateMultiColumnOutputSource());
+}
+
+TEST(MultiColumnSplit, SplitsTheColumnsOfADelimitedFile)
+{
+    TempFolder folder;
+    std::string const path = folder.Path("adressen.csv");
+    WriteBytes(path, "Person;Ort\r\n"
+                     "\"Meier, Hans Dr.\";Bonn\r\n"
+                     "\"Schulz, Eva\";K\xF6ln\r\n"
+                     "Meier Prof.;Ulm\r\n"
+                     "\"Weber, Jo\r\nsef\";Hof");
+    CQoInputFilterTextVar file;
+    file.Delimiter(';');
+    file.SetFirstRowHasNames(true);
+    file.Init(path.c_str());
+
+    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
+    h.SetAlwaysUseOuterNames(true);
+    h.SetReadFilter(&file);
+    FillSplit(h);
+    FilterPtr split(h.CreateMultiColumnInputFilter());
+    EXPECT_EQ(4, split->NumRows());
+    EXPECT_EQ("Person", Name(*split, 1));
+    EXPECT_EQ("Ort", Name(*split, 3));
+    EXPECT_TRUE(split->GetFirstRowHasNames());
+
+    ASSERT_TRUE(split->AbsoluteRow(2));
+    EXPECT_EQ("Meier", Val(*split, 0));
+    EXPECT_EQ("Prof.", Val(*split, 2));
+    ASSERT_TRUE(split->AbsoluteRow(0));
+    EXPECT_EQ("Hans", Val(*split, 1));
+    ASSERT_TRUE(split->NextRow());
+    EXPECT_EQ("K\xF6ln", Val(*split, 3));
+    ASSERT_TRUE(split->AbsoluteRow(3));
+    EXPECT_EQ("Jo\r\nsef", Val(*split, 1)); // a line break inside an enclosed field
+    EXPECT_FALSE(split->NextRow());
+    EXPECT_STREQ(path.c_str(), split->FileName());
 }
 
 // --- names and lookups ----------------------------------------------------------
