@@ -32,8 +32,9 @@
 // The objects made by Create... read the handler's mapping live: changes to the
 // handler show in their next value. They stay valid after the handler is gone
 // (they share the mapping), but the read filter and the output source they read
-// are not owned and must outlive them. The caller owns what Create... returns and
-// releases it with its Delete().
+// are not owned and must outlive them. The split filter moves the read filter:
+// while reading through it, do not move the read filter by other means. The
+// caller owns what Create... returns and releases it with its Delete().
 //
 //     CMultiColumnHandler handler(CMultiColumnHandler::splitInput);
 //     handler.SetReadFilter(&file);                     // "Name" = "Meier, Hans"
