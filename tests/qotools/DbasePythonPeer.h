@@ -12,6 +12,7 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
@@ -19,6 +20,7 @@
 #include <random>
 #include <sstream>
 #include <string>
+#include <thread>
 #include <vector>
 
 class PeerFolder {
@@ -59,29 +61,56 @@ private:
     std::string m_unix;
 };
 
+inline std::string ReadFileBytes(std::string const &path)
+{
+    std::ifstream in(path, std::ios::binary);
+    std::ostringstream all;
+    all << in.rdbuf();
+    return all.str();
+}
+
 // Writes `script` as <name>.py into the folder and runs it with the folder
 // (host path) as its only argument. Answers false when Python could not be
-// run at all; the script signals success by writing the file "done".
+// run or the script failed (its traceback is printed); waits at most two
+// minutes.
 inline bool RunPython(PeerFolder const &folder, char const *name, std::string const &script)
 {
     std::string file = std::string(name) + ".py";
     {
+        // The script body runs inside try: a failure leaves its traceback in
+        // "failed", success leaves "done".
+        std::string body;
+        std::istringstream lines(script);
+        for (std::string line; std::getline(lines, line);)
+            body += "    " + line + "\n";
         std::ofstream out(folder.Path(file.c_str()), std::ios::binary);
-        out << "import sys, os\nfolder = sys.argv[1]\n" << script
-            << "\nopen(os.path.join(folder, 'done'), 'w').write('ok')\n";
+        out << "import sys, os, traceback\nfolder = sys.argv[1]\ntry:\n    pass\n"
+            << body
+            << "except BaseException:\n"
+            << "    open(os.path.join(folder, 'failed'), 'w').write(traceback.format_exc())\n"
+            << "    sys.exit(1)\n"
+            << "open(os.path.join(folder, 'done'), 'w').write('ok')\n";
     }
     std::remove(folder.Path("done").c_str());
+    std::remove(folder.Path("failed").c_str());
 #ifdef _WIN32
     std::string command = "start /wait /unix /usr/bin/python3 " + folder.UnixPath(file.c_str()) + " " +
                           folder.UnixPath("").substr(0, folder.UnixPath("").size() - 1) + " >NUL 2>&1";
 #else
     std::string command = "/usr/bin/python3 " + folder.UnixPath(file.c_str()) + " " +
-                          folder.UnixPath("").substr(0, folder.UnixPath("").size() - 1) + " 2>" +
-                          folder.UnixPath("stderr.txt");
+                          folder.UnixPath("").substr(0, folder.UnixPath("").size() - 1);
 #endif
     std::system(command.c_str());
-    std::ifstream done(folder.Path("done"));
-    return done.good();
+    // Wine's start does not wait for a host program: wait for its answer.
+    for (int i = 0; i < 1200; ++i) {
+        if (std::filesystem::exists(folder.Path("done")))
+            return true;
+        if (std::filesystem::exists(folder.Path("failed")))
+            break;
+        std::this_thread::sleep_for(std::chrono::milliseconds(100));
+    }
+    std::printf("peer script %s did not finish: %s\n", name, ReadFileBytes(folder.Path("failed")).c_str());
+    return false;
 }
 
 // The peer could not be run: fail natively (Python is part of the set-up),
@@ -91,14 +120,6 @@ inline bool RunPython(PeerFolder const &folder, char const *name, std::string co
 #else
 #define PEER_UNAVAILABLE() FAIL() << "/usr/bin/python3 with dbf/dbfread did not run"
 #endif
-
-inline std::string ReadFileBytes(std::string const &path)
-{
-    std::ifstream in(path, std::ios::binary);
-    std::ostringstream all;
-    all << in.rdbuf();
-    return all.str();
-}
 
 // Lines of a file written by a peer script (LF separated, no trailing LF).
 inline std::vector<std::string> ReadPeerLines(std::string const &path)
