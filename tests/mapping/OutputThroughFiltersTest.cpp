@@ -1,11 +1,10 @@
-// A mapped output source as the base library's filters see it: written to a
-// real file by the delimited text output, and read by the generic output
-// source reader, both through the user's selection, order and conversions.
+// A mapped output source as an output filter sees it: written to a real file
+// by the delimited text output, through the user's selection, order and
+// conversions.
 #include "MappingTestSource.h"
 
 #include <CQoFile.h>
 #include <CQoOutputFilterTextVar.h>
-#include <CQoOutputSourceInputFilter.h>
 
 #include <windows.h>
 
@@ -86,25 +85,4 @@ TEST(OutputThroughFilters, TextOutputWritesTheSelectedColumnsInTheUsersOrder)
               "1;Müller;Köln\r\n"
               "2;\"Weiß; Söhne\";Gießen\r\n",
               WriteDelimited(s));
-}
-
-TEST(OutputThroughFilters, GenericSourceReaderSeesTheMappedColumns)
-{
-    TableSource s = Customers();
-    s.SetSelected("Name", false);
-    s.ToFront("Ort");
-    CQoOutputSourceInputFilter f(&s);
-    ASSERT_EQ(2, f.NumCols());
-    ASSERT_EQ(2L, f.NumRows());
-    CQoString name;
-    f.ColName(0, name);
-    EXPECT_STREQ("Ort", name);
-    std::string rows;
-    for (bool ok = f.FirstRow(); ok; ok = f.NextRow()) {
-        CQoString a, b;
-        f.Value(0, a);
-        f.Value(1, b);
-        rows += std::string(a) + "," + std::string(b) + ";";
-    }
-    EXPECT_EQ("Köln,1;Gießen,2;", rows);
 }
