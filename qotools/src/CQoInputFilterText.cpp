@@ -171,7 +171,7 @@ bool CQoInputFilterText::ReadRecordAt(long long offset, bool checkLayout)
     if (!m_reader->IsOpen())
         CQoException::Throw(CQoException::notOpen, m_strFileName);
     for (;;) {
-        auto repair = m_repairs.find(offset);
+        auto repair = m_repairs.empty() ? m_repairs.end() : m_repairs.find(offset);
         if (repair != m_repairs.end()) {
             if (!repair->second.takeOver) {
                 offset = repair->second.next;

@@ -58,7 +58,7 @@ void QoTextReader::SeekTo(std::int64_t offset)
     m_block = kFirstBlock;
 }
 
-std::size_t QoTextReader::Ensure(std::size_t count)
+std::size_t QoTextReader::Refill(std::size_t count)
 {
     while (m_end - m_pos < count && !m_eof) {
         std::size_t keep = m_end - m_pos;

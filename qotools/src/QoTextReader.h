@@ -37,7 +37,12 @@ public:
     // Makes at least `count` bytes after the position available, or all that
     // is left of the file; answers the number available. Pointers got from
     // Data() before are invalid afterwards.
-    std::size_t Ensure(std::size_t count);
+    std::size_t Ensure(std::size_t count)
+    {
+        if (m_end - m_pos >= count || m_eof)
+            return m_end - m_pos;
+        return Refill(count);
+    }
     // The unread bytes in memory and how many there are.
     char const *Data() const { return m_window.get() + m_pos; }
     std::size_t Avail() const { return m_end - m_pos; }
@@ -46,6 +51,8 @@ public:
     void Advance(std::size_t count) { m_pos += count; }
 
 private:
+    std::size_t Refill(std::size_t count);
+
     CQoFile m_file;
     std::unique_ptr<char[]> m_window;
     std::size_t m_capacity = 0;

@@ -11,6 +11,7 @@
 #include <cstdio>
 #include <random>
 
+#if !defined(_WIN32)
 namespace {
 
 // A row as text: fields in hex, joined by '|', trailing empty fields dropped
@@ -123,6 +124,7 @@ std::string RandomFile(std::mt19937 &random, char delimiter, char quote, char es
 }
 
 } // namespace
+#endif
 
 TEST(TextVarPeer, ReadsAsPythonCsvReadsTheSameDialect)
 {
