@@ -288,12 +288,13 @@ void CQoInputFilterDbase34::ScanDeleted()
             if (flag == qodbase::deletedFlag)
                 m_deleted.push_back(done + std::uint32_t(i));
         }
-        if (whole < want) {
-            m_physical = -1;
-            m_lCurrentRow = -1;
-            ReadRecord(done + std::uint32_t(whole)); // raises: the file ends early
-        }
         done += std::uint32_t(whole);
+        if (whole < want) {
+            // The file ends before its declared records. The missing ones
+            // count as rows: reading one of them raises, the rows before
+            // stay readable.
+            break;
+        }
     }
     m_deleted.shrink_to_fit();
     m_bDeletedKnown = true;
