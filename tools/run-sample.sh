@@ -7,8 +7,8 @@ here=$(cd "$(dirname "$0")" && pwd)
 repo=$(dirname "$here")
 cd "$repo"
 
-cmake -S . -B build/win -DCMAKE_TOOLCHAIN_FILE=cmake/mingw-w64-x86_64.cmake >/dev/null
-cmake --build build/win -j "$(nproc)" --target qoconvert
+cmake -S . -B "${QO_BUILD:-build/win}" -DCMAKE_TOOLCHAIN_FILE=cmake/mingw-w64-x86_64.cmake >/dev/null
+cmake --build "${QO_BUILD:-build/win}" -j "$(nproc)" --target qoconvert
 
 project=build/sample-project
 rm -rf "$project"
@@ -18,12 +18,10 @@ printf '[Eingabe]\r\nDatei=kunden.txt\r\nZeichensatz=0\r\n[Ausgabe]\r\nDatei=kun
   > "$project/qoconvert.ini"
 
 # The program runs in the project folder, so the files are named relative to it.
-"$here/session" sh -c "cd '$project' && wine '$repo/build/win/bin/qoconvert.exe' /batch ." && rc=0 || rc=$?
+"$here/session" sh -c "cd '$project' && wine '$repo/${QO_BUILD:-build/win}/bin/qoconvert.exe' /batch ." && rc=0 || rc=$?
 
 echo "--- qoconvert.log"
-cat "$project/qoconvert.log"
-echo "--- kunden.txt (Windows-1252)"
-od -c "$project/kunden.txt" | head -n 4
+iconv -f CP1252 -t UTF-8 "$project/qoconvert.log"
 if [ -f "$project/kunden-dos.txt" ]; then
   echo "--- kunden-dos.txt (code page 850), read back as UTF-8:"
   iconv -f CP850 -t UTF-8 "$project/kunden-dos.txt"

@@ -45,6 +45,10 @@ void CQoConvertApp::ParseArguments()
         GetCurrentDirectoryA(MAX_PATH, current);
         m_projectFolder = current;
     }
+    char full[MAX_PATH];
+    DWORD n = GetFullPathNameA(m_projectFolder, MAX_PATH, full, NULL);
+    if (n > 0 && n < MAX_PATH)
+        m_projectFolder = full;
     while (m_projectFolder.GetLength() > 3
            && (m_projectFolder.Right(1) == "\\" || m_projectFolder.Right(1) == "/"))
         m_projectFolder = m_projectFolder.Left(m_projectFolder.GetLength() - 1);

@@ -352,7 +352,10 @@ void CQoConfigFile::FromText(char const *text, std::size_t length)
             char const *nb = begin + 1;
             char const *ne = end - 1;
             TrimRange(nb, ne);
-            if (!Unescape(nb, static_cast<std::size_t>(ne - nb), name) || name.empty())
+            // A name is handed around as C text: one that holds a NUL cannot be
+            // kept and is as bad as an invalid escape.
+            if (!Unescape(nb, static_cast<std::size_t>(ne - nb), name) || name.empty()
+                || name.find('\0') != std::string::npos)
                 continue;
             current = &parsed.MakeSection(name.c_str());
             continue;
@@ -370,7 +373,8 @@ void CQoConfigFile::FromText(char const *text, std::size_t length)
         char const *ve = end;
         TrimRange(kb, ke);
         TrimRange(vb, ve);
-        if (!Unescape(kb, static_cast<std::size_t>(ke - kb), name) || name.empty())
+        if (!Unescape(kb, static_cast<std::size_t>(ke - kb), name) || name.empty()
+            || name.find('\0') != std::string::npos)
             continue;
         if (!Unescape(vb, static_cast<std::size_t>(ve - vb), value))
             continue;

@@ -44,7 +44,8 @@ protected:
             seen.info = d.Text(IDC_ERROR_INFO);
             seen.cancelVisible = d.IsVisible(IDCANCEL);
             seen.okVisible = d.IsVisible(IDOK);
-            seen.hasIcon = d.Send(0xFFFF, STM_GETICON) != 0;
+            // The first static without an id is the icon.
+            seen.hasIcon = d.Send(-1, STM_GETICON) != 0;
             d.Press(IDOK);
         });
         CQoErrorDlg::ShowError(code, info);

@@ -246,6 +246,14 @@ TEST(CQoConfigFileFormat, MalformedLinesAreSkipped)
     EXPECT_TRUE(cfg.GetValue("Gut", "f", v));
     EXPECT_STREQ("2", v);
 
+    // Names that unescape to a NUL cannot be kept: the line is skipped, and the
+    // keys below such a header do not end up in a nameless section.
+    std::string nul = "[\\x00]\nk=weg\n[Gut]\nx\\x00y=weg\nz=1\n";
+    WriteBytes(path, nul);
+    ASSERT_TRUE(cfg.Open(path.c_str()));
+    EXPECT_EQ((std::vector<std::string>{"Gut"}), Names(cfg.GetSections()));
+    EXPECT_EQ((std::vector<std::string>{"z"}), Names(cfg.GetKeys("Gut")));
+
     // Pure binary data is not a configuration, but it is no crash either.
     std::string binary;
     for (int i = 0; i < 5000; ++i)
