@@ -12,7 +12,7 @@ namespace {
 
 // A small buffer: the filter jumps around in the file as often as it reads
 // through it, and every record is read whole into m_record anyway.
-int const kBufferBlocks = 4;
+int const kBufferBlocks = 1;
 
 char const *CharSetName(int charSet)
 {

@@ -15,13 +15,19 @@ CDbaseField const kDefaultField("", 'C', CDbaseField::maxTextLength);
 
 bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 
-std::string Trimmed(std::string const &value)
+void TrimBlanks(char const *&first, char const *&stop)
 {
-    std::size_t first = value.find_first_not_of(" \t");
-    if (first == std::string::npos)
-        return std::string();
-    std::size_t last = value.find_last_not_of(" \t");
-    return value.substr(first, last - first + 1);
+    while (first < stop && (*first == ' ' || *first == '\t'))
+        ++first;
+    while (stop > first && (stop[-1] == ' ' || stop[-1] == '\t'))
+        --stop;
+}
+
+std::string TooLong(CDbaseField const &field)
+{
+    char why[80];
+    std::snprintf(why, sizeof why, "passt nicht in die Feldl\344nge %d", field.Length());
+    return why;
 }
 
 // The dBase form of a name: letters A-Z, digits and '_', starting with a
@@ -255,62 +261,97 @@ void CQoOutputFilterDbase::FormatValue(int col, std::string const &value, char *
     }
     case 'N':
     case 'F': {
-        std::string text = Trimmed(value);
-        if (text.empty())
+        char const *p = value.data(), *stop = p + value.size();
+        TrimBlanks(p, stop);
+        if (p == stop)
             return;
-        std::size_t i = 0;
         bool negative = false;
-        if (text[i] == '+' || text[i] == '-')
-            negative = text[i++] == '-';
-        std::string whole, fraction;
-        while (i < text.size() && IsDigit(text[i]))
-            whole += text[i++];
-        bool point = i < text.size() && (text[i] == '.' || text[i] == ',');
-        if (point)
-            ++i;
-        while (i < text.size() && IsDigit(text[i]))
-            fraction += text[i++];
-        if (i != text.size() || (whole.empty() && fraction.empty()))
+        if (*p == '+' || *p == '-')
+            negative = *p++ == '-';
+        char const *wholeStart = p;
+        while (p < stop && IsDigit(*p))
+            ++p;
+        char const *wholeEnd = p;
+        if (p < stop && (*p == '.' || *p == ','))
+            ++p;
+        char const *fracStart = p;
+        while (p < stop && IsDigit(*p))
+            ++p;
+        char const *fracEnd = p;
+        if (p != stop || (wholeStart == wholeEnd && fracStart == fracEnd))
             BadValue(col, value, "ist keine Zahl");
+        while (wholeStart < wholeEnd - 1 && *wholeStart == '0')
+            ++wholeStart;
         std::size_t decimals = std::size_t(field.Decimals());
-        if (decimals > 0) {
-            if (fraction.size() > decimals) {
-                bool up = fraction[decimals] >= '5';
-                fraction.resize(decimals);
-                if (up) {
-                    // Round the digits whole+fraction up by one unit of the last place.
-                    std::string digits = whole + fraction;
-                    int k = int(digits.size()) - 1;
-                    while (k >= 0 && digits[std::size_t(k)] == '9')
-                        digits[std::size_t(k--)] = '0';
-                    if (k >= 0)
-                        ++digits[std::size_t(k)];
-                    else
-                        digits.insert(digits.begin(), '1');
-                    whole = digits.substr(0, digits.size() - decimals);
-                    fraction = digits.substr(digits.size() - decimals);
-                }
-            }
-            fraction.resize(decimals, '0');
+        std::size_t wholeCount = std::size_t(wholeEnd - wholeStart), fracCount = std::size_t(fracEnd - fracStart);
+        if (wholeCount > length)
+            BadValue(col, value, TooLong(field).c_str());
+        // digits: the whole part (at least "0") and the kept decimals, in a
+        // buffer with room for a carry in front.
+        char digits[2 * CDbaseField::maxNumberLength + 4];
+        std::size_t n = 1;
+        digits[0] = '0';
+        if (wholeCount == 0)
+            digits[n++] = '0';
+        for (char const *q = wholeStart; q < wholeEnd; ++q)
+            digits[n++] = *q;
+        std::size_t keep = decimals > 0 ? decimals : fracCount;
+        if (keep > length)
+            BadValue(col, value, TooLong(field).c_str());
+        for (std::size_t k = 0; k < keep; ++k)
+            digits[n++] = k < fracCount ? fracStart[k] : '0';
+        if (decimals > 0 && fracCount > decimals && fracStart[decimals] >= '5') {
+            // Round half away from zero: add one unit of the last place.
+            std::size_t k = n;
+            while (digits[--k] == '9')
+                digits[k] = '0';
+            ++digits[k];
         }
-        std::size_t zeros = whole.find_first_not_of('0');
-        whole = zeros == std::string::npos ? "0" : whole.substr(zeros);
-        bool zero = whole == "0" && fraction.find_first_not_of('0') == std::string::npos;
-        std::string number = (negative && !zero ? "-" : "") + whole;
-        if (!fraction.empty())
-            number += "." + fraction;
-        if (number.size() > length) {
-            char why[80];
-            std::snprintf(why, sizeof why, "passt nicht in die Feldl\344nge %d", field.Length());
-            BadValue(col, value, why);
+        // Assemble sign, whole part without leading zeros, point, decimals.
+        std::size_t wholeDigits = n - keep, first = 0;
+        while (first < wholeDigits - 1 && digits[first] == '0')
+            ++first;
+        bool zero = true;
+        for (std::size_t k = first; k < n; ++k)
+            zero = zero && digits[k] == '0';
+        char number[2 * CDbaseField::maxNumberLength + 8];
+        std::size_t m = 0;
+        if (negative && !zero)
+            number[m++] = '-';
+        for (std::size_t k = first; k < wholeDigits; ++k)
+            number[m++] = digits[k];
+        if (keep > 0) {
+            number[m++] = '.';
+            for (std::size_t k = wholeDigits; k < n; ++k)
+                number[m++] = digits[k];
         }
-        std::memcpy(out + (length - number.size()), number.data(), number.size());
+        if (m > length)
+            BadValue(col, value, TooLong(field).c_str());
+        std::memcpy(out + (length - m), number, m);
         return;
     }
     case 'D': {
-        std::string text = Trimmed(value);
-        if (text.empty())
+        char const *p = value.data(), *stop = p + value.size();
+        TrimBlanks(p, stop);
+        if (p == stop)
             return;
+        if (stop - p == 8) {
+            // The file's own form YYYYMMDD: checked and copied.
+            int y = 0, m = 0, d = 0;
+            bool digits = true;
+            for (int k = 0; k < 8; ++k)
+                digits = digits && IsDigit(p[k]);
+            if (digits) {
+                y = (p[0] - '0') * 1000 + (p[1] - '0') * 100 + (p[2] - '0') * 10 + (p[3] - '0');
+                m = (p[4] - '0') * 10 + (p[5] - '0');
+                d = (p[6] - '0') * 10 + (p[7] - '0');
+                if (!ValidDate(y, m, d))
+                    BadValue(col, value, "ist kein Datum");
+                std::memcpy(out, p, 8);
+                return;
+            }
+        }
+        std::string text(p, stop);
         int y = 0, m = 0, d = 0;
         bool ok = false;
         std::size_t dot1 = text.find('.');
@@ -332,12 +373,30 @@ void CQoOutputFilterDbase::FormatValue(int col, std::string const &value, char *
         return;
     }
     case 'L': {
-        CQoString text(Trimmed(value));
-        text.MakeLower();
-        if (text.IsEmpty())
+        char const *p = value.data(), *stop = p + value.size();
+        TrimBlanks(p, stop);
+        if (p == stop)
             return;
-        static char const *const yes[] = {"t", "y", "j", "1", "wahr", "true", "ja", "yes"};
-        static char const *const no[] = {"f", "n", "0", "falsch", "false", "nein", "no"};
+        if (stop - p == 1) {
+            // The common case: one letter.
+            switch (*p) {
+            case 'T': case 't': case 'Y': case 'y': case 'J': case 'j': case '1':
+                out[0] = 'T';
+                return;
+            case 'F': case 'f': case 'N': case 'n': case '0':
+                out[0] = 'F';
+                return;
+            case '?':
+                out[0] = '?';
+                return;
+            default:
+                break;
+            }
+        }
+        CQoString text(p, int(stop - p));
+        text.MakeLower();
+        static char const *const yes[] = {"wahr", "true", "ja", "yes"};
+        static char const *const no[] = {"falsch", "false", "nein", "no"};
         for (char const *word : yes)
             if (text == word) {
                 out[0] = 'T';
@@ -348,10 +407,6 @@ void CQoOutputFilterDbase::FormatValue(int col, std::string const &value, char *
                 out[0] = 'F';
                 return;
             }
-        if (text == "?") {
-            out[0] = '?';
-            return;
-        }
         BadValue(col, value, "ist kein Wahrheitswert");
     }
     default:

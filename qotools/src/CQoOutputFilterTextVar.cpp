@@ -56,6 +56,19 @@ bool CQoOutputFilterTextVar::Init()
 void CQoOutputFilterTextVar::AppendField(std::string &out, std::string const &value) const
 {
     char const d = m_chDelimiter, q = m_chEncloser, e = m_chEscape;
+    if (!m_bForceEncloser) {
+        // Most values hold nothing special: one scan, one copy.
+        bool plain = true;
+        for (char c : value)
+            if (c == d || c == '\r' || c == '\n' || (c == q && q != 0) || (c == e && e != 0)) {
+                plain = false;
+                break;
+            }
+        if (plain) {
+            out += value;
+            return;
+        }
+    }
     if (q != 0) {
         // Enclosed when forced or when the value holds a delimiter or a line
         // break; without an escape character an encloser needs it too (doubled).
