@@ -137,6 +137,11 @@ private:
     enum state { idle, reading, writing };
 
     bool FillBuffer(bool throwOnError);
+    // Reads at m_filePos and advances it; `failed` when nothing could be read
+    // because of an error.
+    std::size_t RawRead(void *buffer, std::size_t count, bool &failed);
+    // Moves the system's position to m_filePos before the C library writes.
+    void SyncSystemPosition();
     void FlushBuffer();
     void SwitchTo(state wanted);
     void ConvertIn(char *data, std::size_t count) const;
@@ -149,9 +154,12 @@ private:
     int m_charSet = ansi;
     std::unique_ptr<char[]> m_buffer;
     std::size_t m_bufferSize;
+    std::size_t m_fillSize;        // size of the next refill (see FillBuffer)
     std::size_t m_pos = 0;         // next byte to deliver (reading)
     std::size_t m_end = 0;         // end of valid or pending bytes
-    std::int64_t m_filePos = 0;    // where the system's file position is
+    std::int64_t m_filePos = 0;    // file offset after the last byte read or written
+    bool m_positioned = false;     // a disk file: reads name their offset
+    bool m_systemPosStale = false; // the system's position may differ from m_filePos
     state m_state = idle;
     bool m_lastWasCR = false;      // text mode: last byte written was CR
     bool m_bufferConverted = false; // ReadString converted buffer bytes in place

@@ -29,10 +29,10 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <deque>
 #include <map>
 #include <memory>
 #include <string>
+#include <vector>
 
 class QoTextReader;
 
@@ -92,17 +92,33 @@ protected:
     virtual void DetermineColumns();
 
     // --- for ParseRecord -----------------------------------------------------
-    void ClearFields();
+    // (Inline: the parsers call these for every field of every record.)
+    void ClearFields()
+    {
+        m_nFields = 0;
+        m_scratch.clear();
+    }
     // A field that is a piece of the parsed data.
-    void AddField(char const *data, std::size_t length);
+    void AddField(char const *data, std::size_t length)
+    {
+        if (m_nFields == m_fields.size())
+            GrowFields();
+        m_fields[m_nFields++] = {static_cast<std::uint32_t>(data - m_recordBase), static_cast<std::uint32_t>(length),
+                                 false};
+    }
     // A field built in the scratch text: begin it, append, end it.
     void BeginScratchField() { m_scratchStart = m_scratch.size(); }
     void AppendScratch(char const *data, std::size_t length) { m_scratch.append(data, length); }
     void AppendScratch(char ch) { m_scratch.push_back(ch); }
     void EndScratchField();
-    int NumFields() const { return static_cast<int>(m_fields.size()); }
+    int NumFields() const { return static_cast<int>(m_nFields); }
     // Field i of the current record as pointer and length.
-    void FieldAt(int i, char const *&data, std::size_t &length) const;
+    void FieldAt(int i, char const *&data, std::size_t &length) const
+    {
+        Field const &f = m_fields[static_cast<std::size_t>(i)];
+        data = (f.scratch ? m_scratch.data() : m_recordBase) + f.offset;
+        length = f.length;
+    }
 
     // Reads the record at `offset` (defects repaired or raised); answers
     // false at the end of the data. Sets m_curOffset and m_nextOffset.
@@ -128,18 +144,50 @@ private:
         long long next;
     };
 
+    // The file offsets of the rows read so far, in blocks of rows, so that a
+    // long file grows the index without copying it and without a small
+    // allocation every few rows.
+    class RowIndex {
+    public:
+        std::size_t size() const { return m_size; }
+        bool empty() const { return m_size == 0; }
+        long long operator[](std::size_t row) const { return m_blocks[row >> kShift][row & kMask]; }
+        long long back() const { return (*this)[m_size - 1]; }
+        void push_back(long long offset)
+        {
+            if ((m_size & kMask) == 0 && (m_size >> kShift) == m_blocks.size())
+                m_blocks.emplace_back(new long long[kMask + 1]);
+            m_blocks[m_size >> kShift][m_size & kMask] = offset;
+            ++m_size;
+        }
+        void clear()
+        {
+            m_blocks.clear();
+            m_size = 0;
+        }
+        void shrink_to_fit() { m_blocks.shrink_to_fit(); }
+
+    private:
+        static constexpr unsigned kShift = 13; // 8192 rows, 64 KiB a block
+        static constexpr std::size_t kMask = (std::size_t(1) << kShift) - 1;
+        std::vector<std::unique_ptr<long long[]>> m_blocks;
+        std::size_t m_size = 0;
+    };
+
     bool ReadRow(long row, long long offset);
+    void GrowFields();
     int ParseHere(std::size_t &used);
     int ParseText(CQoString const &text, std::size_t &used);
     bool HandleDefect(long long offset, CQoString const &why, int parseState);
     void ResetRows();
 
-    std::vector<Field> m_fields;
+    std::vector<Field> m_fields;          // room for the fields; the first m_nFields are in use
+    std::size_t m_nFields = 0;
     char const *m_recordBase = nullptr;   // parsed data (inside the reader)
     std::string m_scratch;
     std::size_t m_scratchStart = 0;
     CQoString m_correction;               // text of a taken-over record
-    std::deque<long long> m_index;        // offsets of the rows read
+    RowIndex m_index;                     // offsets of the rows read
     bool m_indexComplete = false;
     std::map<long long, Repair> m_repairs;
 };

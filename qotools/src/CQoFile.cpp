@@ -60,6 +60,19 @@ struct MixTable {
 
 MixTable const kMix;
 
+// Writing to a DOS file as a full byte table, so that the write loop needs no
+// branch per byte.
+struct DosOutTable {
+    unsigned char map[256];
+    DosOutTable()
+    {
+        for (int c = 0; c < 256; ++c)
+            map[c] = static_cast<unsigned char>(c < 0x80 ? c : kAnsiToDos850[c - 0x80]);
+    }
+};
+
+DosOutTable const kDosOut;
+
 int CharSetOfMode(int mode)
 {
     if (mode & CQoFile::ascii)
@@ -88,6 +101,11 @@ std::int64_t TellRaw(std::FILE *fp)
 }
 
 constexpr std::size_t kBlock = 64 * 1024;
+// After a jump the buffer is refilled with this much first, and with twice as
+// much on every following refill up to the buffer's size: reading a record
+// at a random place costs a small read, reading on from there soon reads
+// whole buffers again.
+constexpr std::size_t kFirstFill = 4096;
 
 } // namespace
 
@@ -95,7 +113,8 @@ constexpr std::size_t kBlock = 64 * 1024;
 // construction
 
 CQoFile::CQoFile(int bufferBlocks)
-    : m_bufferSize(static_cast<std::size_t>(bufferBlocks < 1 ? 1 : bufferBlocks) * kBlock)
+    : m_bufferSize(static_cast<std::size_t>(bufferBlocks < 1 ? 1 : bufferBlocks) * kBlock),
+      m_fillSize(kFirstFill)
 {
 }
 
@@ -146,6 +165,11 @@ bool CQoFile::Open(char const *path, int mode)
         std::fclose(fp);
         return false;
     }
+    bool const positioned = S_ISREG(info.st_mode);
+#else
+    // Positioned reads (ReadFile with an offset) take the slow asynchronous
+    // path under Wine; a seek and a plain read are much cheaper there.
+    bool const positioned = false;
 #endif
     // We buffer ourselves; a second buffer in stdio would only copy.
     std::setvbuf(fp, nullptr, _IONBF, 0);
@@ -169,6 +193,9 @@ bool CQoFile::Open(char const *path, int mode)
     m_filePos = position;
     m_state = idle;
     m_lastWasCR = false;
+    m_fillSize = kFirstFill;
+    m_positioned = positioned;
+    m_systemPosStale = false;
     return true;
 }
 
@@ -223,6 +250,7 @@ void CQoFile::FlushBuffer()
         return;
     std::size_t pending = m_end;
     m_end = 0;
+    SyncSystemPosition();
     std::size_t written = std::fwrite(m_buffer.get(), 1, pending, m_fp);
     m_filePos += static_cast<std::int64_t>(written);
     if (written != pending)
@@ -238,8 +266,12 @@ void CQoFile::SwitchTo(state wanted)
     // The C library wants a seek between reading and writing; it also puts
     // the system position back where the caller is (unread buffer dropped).
     std::int64_t logical = Tell();
-    if (m_state != idle && SeekRaw(m_fp, logical, SEEK_SET) != 0)
-        Fail(CQoException::seekError);
+    if (m_state != idle) {
+        if (m_positioned)
+            m_systemPosStale = true;
+        else if (SeekRaw(m_fp, logical, SEEK_SET) != 0)
+            Fail(CQoException::seekError);
+    }
     m_filePos = logical;
     m_pos = m_end = 0;
     m_bufferConverted = false;
@@ -250,16 +282,66 @@ bool CQoFile::FillBuffer(bool throwOnError)
 {
     m_pos = m_end = 0;
     m_bufferConverted = false;
-    std::size_t got = std::fread(m_buffer.get(), 1, m_bufferSize, m_fp);
-    if (got == 0 && std::ferror(m_fp)) {
-        std::clearerr(m_fp);
+    std::size_t want = m_fillSize < m_bufferSize ? m_fillSize : m_bufferSize;
+    if (m_fillSize < m_bufferSize)
+        m_fillSize *= 2;
+    bool failed = false;
+    std::size_t got = RawRead(m_buffer.get(), want, failed);
+    if (failed) {
         if (throwOnError)
             Fail(CQoException::readError);
         return false;
     }
     m_end = got;
-    m_filePos += static_cast<std::int64_t>(got);
     return got > 0;
+}
+
+std::size_t CQoFile::RawRead(void *buffer, std::size_t count, bool &failed)
+{
+    failed = false;
+    if (!m_positioned) {
+        std::size_t n = std::fread(buffer, 1, count, m_fp);
+        if (n == 0 && std::ferror(m_fp)) {
+            std::clearerr(m_fp);
+            failed = true;
+        }
+        m_filePos += static_cast<std::int64_t>(n);
+        return n;
+    }
+#ifdef _WIN32
+    return 0; // not reached: no file is positioned here (see Open)
+#else
+    // A disk file: read at m_filePos without moving the system's position,
+    // one call instead of a seek and a read.
+    char *out = static_cast<char *>(buffer);
+    std::size_t got = 0;
+    bool error = false;
+    while (got < count) {
+        ssize_t n = pread(fileno(m_fp), out + got, count - got, static_cast<off_t>(m_filePos));
+        if (n < 0) {
+            if (errno == EINTR)
+                continue;
+            error = true;
+            break;
+        }
+        if (n == 0)
+            break;
+        got += static_cast<std::size_t>(n);
+        m_filePos += static_cast<std::int64_t>(n);
+    }
+    m_systemPosStale = true;
+    failed = error && got == 0;
+    return got;
+#endif
+}
+
+void CQoFile::SyncSystemPosition()
+{
+    if (!m_systemPosStale)
+        return;
+    if (SeekRaw(m_fp, m_filePos, SEEK_SET) != 0)
+        Fail(CQoException::seekError);
+    m_systemPosStale = false;
 }
 
 void CQoFile::ConvertIn(char *data, std::size_t count) const
@@ -293,16 +375,16 @@ std::size_t CQoFile::Read(void *buffer, std::size_t count, bool throwOnError)
     bool const text = !(m_mode & binary);
     while (got < count) {
         if (m_pos == m_end) {
-            if (!text && count - got >= m_bufferSize) {
-                // Large binary reads go straight into the caller's memory.
-                std::size_t n = std::fread(out + got, 1, count - got, m_fp);
-                if (n == 0 && std::ferror(m_fp)) {
-                    std::clearerr(m_fp);
+            if (!text && count - got >= (m_fillSize < m_bufferSize ? m_fillSize : m_bufferSize)) {
+                // Binary reads at least as large as the next refill go
+                // straight into the caller's memory.
+                bool failed = false;
+                std::size_t n = RawRead(out + got, count - got, failed);
+                if (failed) {
                     if (throwOnError)
                         Fail(CQoException::readError);
                     break;
                 }
-                m_filePos += static_cast<std::int64_t>(n);
                 got += n;
                 if (n == 0)
                     break;
@@ -401,6 +483,7 @@ void CQoFile::Write(void const *data, std::size_t count)
     if (!text && !dos) {
         if (count >= m_bufferSize) {
             FlushBuffer();
+            SyncSystemPosition();
             std::size_t written = std::fwrite(src, 1, count, m_fp);
             m_filePos += static_cast<std::int64_t>(written);
             if (written != count)
@@ -420,20 +503,50 @@ void CQoFile::Write(void const *data, std::size_t count)
         return;
     }
 
-    char *buffer = m_buffer.get();
-    for (std::size_t i = 0; i < count; ++i) {
-        unsigned char c = src[i];
-        if (dos && c >= 0x80)
-            c = kAnsiToDos850[c - 0x80];
-        if (text && c == '\n' && !m_lastWasCR) {
-            if (m_end == m_bufferSize)
-                FlushBuffer();
-            buffer[m_end++] = '\r';
+    // Converted and line-end translated: the bytes go in runs up to the next
+    // LF (text mode) or the end of the buffer, each run through the table.
+    unsigned char const *map = dos ? kDosOut.map : nullptr;
+    auto *buffer = reinterpret_cast<unsigned char *>(m_buffer.get());
+    while (count > 0) {
+        std::size_t run = count;
+        if (text) {
+            void const *lf = std::memchr(src, '\n', count);
+            if (lf == src) {
+                // An LF gets its CR unless the byte before was one.
+                if (!m_lastWasCR) {
+                    if (m_end == m_bufferSize)
+                        FlushBuffer();
+                    buffer[m_end++] = '\r';
+                }
+                if (m_end == m_bufferSize)
+                    FlushBuffer();
+                buffer[m_end++] = '\n';
+                m_lastWasCR = false;
+                ++src;
+                --count;
+                continue;
+            }
+            if (lf)
+                run = static_cast<std::size_t>(static_cast<unsigned char const *>(lf) - src);
         }
-        m_lastWasCR = c == '\r';
         if (m_end == m_bufferSize)
             FlushBuffer();
-        buffer[m_end++] = static_cast<char>(c);
+        std::size_t room = m_bufferSize - m_end;
+        if (run > room)
+            run = room;
+        unsigned char *out = buffer + m_end;
+        if (map) {
+            for (std::size_t i = 0; i < run; ++i)
+                out[i] = map[src[i]];
+        } else {
+            std::memcpy(out, src, run);
+        }
+        m_end += run;
+        // CR is plain ASCII in every character set, so the converted byte
+        // tells as well as the source byte.
+        m_lastWasCR = out[run - 1] == '\r';
+        src += run;
+        count -= run;
     }
 }
 
@@ -514,12 +627,17 @@ std::int64_t CQoFile::Seek(std::int64_t offset, int from)
         }
     }
     FlushBuffer();
-    if (SeekRaw(m_fp, target, SEEK_SET) != 0)
+    // On a disk file the jump costs nothing now: reads name their position,
+    // and a write first moves the system's position (SyncSystemPosition).
+    if (m_positioned)
+        m_systemPosStale = true;
+    else if (SeekRaw(m_fp, target, SEEK_SET) != 0)
         Fail(CQoException::seekError);
     m_filePos = target;
     m_pos = m_end = 0;
     m_state = idle;
     m_lastWasCR = false;
+    m_fillSize = kFirstFill;
     return target;
 }
 

@@ -54,7 +54,7 @@ CQoInputFilterText::~CQoInputFilterText() = default;
 
 void CQoInputFilterText::ResetRows()
 {
-    m_fields.clear();
+    m_nFields = 0;
     m_scratch.clear();
     m_recordBase = nullptr;
     m_index.clear();
@@ -80,29 +80,17 @@ void CQoInputFilterText::Skip(int lines)
 
 // --- fields --------------------------------------------------------------------
 
-void CQoInputFilterText::ClearFields()
+void CQoInputFilterText::GrowFields()
 {
-    m_fields.clear();
-    m_scratch.clear();
-}
-
-void CQoInputFilterText::AddField(char const *data, std::size_t length)
-{
-    m_fields.push_back({static_cast<std::uint32_t>(data - m_recordBase),
-                        static_cast<std::uint32_t>(length), false});
+    m_fields.resize(m_fields.empty() ? 32 : m_fields.size() * 2);
 }
 
 void CQoInputFilterText::EndScratchField()
 {
-    m_fields.push_back({static_cast<std::uint32_t>(m_scratchStart),
-                        static_cast<std::uint32_t>(m_scratch.size() - m_scratchStart), true});
-}
-
-void CQoInputFilterText::FieldAt(int i, char const *&data, std::size_t &length) const
-{
-    Field const &f = m_fields[i];
-    data = (f.scratch ? m_scratch.data() : m_recordBase) + f.offset;
-    length = f.length;
+    if (m_nFields == m_fields.size())
+        GrowFields();
+    m_fields[m_nFields++] = {static_cast<std::uint32_t>(m_scratchStart),
+                             static_cast<std::uint32_t>(m_scratch.size() - m_scratchStart), true};
 }
 
 // --- parsing at the reader's position ----------------------------------------------
@@ -277,7 +265,7 @@ void CQoInputFilterText::Init(CQoString const &name)
     long long offset = SkipLines(0, m_nSkip);
     if (m_bFirstRowHasNames) {
         if (ReadRecordAt(offset, false)) {
-            std::vector<CQoString> names(m_fields.size());
+            std::vector<CQoString> names(m_nFields);
             for (int i = 0; i < NumFields(); ++i) {
                 char const *data;
                 std::size_t length;
@@ -336,7 +324,7 @@ bool CQoInputFilterText::CloseFile()
 {
     m_reader->Close();
     CQoInputFilter::CloseFile();
-    m_fields.clear();
+    m_nFields = 0;
     return true;
 }
 
@@ -362,7 +350,7 @@ bool CQoInputFilterText::ReadRow(long row, long long offset)
             }
         }
         m_lCurrentRow = -1;
-        m_fields.clear();
+        m_nFields = 0;
         return false;
     }
     if (!m_bNoCache && static_cast<std::size_t>(row) == m_index.size())
@@ -430,8 +418,8 @@ bool CQoInputFilterText::EmptyRow()
 {
     if (m_lCurrentRow < 0)
         return true;
-    for (Field const &f : m_fields)
-        if (f.length)
+    for (std::size_t i = 0; i < m_nFields; ++i)
+        if (m_fields[i].length)
             return false;
     return true;
 }

@@ -6,7 +6,13 @@
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 
+#include <cstdint>
 #include <cstring>
+
+#if defined(__SSE2__) || defined(_M_X64)
+#include <emmintrin.h>
+#define QO_SCAN_SSE2 1
+#endif
 
 namespace {
 enum fieldEnd { endDelimiter, endRecord, endEof, endMore, endOpen };
@@ -15,6 +21,103 @@ inline bool IsLineEnd(unsigned char c)
 {
     return c == '\r' || c == '\n';
 }
+
+inline unsigned LowestBit(std::uint64_t mask)
+{
+#if defined(__GNUC__) || defined(__clang__)
+    return static_cast<unsigned>(__builtin_ctzll(mask));
+#else
+    unsigned n = 0;
+    while (!(mask & 1)) {
+        mask >>= 1;
+        ++n;
+    }
+    return n;
+#endif
+}
+
+// Finds the bytes that end a run of plain characters, 64 bytes at a time: one
+// bit mask of the bytes that stop a plain field (delimiter, line ends,
+// escape) and one of those that stop enclosed text (encloser, escape). Fields
+// are short, so several share one block of masks.
+class StopScanner {
+public:
+    StopScanner(char const *end, bool const *stopPlain, bool const *stopQuoted, char delimiter, char encloser,
+                char escape)
+        : m_end(end), m_stopPlain(stopPlain), m_stopQuoted(stopQuoted)
+    {
+#ifdef QO_SCAN_SSE2
+        // A character that is not in use repeats one that is, so that it
+        // adds no stops of its own.
+        m_delimiter = _mm_set1_epi8(delimiter);
+        m_escape = _mm_set1_epi8(escape ? escape : delimiter);
+        m_encloser = _mm_set1_epi8(encloser ? encloser : escape ? escape : '\n');
+        m_quotedEscape = _mm_set1_epi8(escape ? escape : encloser ? encloser : '\n');
+#else
+        (void)delimiter;
+        (void)encloser;
+        (void)escape;
+#endif
+    }
+
+    // The first byte at or after `p` that ends a plain field, or the end.
+    char const *NextPlain(char const *p) { return Next(p, &StopScanner::m_plain); }
+    // The first byte at or after `p` that ends a run inside enclosers, or the end.
+    char const *NextQuoted(char const *p) { return Next(p, &StopScanner::m_quoted); }
+
+private:
+    char const *Next(char const *p, std::uint64_t StopScanner::*which)
+    {
+        if (!m_base || p < m_base || p - m_base >= 64)
+            Load(p);
+        for (;;) {
+            std::uint64_t mask = this->*which & (~std::uint64_t(0) << (p - m_base));
+            if (mask)
+                return m_base + LowestBit(mask);
+            if (m_end - m_base <= 64)
+                return m_end;
+            Load(m_base + 64);
+            p = m_base;
+        }
+    }
+
+    void Load(char const *at)
+    {
+        m_base = at;
+        m_plain = m_quoted = 0;
+        std::ptrdiff_t avail = m_end - at;
+#ifdef QO_SCAN_SSE2
+        if (avail >= 64) {
+            __m128i const cr = _mm_set1_epi8('\r'), lf = _mm_set1_epi8('\n');
+            for (int k = 0; k < 4; ++k) {
+                __m128i v = _mm_loadu_si128(reinterpret_cast<__m128i const *>(at + 16 * k));
+                __m128i plain = _mm_or_si128(_mm_or_si128(_mm_cmpeq_epi8(v, m_delimiter), _mm_cmpeq_epi8(v, m_escape)),
+                                             _mm_or_si128(_mm_cmpeq_epi8(v, cr), _mm_cmpeq_epi8(v, lf)));
+                __m128i quoted = _mm_or_si128(_mm_cmpeq_epi8(v, m_encloser), _mm_cmpeq_epi8(v, m_quotedEscape));
+                m_plain |= std::uint64_t(static_cast<std::uint16_t>(_mm_movemask_epi8(plain))) << (16 * k);
+                m_quoted |= std::uint64_t(static_cast<std::uint16_t>(_mm_movemask_epi8(quoted))) << (16 * k);
+            }
+            return;
+        }
+#endif
+        std::ptrdiff_t n = avail < 64 ? avail : 64;
+        auto const *u = reinterpret_cast<unsigned char const *>(at);
+        for (std::ptrdiff_t i = 0; i < n; ++i) {
+            m_plain |= std::uint64_t(m_stopPlain[u[i]]) << i;
+            m_quoted |= std::uint64_t(m_stopQuoted[u[i]]) << i;
+        }
+    }
+
+    char const *m_end;
+    char const *m_base = nullptr;
+    std::uint64_t m_plain = 0;
+    std::uint64_t m_quoted = 0;
+    bool const *m_stopPlain;
+    bool const *m_stopQuoted;
+#ifdef QO_SCAN_SSE2
+    __m128i m_delimiter, m_escape, m_encloser, m_quotedEscape;
+#endif
+};
 }
 
 CQoInputFilterTextVar::CQoInputFilterTextVar()
@@ -151,6 +254,7 @@ int CQoInputFilterTextVar::ParseRecord(char const *begin, char const *end, bool 
         return eof ? parseEnd : parseMore;
     int const encloser = m_cEncloser ? static_cast<unsigned char>(m_cEncloser) : -1;
     char const delimiter = m_cDelimiter;
+    StopScanner scan(end, m_stopPlain, m_stopQuoted, m_cDelimiter, m_cEncloser, m_cEscape);
     // An empty line is a row without fields.
     if (!IsLineEnd(static_cast<unsigned char>(*p))) {
         for (;;) {
@@ -165,8 +269,7 @@ int CQoInputFilterTextVar::ParseRecord(char const *begin, char const *end, bool 
             int result;
             if (static_cast<unsigned char>(*p) == encloser) {
                 char const *content = ++p;
-                while (p < end && !m_stopQuoted[static_cast<unsigned char>(*p)])
-                    ++p;
+                p = scan.NextQuoted(p);
                 if (p + 1 < end && static_cast<unsigned char>(*p) == encloser &&
                     (p[1] == delimiter || IsLineEnd(static_cast<unsigned char>(p[1])))) {
                     AddField(content, static_cast<std::size_t>(p - content));
@@ -181,8 +284,7 @@ int CQoInputFilterTextVar::ParseRecord(char const *begin, char const *end, bool 
                     result = SlowField(p, end, eof, true);
                 }
             } else {
-                while (p < end && !m_stopPlain[static_cast<unsigned char>(*p)])
-                    ++p;
+                p = scan.NextPlain(p);
                 if (p == end) {
                     if (!eof)
                         return parseMore;
