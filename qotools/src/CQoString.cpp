@@ -102,10 +102,17 @@ CQoString &CQoString::operator+=(char ch)
 
 void CQoString::Assign(char const *data, std::size_t length)
 {
-    if (data)
-        m_str.assign(data, length);
-    else
+    char const *mine = m_str.data();
+    if (!data) {
         m_str.clear();
+    } else if (data + length <= mine || data > mine + m_str.capacity()) {
+        // Apart from our own text (the usual case of a field value): empty
+        // and append, cheaper than the general replace.
+        m_str.clear();
+        m_str.append(data, length);
+    } else {
+        m_str.assign(data, length);
+    }
 }
 
 void CQoString::Append(char const *data, std::size_t length)
