@@ -6,7 +6,7 @@
 
 namespace {
 constexpr std::size_t kFirstBlock = 4096;
-constexpr std::size_t kMaxBlock = 1 << 20;
+constexpr std::size_t kMaxBlock = 256 * 1024; // refills stay in the cache that the parser reads from
 }
 
 // The file's own buffer is the smallest there is: the reader's window does the
