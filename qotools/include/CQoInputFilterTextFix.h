@@ -17,6 +17,8 @@
 
 #include <map>
 #include <memory>
+#include "CQoColumnWidths.h"
+
 #include <vector>
 
 class QoTextReader;
@@ -64,7 +66,7 @@ private:
 
     std::unique_ptr<QoTextReader> m_reader;
     int m_nRecordLen = 1;
-    std::vector<int> m_lengths;
+    CQoColumnWidths m_widths;
     CQoString m_record;          // the current record
     long long m_fileLength = 0;
     // Decisions about the short last record: row -> corrected record, or

@@ -13,7 +13,7 @@
 
 #include "CQoInputFilterText.h"
 
-#include <vector>
+#include "CQoColumnWidths.h"
 
 class QOTOOLS_API CQoInputFilterTextVF : public CQoInputFilterText {
 public:
@@ -39,6 +39,6 @@ protected:
     void DetermineColumns() override;
 
 private:
-    std::vector<int> m_lengths;
+    CQoColumnWidths m_widths;
     std::size_t m_beyond = 0;   // non-blank characters after the last column
 };

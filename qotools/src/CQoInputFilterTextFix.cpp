@@ -15,7 +15,7 @@ CQoInputFilterTextFix::CQoInputFilterTextFix()
 
 CQoInputFilterTextFix::CQoInputFilterTextFix(CQoInputFilterTextFix const &other)
     : CQoInputFilter(other), m_reader(new QoTextReader), m_nRecordLen(other.m_nRecordLen),
-      m_lengths(other.m_lengths)
+      m_widths(other.m_widths)
 {
     m_lCurrentRow = -1;
     m_bNumRowsKnown = false;
@@ -27,7 +27,7 @@ CQoInputFilterTextFix &CQoInputFilterTextFix::operator=(CQoInputFilterTextFix co
         CQoInputFilter::operator=(other);
         m_reader->Close();
         m_nRecordLen = other.m_nRecordLen;
-        m_lengths = other.m_lengths;
+        m_widths = other.m_widths;
         m_lCurrentRow = -1;
         m_bNumRowsKnown = false;
     }
@@ -49,31 +49,20 @@ void CQoInputFilterTextFix::RecordLen(int length)
 
 void CQoInputFilterTextFix::SetNumCols(int cols)
 {
-    if (cols < 0)
-        cols = 0;
-    if (cols != static_cast<int>(m_lengths.size()))
+    if (m_widths.SetCount(cols))
         m_bModified = true;
-    m_lengths.resize(cols, 1);
-    SetNumColsInternal(cols);
+    SetNumColsInternal(m_widths.Count());
 }
 
 int CQoInputFilterTextFix::ColLen(int col) const
 {
-    if (col < 0 || col >= static_cast<int>(m_lengths.size()))
-        return 0;
-    return m_lengths[col];
+    return m_widths.Get(col);
 }
 
 void CQoInputFilterTextFix::ColLen(int col, int length)
 {
-    if (col < 0 || col >= static_cast<int>(m_lengths.size()))
-        return;
-    if (length < 1)
-        length = 1;
-    if (m_lengths[col] != length) {
-        m_lengths[col] = length;
+    if (m_widths.Set(col, length))
         m_bModified = true;
-    }
 }
 
 long long CQoInputFilterTextFix::RowOffset(long row) const
@@ -102,7 +91,7 @@ void CQoInputFilterTextFix::Init(CQoString const &name)
     m_record.Empty();
     m_reader->Open(m_strFileName, m_nCharSet);
     m_fileLength = m_reader->Length();
-    m_colNames.assign(m_lengths.size(), CQoString());
+    m_colNames.assign(static_cast<std::size_t>(m_widths.Count()), CQoString());
     LoadColumnNames();
 }
 
@@ -115,13 +104,11 @@ void CQoInputFilterTextFix::LoadColumnNames()
     if (have > static_cast<std::size_t>(m_nRecordLen))
         have = static_cast<std::size_t>(m_nRecordLen);
     CQoString header(m_reader->Data(), static_cast<int>(have));
-    std::size_t start = 0;
-    m_colNames.assign(m_lengths.size(), CQoString());
-    for (std::size_t i = 0; i < m_lengths.size() && start < have; ++i) {
-        CQoString name = header.Mid(static_cast<int>(start), m_lengths[i]);
+    m_colNames.assign(static_cast<std::size_t>(m_widths.Count()), CQoString());
+    for (int i = 0; i < m_widths.Count() && m_widths.Offset(i) < static_cast<int>(have); ++i) {
+        CQoString name = header.Mid(m_widths.Offset(i), m_widths.Get(i));
         name.TrimRight(" ");
-        m_colNames[i] = name;
-        start += static_cast<std::size_t>(m_lengths[i]);
+        m_colNames[static_cast<std::size_t>(i)] = name;
     }
     m_lCurrentRow = -1;
 }
@@ -233,14 +220,12 @@ bool CQoInputFilterTextFix::AbsoluteRow(long row)
 void CQoInputFilterTextFix::Value(int col, CQoString &value)
 {
     value.Empty();
-    if (m_lCurrentRow < 0 || col < 0 || col >= static_cast<int>(m_lengths.size()))
+    if (m_lCurrentRow < 0 || col < 0 || col >= m_widths.Count())
         return;
-    int start = 0;
-    for (int i = 0; i < col; ++i)
-        start += m_lengths[i];
+    int start = m_widths.Offset(col);
     if (start >= m_record.GetLength())
         return;
-    int end = start + m_lengths[col];
+    int end = start + m_widths.Get(col);
     if (end > m_record.GetLength())
         end = m_record.GetLength();
     char const *data = m_record.GetString();
@@ -271,10 +256,8 @@ bool CQoInputFilterTextFix::StartDescription(CQoString &line)
     CQoString text;
     text.Format("Satzl\xE4nge: %d", m_nRecordLen);
     AddDescription(text);
-    for (std::size_t i = 0; i < m_lengths.size(); ++i) {
-        text.Format("Spalte %d: %d Zeichen", static_cast<int>(i + 1), m_lengths[i]);
-        AddDescription(text);
-    }
+    for (int i = 0; i < m_widths.Count(); ++i)
+        AddDescription(m_widths.Description(i));
     return NextDescription(line);
 }
 
@@ -283,8 +266,8 @@ void CQoInputFilterTextFix::CopyFrom(CQoInputFilter const &other)
     CQoInputFilter::CopyFrom(other);
     if (auto const *fix = dynamic_cast<CQoInputFilterTextFix const *>(&other)) {
         m_nRecordLen = fix->m_nRecordLen;
-        m_lengths = fix->m_lengths;
-        SetNumColsInternal(static_cast<int>(m_lengths.size()));
+        m_widths = fix->m_widths;
+        SetNumColsInternal(m_widths.Count());
     }
 }
 
@@ -292,12 +275,7 @@ void CQoInputFilterTextFix::WriteConfig(CQoConfigFile &cfg, CQoString const &sec
 {
     CQoInputFilter::WriteConfig(cfg, section);
     cfg.SetValue(section, "recordlen", m_nRecordLen);
-    cfg.SetValue(section, "columns", static_cast<int>(m_lengths.size()));
-    CQoString key;
-    for (std::size_t i = 0; i < m_lengths.size(); ++i) {
-        key.Format("collen%d", static_cast<int>(i));
-        cfg.SetValue(section, key, m_lengths[i]);
-    }
+    m_widths.WriteConfig(cfg, section);
 }
 
 void CQoInputFilterTextFix::ReadConfig(CQoConfigFile &cfg, CQoString const &section)
@@ -306,14 +284,7 @@ void CQoInputFilterTextFix::ReadConfig(CQoConfigFile &cfg, CQoString const &sect
     int length = m_nRecordLen;
     if (cfg.GetValue(section, "recordlen", length))
         RecordLen(length);
-    int cols = static_cast<int>(m_lengths.size());
-    if (cfg.GetValue(section, "columns", cols) && cols >= 0 && cols <= 100000)
-        SetNumCols(cols);
-    CQoString key;
-    for (int i = 0; i < static_cast<int>(m_lengths.size()); ++i) {
-        key.Format("collen%d", i);
-        int len = m_lengths[i];
-        if (cfg.GetValue(section, key, len))
-            ColLen(i, len);
-    }
+    if (m_widths.ReadConfig(cfg, section))
+        m_bModified = true;
+    SetNumColsInternal(m_widths.Count());
 }

@@ -11,44 +11,30 @@ CQoInputFilterTextVF::CQoInputFilterTextVF()
 
 void CQoInputFilterTextVF::SetNumCols(int cols)
 {
-    if (cols < 0)
-        cols = 0;
-    if (cols != static_cast<int>(m_lengths.size()))
+    if (m_widths.SetCount(cols))
         m_bModified = true;
-    m_lengths.resize(cols, 1);
-    SetNumColsInternal(cols);
+    SetNumColsInternal(m_widths.Count());
 }
 
 int CQoInputFilterTextVF::ColLen(int col) const
 {
-    if (col < 0 || col >= static_cast<int>(m_lengths.size()))
-        return 0;
-    return m_lengths[col];
+    return m_widths.Get(col);
 }
 
 void CQoInputFilterTextVF::ColLen(int col, int length)
 {
-    if (col < 0 || col >= static_cast<int>(m_lengths.size()))
-        return;
-    if (length < 1)
-        length = 1;
-    if (m_lengths[col] != length) {
-        m_lengths[col] = length;
+    if (m_widths.Set(col, length))
         m_bModified = true;
-    }
 }
 
 int CQoInputFilterTextVF::RecordWidth() const
 {
-    int width = 0;
-    for (int length : m_lengths)
-        width += length;
-    return width;
+    return m_widths.Total();
 }
 
 void CQoInputFilterTextVF::DetermineColumns()
 {
-    m_nNumCols = static_cast<int>(m_lengths.size());
+    m_nNumCols = m_widths.Count();
 }
 
 int CQoInputFilterTextVF::ParseRecord(char const *begin, char const *end, bool eof, std::size_t &used)
@@ -73,7 +59,7 @@ int CQoInputFilterTextVF::ParseRecord(char const *begin, char const *end, bool e
     }
     std::size_t lineLength = static_cast<std::size_t>(lineEnd - begin);
     std::size_t start = 0;
-    for (int length : m_lengths) {
+    for (int length : m_widths.Widths()) {
         std::size_t from = start < lineLength ? start : lineLength;
         std::size_t to = start + static_cast<std::size_t>(length);
         if (to > lineLength)
@@ -84,7 +70,7 @@ int CQoInputFilterTextVF::ParseRecord(char const *begin, char const *end, bool e
         start += static_cast<std::size_t>(length);
     }
     m_beyond = 0;
-    if (!m_lengths.empty() && start < lineLength) {
+    if (m_widths.Count() > 0 && start < lineLength) {
         std::size_t to = lineLength;
         while (to > start && begin[to - 1] == ' ')
             --to;
@@ -105,11 +91,8 @@ CQoString CQoInputFilterTextVF::CheckRecord()
 bool CQoInputFilterTextVF::StartDescription(CQoString &line)
 {
     BeginDescription();
-    CQoString text;
-    for (std::size_t i = 0; i < m_lengths.size(); ++i) {
-        text.Format("Spalte %d: %d Zeichen", static_cast<int>(i + 1), m_lengths[i]);
-        AddDescription(text);
-    }
+    for (int i = 0; i < m_widths.Count(); ++i)
+        AddDescription(m_widths.Description(i));
     return NextDescription(line);
 }
 
@@ -117,33 +100,21 @@ void CQoInputFilterTextVF::CopyFrom(CQoInputFilter const &other)
 {
     CQoInputFilterText::CopyFrom(other);
     if (auto const *vf = dynamic_cast<CQoInputFilterTextVF const *>(&other)) {
-        m_lengths = vf->m_lengths;
-        SetNumColsInternal(static_cast<int>(m_lengths.size()));
+        m_widths = vf->m_widths;
+        SetNumColsInternal(m_widths.Count());
     }
 }
 
 void CQoInputFilterTextVF::WriteConfig(CQoConfigFile &cfg, CQoString const &section)
 {
     CQoInputFilterText::WriteConfig(cfg, section);
-    cfg.SetValue(section, "columns", static_cast<int>(m_lengths.size()));
-    CQoString key;
-    for (std::size_t i = 0; i < m_lengths.size(); ++i) {
-        key.Format("collen%d", static_cast<int>(i));
-        cfg.SetValue(section, key, m_lengths[i]);
-    }
+    m_widths.WriteConfig(cfg, section);
 }
 
 void CQoInputFilterTextVF::ReadConfig(CQoConfigFile &cfg, CQoString const &section)
 {
     CQoInputFilterText::ReadConfig(cfg, section);
-    int cols = static_cast<int>(m_lengths.size());
-    if (cfg.GetValue(section, "columns", cols) && cols >= 0 && cols <= 100000)
-        SetNumCols(cols);
-    CQoString key;
-    for (int i = 0; i < static_cast<int>(m_lengths.size()); ++i) {
-        key.Format("collen%d", i);
-        int length = m_lengths[i];
-        if (cfg.GetValue(section, key, length))
-            ColLen(i, length);
-    }
+    if (m_widths.ReadConfig(cfg, section))
+        m_bModified = true;
+    SetNumColsInternal(m_widths.Count());
 }
