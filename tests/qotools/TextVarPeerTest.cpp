@@ -1,8 +1,9 @@
 // The delimited reader against Python's csv module reading the same files.
-// The peer runs as a host program; in the Windows build (under Wine) it cannot
-// be started from the test, so the comparison is skipped there.
+// The peer is the host's Python, started natively or through Wine's start
+// /unix (see DbasePythonPeer.h).
 #include "CQoInputFilterTextVar.h"
 
+#include "DbasePythonPeer.h"
 #include "TempFolder.h"
 #include "TextFilterTestSupport.h"
 
@@ -11,7 +12,6 @@
 #include <cstdio>
 #include <random>
 
-#if !defined(_WIN32)
 namespace {
 
 // A row as text: fields in hex, joined by '|', trailing empty fields dropped
@@ -33,11 +33,11 @@ std::string Canonical(Row row)
     return out;
 }
 
-std::string PythonRows(std::string const &path, char delimiter, char quote, char escape)
+// Python's reading of peer.csv in the folder, one canonical row per line;
+// empty when the peer could not run.
+std::string PythonRows(PeerFolder const &folder, char delimiter, char quote, char escape)
 {
-    TempFolder tmp;
-    std::string script = tmp.Path("peer.py");
-    std::string text = "import csv, sys\n"
+    std::string text = "import csv\n"
                        "kw = dict(delimiter=chr(" + std::to_string(static_cast<unsigned char>(delimiter)) + "))\n";
     if (quote)
         text += "kw['quotechar'] = chr(" + std::to_string(static_cast<unsigned char>(quote)) + ")\n";
@@ -45,21 +45,15 @@ std::string PythonRows(std::string const &path, char delimiter, char quote, char
         text += "kw['quoting'] = csv.QUOTE_NONE\n";
     if (escape)
         text += "kw['escapechar'] = chr(" + std::to_string(static_cast<unsigned char>(escape)) + ")\n";
-    text += "with open(sys.argv[1], encoding='latin-1', newline='') as f:\n"
+    text += "out = open(os.path.join(folder, 'rows.txt'), 'w', newline='')\n"
+            "with open(os.path.join(folder, 'peer.csv'), encoding='latin-1', newline='') as f:\n"
             "    for row in csv.reader(f, **kw):\n"
             "        while row and row[-1] == '': row.pop()\n"
-            "        print('|'.join(x.encode('latin-1').hex() for x in row))\n";
-    WriteBytes(script, text);
-    std::string command = "/usr/bin/python3 " + script + " " + path;
-    std::string out;
-    if (std::FILE *pipe = popen(command.c_str(), "r")) {
-        char chunk[4096];
-        std::size_t n;
-        while ((n = std::fread(chunk, 1, sizeof chunk, pipe)) > 0)
-            out.append(chunk, n);
-        pclose(pipe);
-    }
-    return out;
+            "        out.write('|'.join(x.encode('latin-1').hex() for x in row) + '\\n')\n"
+            "out.close()\n";
+    if (!RunPython(folder, "csvpeer", text))
+        return std::string();
+    return ReadFileBytes(folder.Path("rows.txt"));
 }
 
 std::string OurRows(std::string const &path, char delimiter, char quote, char escape)
@@ -124,17 +118,13 @@ std::string RandomFile(std::mt19937 &random, char delimiter, char quote, char es
 }
 
 } // namespace
-#endif
 
 TEST(TextVarPeer, ReadsAsPythonCsvReadsTheSameDialect)
 {
-#if defined(_WIN32)
-    GTEST_SKIP() << "the Python peer is a host program; compared in the native run";
-#else
-    if (!std::fopen("/usr/bin/python3", "rb"))
-        GTEST_SKIP() << "/usr/bin/python3 missing";
-    TempFolder tmp;
-    std::string path = tmp.Path("peer.csv");
+    PeerFolder folder;
+    if (!folder.Usable())
+        PEER_UNAVAILABLE();
+    std::string path = folder.Path("peer.csv");
     struct Dialect {
         char delimiter, quote, escape;
     } const dialects[] = {{';', '"', 0}, {',', '"', 0}, {'\t', '\'', 0}, {';', '"', '\\'}, {'|', 0, '\\'}};
@@ -143,8 +133,9 @@ TEST(TextVarPeer, ReadsAsPythonCsvReadsTheSameDialect)
         for (int round = 0; round < 2; ++round) {
             std::string file = RandomFile(random, d.delimiter, d.quote, d.escape, 500);
             WriteBytes(path, file);
-            std::string python = PythonRows(path, d.delimiter, d.quote, d.escape);
-            ASSERT_FALSE(python.empty());
+            std::string python = PythonRows(folder, d.delimiter, d.quote, d.escape);
+            if (python.empty())
+                PEER_UNAVAILABLE();
             ASSERT_EQ(python, OurRows(path, d.delimiter, d.quote, d.escape))
                 << "dialect " << int(d.delimiter) << " " << int(d.quote) << " " << int(d.escape)
                 << " round " << round;
@@ -152,6 +143,5 @@ TEST(TextVarPeer, ReadsAsPythonCsvReadsTheSameDialect)
     }
     // The named cases once more, by hand.
     WriteBytes(path, "a,\"b,c\",\"d\"\"e\"\r\n\"zwei\r\nZeilen\",,\n\n\"\",x,\"letzte\"");
-    EXPECT_EQ(PythonRows(path, ',', '"', 0), OurRows(path, ',', '"', 0));
-#endif
+    EXPECT_EQ(PythonRows(folder, ',', '"', 0), OurRows(path, ',', '"', 0));
 }
