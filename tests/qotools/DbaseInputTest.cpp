@@ -6,7 +6,7 @@
 #include "CQoFile.h"
 #include "CQoInputFilterDbase34.h"
 
-#include "DbasePythonPeer.h"
+#include "PythonPeer.h"
 #include "TempFolder.h"
 
 #include <gtest/gtest.h>

@@ -8,7 +8,7 @@
 #include "CQoInputFilterDbase34.h"
 #include "CQoOutputFilterDbase.h"
 
-#include "DbasePythonPeer.h"
+#include "PythonPeer.h"
 #include "TempFolder.h"
 
 #include <gtest/gtest.h>

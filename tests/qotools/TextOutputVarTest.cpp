@@ -5,7 +5,7 @@
 #include "CQoFile.h"
 #include "CQoOutputFilterTextVar.h"
 
-#include "DbasePythonPeer.h"
+#include "PythonPeer.h"
 #include "TempFolder.h"
 
 #include <gtest/gtest.h>

@@ -1,9 +1,9 @@
 // The delimited reader against Python's csv module reading the same files.
 // The peer is the host's Python, started natively or through Wine's start
-// /unix (see DbasePythonPeer.h).
+// /unix (see PythonPeer.h).
 #include "CQoInputFilterTextVar.h"
 
-#include "DbasePythonPeer.h"
+#include "PythonPeer.h"
 #include "TempFolder.h"
 #include "TextFilterTestSupport.h"
 
