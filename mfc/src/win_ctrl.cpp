@@ -106,6 +106,35 @@ void CEdit::Cut() { SEND(WM_CUT, 0, 0); }
 void CEdit::Paste() { SEND(WM_PASTE, 0, 0); }
 BOOL CEdit::Undo() { return (BOOL)SEND(EM_UNDO, 0, 0); }
 
+namespace {
+
+// The owner-draw messages that a list box or combo box gets back from its
+// parent: drawn, measured, compared and freed by the control's own virtuals.
+template <class Control>
+bool ReflectOwnerDraw(Control* control, UINT message, LPARAM lParam, LRESULT* pResult) {
+  LRESULT result = TRUE;
+  switch (message) {
+  case WM_DRAWITEM:
+    control->DrawItem((LPDRAWITEMSTRUCT)lParam);
+    break;
+  case WM_MEASUREITEM:
+    control->MeasureItem((LPMEASUREITEMSTRUCT)lParam);
+    break;
+  case WM_COMPAREITEM:
+    result = control->CompareItem((LPCOMPAREITEMSTRUCT)lParam);
+    break;
+  case WM_DELETEITEM:
+    control->DeleteItem((LPDELETEITEMSTRUCT)lParam);
+    break;
+  default:
+    return false;
+  }
+  if (pResult != NULL) *pResult = result;
+  return true;
+}
+
+}  // namespace
+
 // ---------------------------------------------------------------------------
 // CListBox
 // ---------------------------------------------------------------------------
@@ -180,24 +209,9 @@ int CListBox::CompareItem(LPCOMPAREITEMSTRUCT) {
 void CListBox::DeleteItem(LPDELETEITEMSTRUCT) {}
 
 BOOL CListBox::OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* pResult) {
-  switch (message) {
-  case WM_DRAWITEM:
-    DrawItem((LPDRAWITEMSTRUCT)lParam);
-    break;
-  case WM_MEASUREITEM:
-    MeasureItem((LPMEASUREITEMSTRUCT)lParam);
-    break;
-  case WM_COMPAREITEM:
-    if (pResult != NULL) *pResult = CompareItem((LPCOMPAREITEMSTRUCT)lParam);
+  if (ReflectOwnerDraw(this, message, lParam, pResult))
     return TRUE;
-  case WM_DELETEITEM:
-    DeleteItem((LPDELETEITEMSTRUCT)lParam);
-    break;
-  default:
-    return CWnd::OnChildNotify(message, wParam, lParam, pResult);
-  }
-  if (pResult != NULL) *pResult = TRUE;
-  return TRUE;
+  return CWnd::OnChildNotify(message, wParam, lParam, pResult);
 }
 
 // ---------------------------------------------------------------------------
@@ -270,24 +284,9 @@ int CComboBox::CompareItem(LPCOMPAREITEMSTRUCT) {
 void CComboBox::DeleteItem(LPDELETEITEMSTRUCT) {}
 
 BOOL CComboBox::OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* pResult) {
-  switch (message) {
-  case WM_DRAWITEM:
-    DrawItem((LPDRAWITEMSTRUCT)lParam);
-    break;
-  case WM_MEASUREITEM:
-    MeasureItem((LPMEASUREITEMSTRUCT)lParam);
-    break;
-  case WM_COMPAREITEM:
-    if (pResult != NULL) *pResult = CompareItem((LPCOMPAREITEMSTRUCT)lParam);
+  if (ReflectOwnerDraw(this, message, lParam, pResult))
     return TRUE;
-  case WM_DELETEITEM:
-    DeleteItem((LPDELETEITEMSTRUCT)lParam);
-    break;
-  default:
-    return CWnd::OnChildNotify(message, wParam, lParam, pResult);
-  }
-  if (pResult != NULL) *pResult = TRUE;
-  return TRUE;
+  return CWnd::OnChildNotify(message, wParam, lParam, pResult);
 }
 
 // ---------------------------------------------------------------------------
