@@ -1,5 +1,7 @@
 // Dialog data exchange: members <-> controls, with the German prompts of
 // qomfc.dll when the user's input cannot be taken.
+#include <limits>
+#include <type_traits>
 #include "afxpriv.h"
 
 #include <errno.h>
@@ -91,6 +93,32 @@ BOOL ParseUnsigned(HWND hWnd, unsigned long long ullMax, unsigned long long& val
   pDX->Fail();
 }
 
+// An integer field: parsed within the type's range (unsigned types refuse a
+// minus sign), shown in decimal.
+template <class T>
+void ExchangeInteger(CDataExchange* pDX, int nIDC, T& value) {
+  HWND hWndCtrl = pDX->PrepareEditCtrl(nIDC);
+  if (pDX->m_bSaveAndValidate) {
+    if (std::is_signed<T>::value) {
+      long long v;
+      if (!ParseSigned(hWndCtrl, std::numeric_limits<T>::min(), std::numeric_limits<T>::max(), v))
+        FailWith(pDX, AFX_IDP_PARSE_INT);
+      value = (T)v;
+    } else {
+      unsigned long long v;
+      if (!ParseUnsigned(hWndCtrl, std::numeric_limits<T>::max(), v)) FailWith(pDX, AFX_IDP_PARSE_UINT);
+      value = (T)v;
+    }
+  } else {
+    char sz[32];
+    if (std::is_signed<T>::value)
+      snprintf(sz, sizeof(sz), "%lld", (long long)value);
+    else
+      snprintf(sz, sizeof(sz), "%llu", (unsigned long long)value);
+    AfxSetWindowText(hWndCtrl, sz);
+  }
+}
+
 } // namespace
 
 void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, CString& value) {
@@ -101,57 +129,10 @@ void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, CString& value) {
     AfxSetWindowText(hWndCtrl, value);
 }
 
-void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, int& value) {
-  HWND hWndCtrl = pDX->PrepareEditCtrl(nIDC);
-  if (pDX->m_bSaveAndValidate) {
-    long long v;
-    if (!ParseSigned(hWndCtrl, INT_MIN, INT_MAX, v)) FailWith(pDX, AFX_IDP_PARSE_INT);
-    value = (int)v;
-  } else {
-    char sz[32];
-    snprintf(sz, sizeof(sz), "%d", value);
-    AfxSetWindowText(hWndCtrl, sz);
-  }
-}
-
-void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, long& value) {
-  HWND hWndCtrl = pDX->PrepareEditCtrl(nIDC);
-  if (pDX->m_bSaveAndValidate) {
-    long long v;
-    if (!ParseSigned(hWndCtrl, LONG_MIN, LONG_MAX, v)) FailWith(pDX, AFX_IDP_PARSE_INT);
-    value = (long)v;
-  } else {
-    char sz[32];
-    snprintf(sz, sizeof(sz), "%ld", value);
-    AfxSetWindowText(hWndCtrl, sz);
-  }
-}
-
-void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, UINT& value) {
-  HWND hWndCtrl = pDX->PrepareEditCtrl(nIDC);
-  if (pDX->m_bSaveAndValidate) {
-    unsigned long long v;
-    if (!ParseUnsigned(hWndCtrl, UINT_MAX, v)) FailWith(pDX, AFX_IDP_PARSE_UINT);
-    value = (UINT)v;
-  } else {
-    char sz[32];
-    snprintf(sz, sizeof(sz), "%u", value);
-    AfxSetWindowText(hWndCtrl, sz);
-  }
-}
-
-void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, DWORD& value) {
-  HWND hWndCtrl = pDX->PrepareEditCtrl(nIDC);
-  if (pDX->m_bSaveAndValidate) {
-    unsigned long long v;
-    if (!ParseUnsigned(hWndCtrl, ULONG_MAX, v)) FailWith(pDX, AFX_IDP_PARSE_UINT);
-    value = (DWORD)v;
-  } else {
-    char sz[32];
-    snprintf(sz, sizeof(sz), "%lu", value);
-    AfxSetWindowText(hWndCtrl, sz);
-  }
-}
+void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, int& value) { ExchangeInteger(pDX, nIDC, value); }
+void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, long& value) { ExchangeInteger(pDX, nIDC, value); }
+void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, UINT& value) { ExchangeInteger(pDX, nIDC, value); }
+void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, DWORD& value) { ExchangeInteger(pDX, nIDC, value); }
 
 void AFXAPI DDX_Text(CDataExchange* pDX, int nIDC, double& value) {
   HWND hWndCtrl = pDX->PrepareEditCtrl(nIDC);
