@@ -8,6 +8,7 @@
 #include "CQoFile.h"
 #include "CQoInputFilterDbase34.h"
 #include "CQoOutputFilterDbase.h"
+#include "PeakMemory.h"
 
 #include <chrono>
 #include <cstdio>
@@ -136,6 +137,7 @@ int main(int argc, char **argv)
     Measure("no deleted", path, 0);
     DeleteEveryTenth(path, records);
     Measure("every 10th deleted", path, 10);
+    PrintPeakMemory("writing and reading the whole file twice");
     std::filesystem::remove(path);
     return 0;
 }
