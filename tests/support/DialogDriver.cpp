@@ -113,36 +113,35 @@ int Dialog::Selection(int id) const
     return r < 0 ? -1 : static_cast<int>(r);
 }
 
-std::vector<std::string> Dialog::ComboItems(int id) const
+namespace {
+
+// The texts of a combo box's or list box's items, through the box's own
+// count, length and text messages.
+std::vector<std::string> ItemTexts(HWND h, UINT getCount, UINT getTextLen, UINT getText)
 {
     std::vector<std::string> items;
-    HWND h = Item(id);
     if (!h) return items;
-    LRESULT n = SendMessageA(h, CB_GETCOUNT, 0, 0);
+    LRESULT n = SendMessageA(h, getCount, 0, 0);
     for (LRESULT i = 0; i < n; ++i) {
-        LRESULT len = SendMessageA(h, CB_GETLBTEXTLEN, i, 0);
+        LRESULT len = SendMessageA(h, getTextLen, i, 0);
         std::string s(static_cast<size_t>(std::max<LRESULT>(len, 0)) + 1, '\0');
-        LRESULT got = SendMessageA(h, CB_GETLBTEXT, i, reinterpret_cast<LPARAM>(&s[0]));
+        LRESULT got = SendMessageA(h, getText, i, reinterpret_cast<LPARAM>(&s[0]));
         s.resize(static_cast<size_t>(std::max<LRESULT>(got, 0)));
         items.push_back(s);
     }
     return items;
 }
 
+}  // namespace
+
+std::vector<std::string> Dialog::ComboItems(int id) const
+{
+    return ItemTexts(Item(id), CB_GETCOUNT, CB_GETLBTEXTLEN, CB_GETLBTEXT);
+}
+
 std::vector<std::string> Dialog::ListItems(int id) const
 {
-    std::vector<std::string> items;
-    HWND h = Item(id);
-    if (!h) return items;
-    LRESULT n = SendMessageA(h, LB_GETCOUNT, 0, 0);
-    for (LRESULT i = 0; i < n; ++i) {
-        LRESULT len = SendMessageA(h, LB_GETTEXTLEN, i, 0);
-        std::string s(static_cast<size_t>(std::max<LRESULT>(len, 0)) + 1, '\0');
-        LRESULT got = SendMessageA(h, LB_GETTEXT, i, reinterpret_cast<LPARAM>(&s[0]));
-        s.resize(static_cast<size_t>(std::max<LRESULT>(got, 0)));
-        items.push_back(s);
-    }
-    return items;
+    return ItemTexts(Item(id), LB_GETCOUNT, LB_GETTEXTLEN, LB_GETTEXT);
 }
 
 ControlRect Dialog::RectPixels(int id) const
