@@ -17,11 +17,14 @@ public:
 
     CConversion();
 
+    // Raises CQoException for a character set the program does not know.
     void ReadConfig(CQoConfigFile& config);
     void WriteConfig(CQoConfigFile& config) const;
 
     // Converts every record; returns the number of records written. Raises
-    // CQoException when a file cannot be opened, read or written.
+    // CQoException when a file cannot be opened, read or written, or when
+    // the output is the input. The target is replaced only by a complete
+    // output.
     long Run();
 
     CQoString m_inputFile;
@@ -31,4 +34,5 @@ public:
 
 private:
     static int FileMode(int charset);
+    static void ReadCharset(CQoConfigFile& config, const char* section, int& charset);
 };

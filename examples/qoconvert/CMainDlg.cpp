@@ -1,6 +1,7 @@
 #include "CMainDlg.h"
 
 #include <CQoConfigFile.h>
+#include <CQoException.h>
 
 #include "QoConvertApp.h"
 
@@ -28,9 +29,17 @@ BOOL CMainDlg::OnInitDialog()
     FillCharsets(IDC_OUTPUT_CHARSET);
 
     CQoConfigFile config;
-    config.Open(theApp.m_projectFile);
     CConversion job;
-    job.ReadConfig(config);
+    CString problem;
+    if (!config.Open(theApp.m_projectFile)) {
+        problem = "Die Projektdatei kann nicht gelesen werden.";
+    } else {
+        try {
+            job.ReadConfig(config);
+        } catch (const CQoException& e) {
+            problem = e.Message();   // the user picks a valid set below
+        }
+    }
     m_project = (const char*)theApp.m_projectFolder;
     m_inputFile = (const char*)job.m_inputFile;
     m_inputCharset = job.m_inputCharset;
@@ -38,6 +47,7 @@ BOOL CMainDlg::OnInitDialog()
     m_outputCharset = job.m_outputCharset;
 
     CDialog::OnInitDialog();
+    SetDlgItemText(IDC_STATUS, problem);
     return TRUE;
 }
 
@@ -56,16 +66,23 @@ void CMainDlg::OnConvert()
     if (!UpdateData(TRUE))
         return;
 
-    // The project keeps what the user chose.
+    // The project keeps what the user chose. A project file that cannot be
+    // read is not written over: its other settings would be lost.
     CQoConfigFile config;
-    config.Open(theApp.m_projectFile);
+    if (!config.Open(theApp.m_projectFile)) {
+        SetDlgItemText(IDC_STATUS, "Die Projektdatei kann nicht gelesen werden.");
+        return;
+    }
     CConversion job;
     job.m_inputFile = (const char*)m_inputFile;
     job.m_inputCharset = m_inputCharset;
     job.m_outputFile = (const char*)m_outputFile;
     job.m_outputCharset = m_outputCharset;
     job.WriteConfig(config);
-    config.Write(theApp.m_projectFile);
+    if (!config.Write(theApp.m_projectFile)) {
+        SetDlgItemText(IDC_STATUS, "Projektdatei nicht gespeichert.");
+        return;
+    }
 
     CString status = theApp.Convert() ? "Konvertiert." : "Fehlgeschlagen.";
     SetDlgItemText(IDC_STATUS, status);

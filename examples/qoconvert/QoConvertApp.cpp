@@ -24,6 +24,27 @@ CQoString InProject(const CQoString& folder, const CQoString& file)
                     || (!file.IsEmpty() && (file.GetAt(0) == '\\' || file.GetAt(0) == '/'));
     return absolute || file.IsEmpty() ? file : folder + "\\" + file;
 }
+
+// A batch run has no window: its errors go to the console that started it
+// (attached when the program has none of its own) as well as to the log.
+void ToConsole(const char* text)
+{
+    HANDLE err = GetStdHandle(STD_ERROR_HANDLE);
+    if (err == NULL || err == INVALID_HANDLE_VALUE) {
+        if (!AttachConsole(ATTACH_PARENT_PROCESS))
+            return;
+        err = GetStdHandle(STD_ERROR_HANDLE);
+        if (err == NULL || err == INVALID_HANDLE_VALUE)
+            return;
+    }
+    // The console shows OEM characters; the program's texts are Ansi.
+    CString line = text;
+    line += "\r\n";
+    CharToOemBuffA(line.GetBuffer(), line.GetBuffer(), (DWORD)line.GetLength());
+    line.ReleaseBuffer();
+    DWORD written = 0;
+    WriteFile(err, (const char*)line, (DWORD)line.GetLength(), &written, NULL);
+}
 }
 
 CQoConvertApp::CQoConvertApp()
@@ -88,16 +109,42 @@ int CQoConvertApp::ExitInstance()
     return m_exitCode;
 }
 
+void CQoConvertApp::Refuse(int number, const char* text)
+{
+    if (m_batch)
+        ToConsole(text);
+    QoBatchMessageBox(number, IDOK, text, MB_OK | MB_ICONSTOP, 0);
+}
+
 bool CQoConvertApp::Convert()
 {
+    DWORD attributes = GetFileAttributesA(m_projectFolder);
+    if (attributes == INVALID_FILE_ATTRIBUTES || !(attributes & FILE_ATTRIBUTE_DIRECTORY)) {
+        CString text;
+        text.Format(IDS_NO_FOLDER, (const char*)m_projectFolder);
+        Refuse(2102, text);
+        return false;
+    }
     CQoConfigFile config;
-    config.Open(m_projectFile);
+    if (!config.Open(m_projectFile)) {
+        CString text;
+        text.Format(IDS_CANNOT_READ, (const char*)m_projectFile);
+        Refuse(2103, text);
+        return false;
+    }
     CConversion job;
-    job.ReadConfig(config);
+    try {
+        job.ReadConfig(config);
+    } catch (const CQoException& e) {
+        CString text;
+        text.Format(IDS_BAD_PROJECT, (const char*)m_projectFile, e.Text());
+        Refuse(2104, text);
+        return false;
+    }
     if (job.m_inputFile.IsEmpty() || job.m_outputFile.IsEmpty()) {
         CString text;
         text.Format(IDS_NO_PROJECT, (const char*)m_projectFile);
-        QoBatchMessageBox(2101, IDOK, text, MB_OK | MB_ICONSTOP, 0);
+        Refuse(2101, text);
         return false;
     }
 
@@ -111,11 +158,12 @@ bool CQoConvertApp::Convert()
         QoBatchMessageBox(1001, IDOK, done, MB_OK | MB_ICONINFORMATION, 0);
         return true;
     } catch (const CQoException& e) {
-        if (m_batch)
-            // No window in batch mode: the log keeps the reason.
-            QoBatchMessageBox(kErrorConversion, IDOK, e.Message(), MB_OK | MB_ICONSTOP, 0);
-        else
+        if (m_batch) {
+            // No window in batch mode: the console and the log say why.
+            Refuse(kErrorConversion, e.Message());
+        } else {
             CQoErrorDlg::ShowError(kErrorConversion, e.Message());
+        }
         return false;
     }
 }

@@ -31,6 +31,9 @@ public:
 
 private:
     void ParseArguments();
+    // Reports why the project cannot be converted: a message box, or in
+    // batch mode the log and the console.
+    void Refuse(int number, const char* text);
     int m_exitCode;
 };
 

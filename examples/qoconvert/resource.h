@@ -16,3 +16,6 @@
 #define IDS_APP_TITLE        5000
 #define IDS_DONE             5001
 #define IDS_NO_PROJECT       5002
+#define IDS_NO_FOLDER        5003
+#define IDS_CANNOT_READ      5004
+#define IDS_BAD_PROJECT      5005

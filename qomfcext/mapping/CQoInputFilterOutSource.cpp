@@ -72,6 +72,10 @@ bool CQoInputFilterOutSource::NextRow()
 {
     if (!m_pSource)
         return false;
+    // Not on a row (FirstRow found none, the source has grown since): the
+    // next row is the first one, not the second.
+    if (m_lCurrentRow < 0)
+        return FirstRow();
     if (m_lRow >= NumRows() - 1)
         return false;
     SetRow(m_lRow + 1);

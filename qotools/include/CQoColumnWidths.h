@@ -15,14 +15,20 @@ class CQoConfigFile;
 
 class QOTOOLS_API CQoColumnWidths {
 public:
+    CQoColumnWidths();
+
     int Count() const { return static_cast<int>(m_widths.size()); }
     std::vector<int> const &Widths() const { return m_widths; }
 
     // Sets the column count (below 0 counts as 0); new columns are 1 wide.
-    // True when the count changed.
+    // True when the count changed. More than qolimits::maxColumns columns, or
+    // widths adding up to more than qolimits::maxRecordLength, raise
+    // CQoException and change nothing.
     bool SetCount(int count);
     // Outside 0 .. Count()-1 Get answers 0 and Set does nothing; a width
-    // below 1 becomes 1. Set answers true when the width changed.
+    // below 1 becomes 1; a width that makes the total exceed
+    // qolimits::maxRecordLength raises CQoException naming "collen<col>".
+    // Set answers true when the width changed.
     int Get(int col) const;
     bool Set(int col, int width);
 
@@ -35,10 +41,16 @@ public:
     CQoString Description(int col) const;
 
     void WriteConfig(CQoConfigFile &cfg, char const *section) const;
-    // Reads what WriteConfig wrote; missing or unfit values keep the current
-    // layout. True when anything changed.
+    // Reads what WriteConfig wrote; missing values keep the current layout.
+    // A count or width beyond its bound raises CQoException naming the key,
+    // and the layout stays as it was. True when anything changed.
     bool ReadConfig(CQoConfigFile const &cfg, char const *section);
 
 private:
+    void Recount();
+    // Raises unless the widths add up to at most qolimits::maxRecordLength.
+    static void CheckTotal(std::vector<int> const &widths, int col);
+
     std::vector<int> m_widths;
+    std::vector<int> m_offsets;    // m_offsets[i]: start of column i; the last entry is the total
 };

@@ -52,6 +52,10 @@ public:
     bool GetValue(char const *section, char const *key, CQoString &value) const;
     bool GetValue(char const *section, char const *key, int &value) const;
     bool GetValue(char const *section, char const *key, long &value) const;
+    // An integer that sizes or places something: a missing key answers false
+    // and leaves `value`; a value that is not a number, or lies outside
+    // low .. high, raises CQoException naming the key.
+    bool GetValue(char const *section, char const *key, int &value, int low, int high) const;
 
     // Sets a key, creating the section and the key at their ends when new.
     // False (and nothing set) for an empty section or key name.

@@ -132,6 +132,19 @@ public:
     // --- files on the disk ---------------------------------------------------
     static bool Exists(char const *path);
     static bool Remove(char const *path);
+    // Puts the finished file `source` in the place of `target` in one step:
+    // a reader sees the old file or the new one, never none, and an existing
+    // target is replaced only when the move succeeds. False on failure, with
+    // both files as they were.
+    static bool MoveOver(char const *source, char const *target);
+    // Creates an empty file of a new, unique name in the folder of `target`
+    // (so that MoveOver stays one step on the same disk) and answers its
+    // name; empty when none could be created.
+    static std::string NewTempFileBeside(char const *target);
+    // True when both names reach the same file: their full paths (resolved
+    // against the current folder, "." and ".." taken out) are equal, letters
+    // compared without case as Windows does.
+    static bool SameFile(char const *a, char const *b);
 
 private:
     enum state { idle, reading, writing };

@@ -68,7 +68,11 @@ public:
     // Header facts of the open file.
     unsigned char Version() const { return m_header.version; }
     unsigned char LanguageDriver() const { return m_header.languageDriver; }
-    long DeclaredRecords() const { return static_cast<long>(m_header.recordCount); }
+    // The record count the header declares, and the records counted as rows:
+    // those the file holds, a cut last one, and at most one missing record
+    // beyond, so that a short file raises at its gap instead of claiming the
+    // declared count.
+    long long DeclaredRecords() const { return m_header.declaredCount; }
 
 protected:
     long CalculateRecordCount() override;
@@ -88,7 +92,8 @@ private:
     CQoFile m_file;
     struct HeaderData {
         unsigned char version = 0;
-        std::uint32_t recordCount = 0;
+        std::uint32_t recordCount = 0;     // records taken as rows (see DeclaredRecords)
+        std::uint32_t declaredCount = 0;   // as the header says
         int headerLength = 0;
         int recordLength = 0;
         unsigned char languageDriver = 0;

@@ -179,6 +179,9 @@ private:
     int ParseHere(std::size_t &used);
     int ParseText(CQoString const &text, std::size_t &used);
     bool HandleDefect(long long offset, CQoString const &why, int parseState);
+    // What went wrong with a record that did not end: an open encloser, or
+    // a record beyond the size limit.
+    CQoString DefectOfUnterminated();
     void ResetRows();
 
     std::vector<Field> m_fields;          // room for the fields; the first m_nFields are in use
@@ -190,4 +193,5 @@ private:
     RowIndex m_index;                     // offsets of the rows read
     bool m_indexComplete = false;
     std::map<long long, Repair> m_repairs;
+    long m_lReadingRow = -1;              // the row being read, for messages; -1: the header
 };

@@ -45,13 +45,15 @@ public:
     bool CreateIndexFile() override;
     long long getActPosInFile() override;
 
-    // Record length in bytes (at least 1).
+    // Record length in bytes, 1 .. qolimits::maxRecordLength (below 1
+    // becomes 1, above raises CQoException).
     int RecordLen() const { return m_nRecordLen; }
     void RecordLen(int length);
-    // The column count; new columns have length 1.
+    // The column count; new columns have length 1. Bounds as CQoColumnWidths.
     void SetNumCols(int cols);
     // Column lengths; outside 0 .. NumCols()-1 the getter answers 0 and the
-    // setter does nothing; a length below 1 becomes 1.
+    // setter does nothing; a length below 1 becomes 1; lengths adding up to
+    // more than qolimits::maxRecordLength raise CQoException.
     int ColLen(int col) const;
     void ColLen(int col, int length);
 
@@ -69,6 +71,7 @@ private:
     CQoColumnWidths m_widths;
     CQoString m_record;          // the current record
     long long m_fileLength = 0;
+    long long m_dataStart = 0;   // after a UTF-8 byte-order mark
     // Decisions about the short last record: row -> corrected record, or
     // no entry with m_shortSkipped.
     std::map<long, CQoString> m_corrections;

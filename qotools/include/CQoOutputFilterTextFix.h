@@ -38,7 +38,8 @@ public:
 
     // --- fixed-length settings ----------------------------------------------------
     // Length of a column; an index outside the columns raises code 19. A
-    // negative length is kept but written as 0.
+    // negative length is kept but written as 0. Lengths adding up to more
+    // than qolimits::maxRecordLength raise CQoException naming the column.
     virtual void SetLength(int col, int length);
     virtual int GetLength(int col);
     // CR LF after each record (default on).
@@ -52,6 +53,7 @@ public:
 
 private:
     void BuildRecord(std::string &record);
+    int Width(int col) const;      // the length as written
 
     std::vector<int> m_lengths;
     bool m_bCrLf = true;

@@ -1,20 +1,63 @@
 #include "CQoColumnWidths.h"
 
 #include "CQoConfigFile.h"
+#include "CQoException.h"
+#include "QoLimits.h"
+
+#include <climits>
+#include <cstdio>
 
 namespace {
-// More columns than any record layout has: a damaged configuration must not
-// make the filter allocate without bound.
-constexpr int kMaxColumns = 100000;
+CQoString WidthKey(int col)
+{
+    CQoString key;
+    key.Format("collen%d", col);
+    return key;
+}
+}
+
+CQoColumnWidths::CQoColumnWidths()
+    : m_offsets(1, 0)
+{
+}
+
+void CQoColumnWidths::Recount()
+{
+    m_offsets.resize(m_widths.size() + 1);
+    long long offset = 0;
+    for (std::size_t i = 0; i < m_widths.size(); ++i) {
+        m_offsets[i] = static_cast<int>(offset);
+        offset += m_widths[i];
+    }
+    m_offsets[m_widths.size()] = static_cast<int>(offset);
+}
+
+void CQoColumnWidths::CheckTotal(std::vector<int> const &widths, int col)
+{
+    long long total = 0;
+    for (int width : widths)
+        total += width;
+    if (total > qolimits::maxRecordLength) {
+        char text[200];
+        std::snprintf(text, sizeof text,
+                      "Die Spalten sind zusammen %lld Zeichen breit; h\xF6" "chstens %d sind m\xF6glich",
+                      total, qolimits::maxRecordLength);
+        throw CQoException(CQoException::invalidArgument, text, col >= 0 ? WidthKey(col).GetString() : "columns");
+    }
 }
 
 bool CQoColumnWidths::SetCount(int count)
 {
     if (count < 0)
         count = 0;
+    qolimits::Checked("columns", count, 0, qolimits::maxColumns);
     if (count == Count())
         return false;
-    m_widths.resize(static_cast<std::size_t>(count), 1);
+    std::vector<int> widths = m_widths;
+    widths.resize(static_cast<std::size_t>(count), 1);
+    CheckTotal(widths, -1);
+    m_widths.swap(widths);
+    Recount();
     return true;
 }
 
@@ -29,24 +72,32 @@ bool CQoColumnWidths::Set(int col, int width)
         return false;
     if (width < 1)
         width = 1;
+    if (width > qolimits::maxRecordLength)
+        qolimits::Checked(WidthKey(col), width, 1, qolimits::maxRecordLength);
     int &current = m_widths[static_cast<std::size_t>(col)];
     if (current == width)
         return false;
+    long long total = static_cast<long long>(Total()) - current + width;
+    if (total > qolimits::maxRecordLength) {
+        std::vector<int> widths = m_widths;
+        widths[static_cast<std::size_t>(col)] = width;
+        CheckTotal(widths, col); // raises
+    }
     current = width;
+    Recount();
     return true;
 }
 
 int CQoColumnWidths::Offset(int col) const
 {
-    int offset = 0;
-    for (int i = 0; i < col && i < Count(); ++i)
-        offset += m_widths[static_cast<std::size_t>(i)];
-    return offset;
+    if (col <= 0)
+        return 0;
+    return m_offsets[static_cast<std::size_t>(col < Count() ? col : Count())];
 }
 
 int CQoColumnWidths::Total() const
 {
-    return Offset(Count());
+    return m_offsets.back();
 }
 
 CQoString CQoColumnWidths::Description(int col) const
@@ -59,25 +110,29 @@ CQoString CQoColumnWidths::Description(int col) const
 void CQoColumnWidths::WriteConfig(CQoConfigFile &cfg, char const *section) const
 {
     cfg.SetValue(section, "columns", Count());
-    CQoString key;
-    for (int i = 0; i < Count(); ++i) {
-        key.Format("collen%d", i);
-        cfg.SetValue(section, key, m_widths[static_cast<std::size_t>(i)]);
-    }
+    for (int i = 0; i < Count(); ++i)
+        cfg.SetValue(section, WidthKey(i), m_widths[static_cast<std::size_t>(i)]);
 }
 
 bool CQoColumnWidths::ReadConfig(CQoConfigFile const &cfg, char const *section)
 {
-    bool changed = false;
+    // Everything is checked before anything changes: a bad project leaves
+    // the layout as it was.
+    std::vector<int> widths = m_widths;
     int count = Count();
-    if (cfg.GetValue(section, "columns", count) && count >= 0 && count <= kMaxColumns)
-        changed = SetCount(count);
-    CQoString key;
-    for (int i = 0; i < Count(); ++i) {
-        key.Format("collen%d", i);
-        int width = Get(i);
-        if (cfg.GetValue(section, key, width) && Set(i, width))
-            changed = true;
+    if (cfg.GetValue(section, "columns", count, 0, qolimits::maxColumns))
+        widths.resize(static_cast<std::size_t>(count), 1);
+    for (std::size_t i = 0; i < widths.size(); ++i) {
+        CQoString key = WidthKey(static_cast<int>(i));
+        int width = 0;
+        if (!cfg.GetValue(section, key, width, INT_MIN, INT_MAX))
+            continue;
+        widths[i] = width < 1 ? 1 : qolimits::Checked(key, width, 1, qolimits::maxRecordLength);
     }
-    return changed;
+    CheckTotal(widths, -1);
+    if (widths == m_widths)
+        return false;
+    m_widths.swap(widths);
+    Recount();
+    return true;
 }

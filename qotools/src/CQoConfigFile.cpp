@@ -1,4 +1,5 @@
 #include "CQoConfigFile.h"
+#include "QoLimits.h"
 
 #include "CQoException.h"
 #include "CQoFile.h"
@@ -7,11 +8,8 @@
 #include <climits>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <string>
-
-#ifdef _WIN32
-#include <windows.h>
-#endif
 
 namespace {
 
@@ -191,6 +189,26 @@ bool CQoConfigFile::GetValue(char const *section, char const *key, int &value) c
     return true;
 }
 
+bool CQoConfigFile::GetValue(char const *section, char const *key, int &value, int low, int high) const
+{
+    CQoString text;
+    if (!GetValue(section, key, text))
+        return false;
+    CQoString trimmed(text);
+    trimmed.Trim();
+    char *stop = nullptr;
+    errno = 0;
+    long long parsed = std::strtoll(trimmed.GetString(), &stop, 10);
+    if (trimmed.IsEmpty() || !stop || *stop != '\0') {
+        CQoString why;
+        why.Format("'%s' ist keine Zahl (%s)", text.GetString(), Safe(key));
+        throw CQoException(CQoException::invalidArgument, why, nullptr);
+    }
+    // strtoll saturates on overflow, which the bound check then refuses.
+    value = qolimits::Checked(key, parsed, low, high);
+    return true;
+}
+
 bool CQoConfigFile::SetValue(char const *section, char const *key, char const *value)
 {
     return SetValue(section, key, CQoString(value));
@@ -320,6 +338,12 @@ CQoString CQoConfigFile::ToText() const
 
 void CQoConfigFile::FromText(char const *text, std::size_t length)
 {
+    // A UTF-8 byte-order mark (written by many editors) is not part of the
+    // first line: left there, it would hide the first section.
+    if (length >= 3 && std::memcmp(text, "\xEF\xBB\xBF", 3) == 0) {
+        text += 3;
+        length -= 3;
+    }
     CQoConfigFile parsed;
     Section *current = nullptr;
     std::string name;
@@ -427,7 +451,9 @@ bool CQoConfigFile::Write(char const *path) const
 {
     if (!path || !*path)
         return false;
-    std::string const temp = std::string(path) + ".~tmp";
+    std::string const temp = CQoFile::NewTempFileBeside(path);
+    if (temp.empty())
+        return false;
     CQoString const text = ToText();
     bool written = false;
     {
@@ -447,11 +473,7 @@ bool CQoConfigFile::Write(char const *path) const
         CQoFile::Remove(temp.c_str());
         return false;
     }
-#ifdef _WIN32
-    bool replaced = MoveFileExA(temp.c_str(), path, MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != 0;
-#else
-    bool replaced = std::rename(temp.c_str(), path) == 0;
-#endif
+    bool replaced = CQoFile::MoveOver(temp.c_str(), path);
     if (!replaced)
         CQoFile::Remove(temp.c_str());
     return replaced;

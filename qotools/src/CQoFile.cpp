@@ -4,6 +4,8 @@
 
 #include <cerrno>
 #include <cstring>
+#include <string>
+#include <vector>
 #include <sys/stat.h>
 
 #ifdef _WIN32
@@ -377,7 +379,10 @@ std::size_t CQoFile::Read(void *buffer, std::size_t count, bool throwOnError)
         if (m_pos == m_end) {
             if (!text && count - got >= (m_fillSize < m_bufferSize ? m_fillSize : m_bufferSize)) {
                 // Binary reads at least as large as the next refill go
-                // straight into the caller's memory.
+                // straight into the caller's memory. The buffer no longer
+                // ends at the file position then: empty it, so that a Seek
+                // does not take its bytes for the ones just read.
+                m_pos = m_end = 0;
                 bool failed = false;
                 std::size_t n = RawRead(out + got, count - got, failed);
                 if (failed) {
@@ -659,4 +664,110 @@ bool CQoFile::Exists(char const *path)
 bool CQoFile::Remove(char const *path)
 {
     return path && *path && std::remove(path) == 0;
+}
+
+bool CQoFile::MoveOver(char const *source, char const *target)
+{
+    if (!source || !*source || !target || !*target)
+        return false;
+#ifdef _WIN32
+    return MoveFileExA(source, target, MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != 0;
+#else
+    return std::rename(source, target) == 0;
+#endif
+}
+
+namespace {
+// Upper case of a Windows-1252 letter (the accented ones too, as the file
+// system folds them).
+unsigned char UpperCase(unsigned char c)
+{
+    if ((c >= 'a' && c <= 'z') || (c >= 0xE0 && c <= 0xFE && c != 0xF7))
+        return static_cast<unsigned char>(c - 0x20);
+    return c;
+}
+
+// The full path of a name, "." and ".." resolved, as one string to compare.
+std::string FullPath(char const *path)
+{
+#ifdef _WIN32
+    char full[4096];
+    DWORD n = GetFullPathNameA(path, sizeof full, full, nullptr);
+    std::string text = n > 0 && n < sizeof full ? std::string(full, n) : std::string(path);
+    for (char &c : text)
+        if (c == '/')
+            c = '\\';
+    return text;
+#else
+    std::string text = path;
+    if (text[0] != '/') {
+        char cwd[4096];
+        if (getcwd(cwd, sizeof cwd))
+            text = std::string(cwd) + "/" + text;
+    }
+    // Drop "." and empty parts, let ".." take away the part before it.
+    std::vector<std::string> parts;
+    std::size_t start = 0;
+    while (start <= text.size()) {
+        std::size_t slash = text.find('/', start);
+        if (slash == std::string::npos)
+            slash = text.size();
+        std::string part = text.substr(start, slash - start);
+        if (part == "..") {
+            if (!parts.empty())
+                parts.pop_back();
+        } else if (!part.empty() && part != ".") {
+            parts.push_back(part);
+        }
+        start = slash + 1;
+    }
+    std::string out;
+    for (std::string const &part : parts)
+        out += "/" + part;
+    return out.empty() ? "/" : out;
+#endif
+}
+} // namespace
+
+std::string CQoFile::NewTempFileBeside(char const *target)
+{
+    if (!target || !*target)
+        return std::string();
+    std::string folder = target;
+    std::size_t cut = folder.find_last_of("/\\");
+    folder = cut == std::string::npos ? std::string(".") : folder.substr(0, cut + 1);
+    if (folder.empty())
+        folder = "/";
+#ifdef _WIN32
+    char name[MAX_PATH];
+    if (GetTempFileNameA(folder.c_str(), "qo", 0, name) == 0)
+        return std::string();
+    return name;
+#else
+    if (folder.back() != '/')
+        folder += '/';
+    std::string name = folder + "qoXXXXXX";
+    int fd = mkstemp(&name[0]);
+    if (fd < 0)
+        return std::string();
+    close(fd);
+    return name;
+#endif
+}
+
+bool CQoFile::SameFile(char const *a, char const *b)
+{
+    if (!a || !*a || !b || !*b)
+        return false;
+    std::string fa = FullPath(a);
+    std::string fb = FullPath(b);
+    if (fa.size() != fb.size())
+        return false;
+    for (std::size_t i = 0; i < fa.size(); ++i) {
+        unsigned char ca = static_cast<unsigned char>(fa[i]);
+        unsigned char cb = static_cast<unsigned char>(fb[i]);
+        if (UpperCase(ca) != UpperCase(cb))
+            return false;
+    }
+    return true;
 }

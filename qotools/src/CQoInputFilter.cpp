@@ -258,24 +258,10 @@ void CQoInputFilter::replaceFile(char const *newFile)
     if (!newFile || !*newFile || m_strFileName.IsEmpty())
         CQoException::Throw(CQoException::replaceError, m_strFileName);
     CloseFile();
-    if (std::rename(newFile, m_strFileName) != 0) {
-#if defined(_WIN32)
-        // rename does not replace an existing file on Windows: move the old
-        // one aside first, so that it is back in place if the move fails.
-        CQoString aside = m_strFileName + ".old";
-        std::remove(aside);
-        bool moved = std::rename(m_strFileName, aside) == 0;
-        if (!moved || std::rename(newFile, m_strFileName) != 0) {
-            if (moved)
-                std::rename(aside, m_strFileName);
-            ReopenFile();
-            CQoException::Throw(CQoException::replaceError, m_strFileName);
-        }
-        std::remove(aside);
-#else
+    // One step: the old file stays in place unless the new one takes it.
+    if (!CQoFile::MoveOver(newFile, m_strFileName)) {
         ReopenFile();
         CQoException::Throw(CQoException::replaceError, m_strFileName);
-#endif
     }
     m_bNumRowsKnown = false;
     m_lNumRows = 0;

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <limits>
 #include <memory>
 
 namespace {
@@ -67,6 +68,28 @@ void CQoInputFilterDbase34::SkipDeleted(bool skip)
 // ---------------------------------------------------------------------------
 // opening
 
+namespace {
+std::uint32_t RecordsHeld(std::int64_t fileLength, qodbase::Header const &header, char const *name)
+{
+    // The declared count is checked against the file's size: a damaged or
+    // cut file must not claim billions of rows (nor a negative count where a
+    // row number has 32 bits).
+    std::int64_t body = fileLength - header.headerLength;
+    // Whole records, and a cut one unless it is the lone end mark.
+    std::int64_t held = 0;
+    if (body > 0)
+        held = body / header.recordLength + (body % header.recordLength > 1 ? 1 : 0);
+    std::int64_t rows = std::min<std::int64_t>(header.recordCount, held + 1);
+    if (rows > std::numeric_limits<long>::max()) {
+        char text[200];
+        std::snprintf(text, sizeof text, "Die dBase-Datei hat mehr S\344tze (%lld), als gelesen werden k\366nnen",
+                      static_cast<long long>(rows));
+        CQoException::Throw(text, name);
+    }
+    return static_cast<std::uint32_t>(rows);
+}
+} // namespace
+
 void CQoInputFilterDbase34::Init(CQoString const &name)
 {
     CloseFile();
@@ -96,7 +119,8 @@ void CQoInputFilterDbase34::Init(CQoString const &name)
         qodbase::ParseHeader(bytes.get(), got, name, header);
 
         m_header.version = header.version;
-        m_header.recordCount = header.recordCount;
+        m_header.declaredCount = header.recordCount;
+        m_header.recordCount = RecordsHeld(m_file.Length(), header, name);
         m_header.headerLength = header.headerLength;
         m_header.recordLength = header.recordLength;
         m_header.languageDriver = header.languageDriver;
@@ -165,7 +189,7 @@ bool CQoInputFilterDbase34::ReadRecord(std::uint32_t record)
         char text[200];
         std::snprintf(text, sizeof text,
                       "Die dBase-Datei endet vorzeitig: Satz %lu von %lu fehlt oder ist unvollst\344ndig",
-                      static_cast<unsigned long>(record) + 1, static_cast<unsigned long>(m_header.recordCount));
+                      static_cast<unsigned long>(record) + 1, static_cast<unsigned long>(m_header.declaredCount));
         m_physical = -1;
         m_lCurrentRow = -1;
         CQoException::Throw(text, m_strFileName);
@@ -354,7 +378,7 @@ bool CQoInputFilterDbase34::StartDescription(CQoString &line)
         text.Format("dBase %s-Datei %s", m_fileType == filterDbase4 ? "IV" : "III", m_strFileName.GetString());
         m_describe.push_back(text);
         text.Format("%d Felder, %lu S\344tze, Satzl\344nge %d", NumFields(),
-                    static_cast<unsigned long>(m_header.recordCount), m_header.recordLength);
+                    static_cast<unsigned long>(m_header.declaredCount), m_header.recordLength);
         m_describe.push_back(text);
         text.Format("Zeichensatz: %s", CharSetName(m_nRecordCharSet));
         m_describe.push_back(text);

@@ -4,6 +4,7 @@
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 #include "CQoInterActive.h"
+#include "QoLimits.h"
 #include "QoTextReader.h"
 
 #include <algorithm>
@@ -12,7 +13,7 @@
 namespace {
 // A record larger than this is taken as defective (a runaway encloser), so
 // that a damaged file cannot make the filter hold the rest of it in memory.
-constexpr std::size_t kMaxRecord = 16u << 20;
+constexpr std::size_t kMaxRecord = qolimits::maxRecordLength;
 // How much of the data after a defective record the repair hook gets.
 constexpr std::size_t kRepairData = 64u << 10;
 // Rows whose field counts set the column count of a file without names.
@@ -100,10 +101,15 @@ int CQoInputFilterText::ParseHere(std::size_t &used)
     std::size_t want = 4096;
     for (;;) {
         std::size_t avail = m_reader->Ensure(want);
+        // The parser sees no more than the longest record and its line end,
+        // so the limit holds exactly, however much the reader has read.
+        bool const capped = avail > kMaxRecord + 2;
+        if (capped)
+            avail = kMaxRecord + 2;
         char const *begin = m_reader->Data();
         m_recordBase = begin;
         ClearFields();
-        int result = ParseRecord(begin, begin + avail, m_reader->AtEof(), used);
+        int result = ParseRecord(begin, begin + avail, m_reader->AtEof() && !capped, used);
         if (result != parseMore)
             return result;
         if (avail >= kMaxRecord)
@@ -186,10 +192,26 @@ bool CQoInputFilterText::ReadRecordAt(long long offset, bool checkLayout)
             }
             HandleDefect(offset, why, result);
         } else {
-            HandleDefect(offset, "Begrenzer nicht geschlossen", result);
+            HandleDefect(offset, DefectOfUnterminated(), result);
         }
         // The decision is stored now; read again with it.
     }
+}
+
+CQoString CQoInputFilterText::DefectOfUnterminated()
+{
+    // The parser ran out of file or of the size limit inside a record. When
+    // the record has no line break in it, no encloser kept a line end
+    // from ending it: it is simply too long.
+    std::size_t avail = std::min(m_reader->Avail(), kMaxRecord);
+    char const *data = m_reader->Data();
+    bool lineBreak = std::memchr(data, '\n', avail) || std::memchr(data, '\r', avail);
+    if (avail >= kMaxRecord && !lineBreak) {
+        CQoString why;
+        why.Format("Satz l\xE4nger als %u Zeichen", static_cast<unsigned>(kMaxRecord));
+        return why;
+    }
+    return "Begrenzer nicht geschlossen";
 }
 
 bool CQoInputFilterText::HandleDefect(long long offset, CQoString const &why, int)
@@ -214,8 +236,12 @@ bool CQoInputFilterText::HandleDefect(long long offset, CQoString const &why, in
     }
     int const presumed = pos;
     int answer = ReportWrongInput(data, pos);
+    // Rows are counted from 1 in messages, as the user counts them.
     CQoString row;
-    row.Format("Satz %ld: ", static_cast<long>(m_index.size()));
+    if (m_lReadingRow >= 0)
+        row.Format("Satz %ld: ", m_lReadingRow + 1);
+    else
+        row = "Kopfzeile: ";
     m_strLastWrongInput = row + why + " (" + m_strFileName + ")";
     if (pos <= 0 || pos > static_cast<int>(avail))
         pos = presumed;
@@ -261,8 +287,9 @@ void CQoInputFilterText::Init(CQoString const &name)
     CQoInputFilter::Init(name);
     ResetRows();
     m_reader->Close();
-    m_reader->Open(m_strFileName, m_nCharSet);
-    long long offset = SkipLines(0, m_nSkip);
+    m_reader->Open(m_strFileName, m_nCharSet, true);
+    m_lReadingRow = -1;
+    long long offset = SkipLines(m_reader->BomLength(), m_nSkip);
     if (m_bFirstRowHasNames) {
         if (ReadRecordAt(offset, false)) {
             std::vector<CQoString> names(m_nFields);
@@ -293,7 +320,10 @@ void CQoInputFilterText::DetermineColumns()
     }
     int most = 0;
     long long offset = m_dataStart;
-    for (int row = 0; row < kSampleRows && ReadRecordAt(offset, false); ++row) {
+    for (int row = 0; row < kSampleRows; ++row) {
+        m_lReadingRow = row;
+        if (!ReadRecordAt(offset, false))
+            break;
         most = std::max(most, NumFields());
         offset = m_nextOffset;
     }
@@ -305,7 +335,8 @@ void CQoInputFilterText::LoadColumnNames()
     if (!m_reader->IsOpen() || !m_bFirstRowHasNames)
         return;
     long current = m_lCurrentRow;
-    long long offset = SkipLines(0, m_nSkip);
+    m_lReadingRow = -1;
+    long long offset = SkipLines(m_reader->BomLength(), m_nSkip);
     if (ReadRecordAt(offset, false)) {
         m_colNames.assign(m_nNumCols, CQoString());
         for (int i = 0; i < NumFields() && i < m_nNumCols; ++i) {
@@ -338,6 +369,7 @@ bool CQoInputFilterText::ReopenFile()
 
 bool CQoInputFilterText::ReadRow(long row, long long offset)
 {
+    m_lReadingRow = row;
     if (!ReadRecordAt(offset, true)) {
         // A row of the index must still be there: the file was cut short.
         if (static_cast<std::size_t>(row) < m_index.size())

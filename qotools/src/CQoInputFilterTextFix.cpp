@@ -3,6 +3,7 @@
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 #include "CQoInterActive.h"
+#include "QoLimits.h"
 #include "QoTextReader.h"
 
 #include <cstring>
@@ -40,6 +41,7 @@ void CQoInputFilterTextFix::RecordLen(int length)
 {
     if (length < 1)
         length = 1;
+    qolimits::Checked("recordlen", length, 1, qolimits::maxRecordLength);
     if (length != m_nRecordLen) {
         m_nRecordLen = length;
         m_bModified = true;
@@ -67,7 +69,7 @@ void CQoInputFilterTextFix::ColLen(int col, int length)
 
 long long CQoInputFilterTextFix::RowOffset(long row) const
 {
-    return (static_cast<long long>(row) + (m_bFirstRowHasNames ? 1 : 0)) * m_nRecordLen;
+    return m_dataStart + (static_cast<long long>(row) + (m_bFirstRowHasNames ? 1 : 0)) * m_nRecordLen;
 }
 
 // What may follow the last record without being data.
@@ -90,6 +92,7 @@ void CQoInputFilterTextFix::Init(CQoString const &name)
     m_lNumRows = 0;
     m_record.Empty();
     m_reader->Open(m_strFileName, m_nCharSet);
+    m_dataStart = m_reader->BomLength();
     m_fileLength = m_reader->Length();
     m_colNames.assign(static_cast<std::size_t>(m_widths.Count()), CQoString());
     LoadColumnNames();
@@ -99,7 +102,7 @@ void CQoInputFilterTextFix::LoadColumnNames()
 {
     if (!m_reader->IsOpen() || !m_bFirstRowHasNames)
         return;
-    m_reader->SeekTo(0);
+    m_reader->SeekTo(m_dataStart);
     std::size_t have = m_reader->Ensure(static_cast<std::size_t>(m_nRecordLen));
     if (have > static_cast<std::size_t>(m_nRecordLen))
         have = static_cast<std::size_t>(m_nRecordLen);
@@ -149,7 +152,7 @@ bool CQoInputFilterTextFix::HandleShortRecord(long row, long long offset, std::s
     CQoString data(m_reader->Data(), static_cast<int>(have));
     int pos = static_cast<int>(have);
     int answer = ReportWrongInput(data, pos);
-    m_strLastWrongInput.Format("Satz %ld: %d statt %d Zeichen (%s)", row, static_cast<int>(have),
+    m_strLastWrongInput.Format("Satz %ld: %d statt %d Zeichen (%s)", row + 1, static_cast<int>(have),
                                m_nRecordLen, m_strFileName.GetString());
     switch (answer) {
     case CQoInterActive::repairTakeOver: {
@@ -282,7 +285,7 @@ void CQoInputFilterTextFix::ReadConfig(CQoConfigFile &cfg, CQoString const &sect
 {
     CQoInputFilter::ReadConfig(cfg, section);
     int length = m_nRecordLen;
-    if (cfg.GetValue(section, "recordlen", length))
+    if (cfg.GetValue(section, "recordlen", length, 1, qolimits::maxRecordLength))
         RecordLen(length);
     if (m_widths.ReadConfig(cfg, section))
         m_bModified = true;

@@ -4,6 +4,7 @@
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 #include "CQoFile.h"
+#include "QoLimits.h"
 
 CQoOutputFilter::CQoOutputFilter()
     : m_nFileCharSet(CQoFile::ansi)
@@ -67,6 +68,7 @@ void CQoOutputFilter::NumCols(int cols)
 {
     if (cols < 0)
         cols = 0;
+    qolimits::Checked("columns", cols, 0, qolimits::maxColumns);
     m_columnNames.resize(cols);
     m_values.resize(cols);
 }
@@ -132,7 +134,7 @@ void CQoOutputFilter::ReadConfig(CQoConfigFile &cfg, CQoString const &section)
     if (cfg.GetValue(section, "charset", charSet))
         FileCharSet(charSet);
     int cols = NumCols();
-    if (cfg.GetValue(section, "columns", cols) && cols >= 0)
+    if (cfg.GetValue(section, "columns", cols, 0, qolimits::maxColumns))
         NumCols(cols);
     CQoString key;
     for (int c = 0; c < NumCols(); ++c) {

@@ -66,9 +66,11 @@ bool ValidDate(int y, int m, int d)
     return d <= limit;
 }
 
+// The digits text[from .. from+count) as a number; a date part has at most
+// four, more than nine would not fit.
 bool ParseInt(std::string const &text, std::size_t from, std::size_t count, int &value)
 {
-    if (from + count > text.size() || count == 0)
+    if (from + count > text.size() || count == 0 || count > 9)
         return false;
     value = 0;
     for (std::size_t i = from; i < from + count; ++i) {
@@ -167,6 +169,11 @@ bool CQoOutputFilterDbase::Init()
     // The descriptions as they go into the file.
     if (NumCols() == 0)
         CQoException::Throw("Die dBase-Datei braucht mindestens ein Feld", m_pFile->FileName());
+    if (NumCols() > qodbase::maxFields) {
+        CQoString text;
+        text.Format("Eine dBase-Datei hat h\366chstens %d Felder, nicht %d", int(qodbase::maxFields), NumCols());
+        CQoException::Throw(text, m_pFile->FileName());
+    }
     qodbase::Header header;
     std::set<std::string> used;
     for (int c = 0; c < NumCols(); ++c) {

@@ -3,7 +3,9 @@
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 #include "CQoFile.h"
+#include "QoLimits.h"
 
+#include <climits>
 #include <cstring>
 
 CQoOutputFilterTextFix::CQoOutputFilterTextFix() = default;
@@ -28,16 +30,49 @@ bool CQoOutputFilterTextFix::Init()
 
 void CQoOutputFilterTextFix::NumCols(int cols)
 {
+    std::size_t before = m_columnNames.size();
     CQoOutputFilter::NumCols(cols);
     m_lengths.resize(m_columnNames.size(), defaultLength);
+    if (RecordLength() > qolimits::maxRecordLength) {
+        // New columns of the default length would make the record too long.
+        CQoOutputFilter::NumCols(static_cast<int>(before));
+        m_lengths.resize(before);
+        CQoString text;
+        text.Format("%d Spalten w\xE4ren zusammen l\xE4nger als %d Zeichen", cols, qolimits::maxRecordLength);
+        throw CQoException(CQoException::invalidArgument, text, "columns");
+    }
 }
 
 int CQoOutputFilterTextFix::NumCols() const { return CQoOutputFilter::NumCols(); }
 
+namespace {
+CQoString LengthKey(int col)
+{
+    CQoString key;
+    key.Format("column%d_len", col);
+    return key;
+}
+}
+
 void CQoOutputFilterTextFix::SetLength(int col, int length)
 {
     CheckColumn(col);
+    if (length > qolimits::maxRecordLength)
+        qolimits::Checked(LengthKey(col), length, 0, qolimits::maxRecordLength);
+    long long total = static_cast<long long>(RecordLength()) - Width(col) + (length > 0 ? length : 0);
+    if (total > qolimits::maxRecordLength) {
+        CQoString text;
+        text.Format("Die Spalten w\xE4ren zusammen %lld Zeichen lang; h\xF6" "chstens %d sind m\xF6glich", total,
+                    qolimits::maxRecordLength);
+        throw CQoException(CQoException::invalidArgument, text, LengthKey(col));
+    }
     m_lengths[std::size_t(col)] = length;
+}
+
+int CQoOutputFilterTextFix::Width(int col) const
+{
+    int length = m_lengths[std::size_t(col)];
+    return length > 0 ? length : 0;
 }
 
 int CQoOutputFilterTextFix::GetLength(int col)
@@ -52,10 +87,11 @@ bool CQoOutputFilterTextFix::GetCrLf() const { return m_bCrLf; }
 
 int CQoOutputFilterTextFix::RecordLength() const
 {
-    int sum = 0;
+    // Bounded by SetLength and NumCols; summed in 64 bits all the same.
+    long long sum = 0;
     for (int length : m_lengths)
         sum += length > 0 ? length : 0;
-    return sum;
+    return static_cast<int>(sum);
 }
 
 void CQoOutputFilterTextFix::BuildRecord(std::string &record)
@@ -98,11 +134,8 @@ void CQoOutputFilterTextFix::WriteConfig(CQoConfigFile &cfg, CQoString const &se
 {
     CQoOutputFilter::WriteConfig(cfg, section);
     cfg.SetValue(section, "crlf", m_bCrLf ? 1 : 0);
-    CQoString key;
-    for (int c = 0; c < NumCols(); ++c) {
-        key.Format("column%d_len", c);
-        cfg.SetValue(section, key, m_lengths[std::size_t(c)]);
-    }
+    for (int c = 0; c < NumCols(); ++c)
+        cfg.SetValue(section, LengthKey(c), m_lengths[std::size_t(c)]);
 }
 
 void CQoOutputFilterTextFix::ReadConfig(CQoConfigFile &cfg, CQoString const &section)
@@ -111,9 +144,9 @@ void CQoOutputFilterTextFix::ReadConfig(CQoConfigFile &cfg, CQoString const &sec
     int crlf = m_bCrLf ? 1 : 0;
     cfg.GetValue(section, "crlf", crlf);
     m_bCrLf = crlf != 0;
-    CQoString key;
     for (int c = 0; c < NumCols(); ++c) {
-        key.Format("column%d_len", c);
-        cfg.GetValue(section, key, m_lengths[std::size_t(c)]);
+        int length = m_lengths[std::size_t(c)];
+        if (cfg.GetValue(section, LengthKey(c), length, INT_MIN, INT_MAX))
+            SetLength(c, length);
     }
 }

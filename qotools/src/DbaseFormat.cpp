@@ -80,6 +80,9 @@ void ParseHeader(unsigned char const *data, std::size_t size, char const *fileNa
         offset += length;
         pos += descriptorSize;
     }
+    if (pos >= header.headerLength)
+        Bad(fileName, "Die Feldbeschreibungen enden nicht mit der Endemarke 0x0D (Dateikopf %d Bytes)",
+            header.headerLength);
     if (header.fields.empty())
         Bad(fileName, "Die dBase-Datei beschreibt keine Felder");
     if (offset > header.recordLength)

@@ -27,7 +27,8 @@ enum {
     fieldTerminator = 0x0D,
     endOfFile = 0x1A,
     deletedFlag = '*',
-    liveFlag = ' '
+    liveFlag = ' ',
+    maxFields = 255        // dBase IV's limit; the header length has 16 bits
 };
 
 struct Header {

@@ -18,10 +18,18 @@ QoTextReader::QoTextReader()
 
 QoTextReader::~QoTextReader() = default;
 
-void QoTextReader::Open(char const *path, int charSet)
+void QoTextReader::Open(char const *path, int charSet, bool dropEndMark)
 {
     Close();
     m_file.OpenOrThrow(path, CQoFile::read | CQoFile::binary | charSet);
+    // The mark is looked for in the bytes as stored, before any conversion.
+    m_file.FileCharSet(CQoFile::ansi);
+    unsigned char head[3] = {0, 0, 0};
+    std::size_t got = m_file.Read(head, sizeof head);
+    m_bomLength = got == 3 && head[0] == 0xEF && head[1] == 0xBB && head[2] == 0xBF ? 3 : 0;
+    m_file.Seek(0, CQoFile::begin);
+    m_file.FileCharSet(charSet);
+    m_dropEndMark = dropEndMark;
     m_windowStart = 0;
     m_pos = m_end = 0;
     m_eof = false;
@@ -63,8 +71,19 @@ std::size_t QoTextReader::Refill(std::size_t count)
     while (m_end - m_pos < count && !m_eof) {
         std::size_t keep = m_end - m_pos;
         std::size_t want = m_block;
-        if (want < count - keep)
+        bool capped = false;
+        if (want < count - keep) {
             want = count - keep;
+            // A large request (a long record length, a runaway record) gets
+            // no more memory than the rest of the file needs.
+            if (!m_file.IsOpen())
+                CQoException::Throw(CQoException::notOpen, nullptr);
+            std::int64_t left = m_file.Length() - (m_windowStart + static_cast<std::int64_t>(m_end));
+            if (left < static_cast<std::int64_t>(want)) {
+                want = left > 0 ? static_cast<std::size_t>(left) : 0;
+                capped = true;
+            }
+        }
         if (keep + want > m_capacity) {
             std::size_t capacity = m_capacity ? m_capacity : kFirstBlock;
             while (capacity < keep + want)
@@ -82,10 +101,13 @@ std::size_t QoTextReader::Refill(std::size_t count)
         m_end = keep;
         if (!m_file.IsOpen())
             CQoException::Throw(CQoException::notOpen, nullptr);
-        std::size_t got = m_file.Read(m_window.get() + m_end, want);
+        std::size_t got = want ? m_file.Read(m_window.get() + m_end, want) : 0;
         m_end += got;
-        if (got < want)
+        if (got < want || capped) {
             m_eof = true;
+            if (m_dropEndMark && m_end > m_pos && m_window[m_end - 1] == 0x1A)
+                --m_end;
+        }
         if (m_block < kMaxBlock)
             m_block *= 2;
     }

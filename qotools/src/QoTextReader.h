@@ -23,11 +23,16 @@ public:
     QoTextReader &operator=(QoTextReader const &) = delete;
 
     // Opens `path` for reading with the character set; raises CQoException
-    // (fileNotFound / cannotOpen) when it cannot be opened.
-    void Open(char const *path, int charSet);
+    // (fileNotFound / cannotOpen) when it cannot be opened. With
+    // `dropEndMark`, a DOS end-of-file mark (0x1A) as the file's last byte is
+    // not data: line-oriented filters would make a row of it.
+    void Open(char const *path, int charSet, bool dropEndMark = false);
     void Close();
     bool IsOpen() const { return m_file.IsOpen(); }
     std::int64_t Length();
+    // 3 when the file starts with a UTF-8 byte-order mark, else 0: the data
+    // starts there.
+    int BomLength() const { return m_bomLength; }
 
     // Positions on a byte offset of the file.
     void SeekTo(std::int64_t offset);
@@ -35,7 +40,8 @@ public:
     std::int64_t Tell() const { return m_windowStart + static_cast<std::int64_t>(m_pos); }
 
     // Makes at least `count` bytes after the position available, or all that
-    // is left of the file; answers the number available. Pointers got from
+    // is left of the file; answers the number available. Memory grows only
+    // as far as the file reaches, whatever `count` asks. Pointers got from
     // Data() before are invalid afterwards.
     std::size_t Ensure(std::size_t count)
     {
@@ -61,4 +67,6 @@ private:
     std::int64_t m_windowStart = 0;     // file offset of m_window[0]
     std::size_t m_block;                // size of the next read
     bool m_eof = false;
+    bool m_dropEndMark = false;
+    int m_bomLength = 0;
 };

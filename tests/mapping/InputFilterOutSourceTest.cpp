@@ -114,6 +114,15 @@ TEST(InputFilterOutSource, SmallSources)
     EXPECT_EQ("", Field(f, 0));
     EXPECT_EQ(0, none.valueCalls);
     EXPECT_TRUE(Walk(f).empty());
+
+    // Rows that arrive after a failed FirstRow are read from the first one.
+    none.AddRow({"erste"});
+    none.AddRow({"zweite"});
+    ASSERT_TRUE(f.NextRow());
+    EXPECT_EQ("erste", Field(f, 0));
+    ASSERT_TRUE(f.NextRow());
+    EXPECT_EQ("zweite", Field(f, 0));
+    EXPECT_FALSE(f.NextRow());
 }
 
 TEST(InputFilterOutSource, CopiesShareTheSourceAndNobodyDeletesIt)

@@ -52,6 +52,7 @@ public:
         for (std::vector<std::string>& row : m_rows)
             row.push_back(value);
     }
+    void AddRow(std::vector<std::string> row) { m_rows.push_back(std::move(row)); }
     void WatchDestruction(bool* flag) { m_pDestroyed = flag; }
 
     // The names of the entry list, in order; "-" marks an unselected entry.

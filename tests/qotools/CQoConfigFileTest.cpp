@@ -290,20 +290,16 @@ TEST(CQoConfigFileFiles, FailedWriteLeavesTheOldFileIntact)
     WriteBytes(path, "[Alt]\nk=v\n");
     CQoConfigFile cfg;
     cfg.SetValue("Neu", "k", "v");
+    // A user's file that happens to have a name the writer might pick.
+    WriteBytes(path + ".~tmp", "fremd");
 
-    // The temporary file cannot be created: a folder is in its place.
-    std::filesystem::create_directory(path + ".~tmp");
-    EXPECT_FALSE(cfg.Write(path.c_str()));
-    EXPECT_EQ("[Alt]\nk=v\n", ReadBytes(path));
-    std::filesystem::remove(path + ".~tmp");
-
-    // The target cannot be replaced: it is a folder.
+    // The target cannot be replaced: it is a folder. Nothing is left behind.
     std::string folder = tmp.Path("ordner.cfg");
     std::filesystem::create_directory(folder);
     std::filesystem::create_directory(folder + "/inhalt");
     EXPECT_FALSE(cfg.Write(folder.c_str()));
     EXPECT_TRUE(std::filesystem::is_directory(folder + "/inhalt"));
-    EXPECT_FALSE(CQoFile::Exists((folder + ".~tmp").c_str()));
+    EXPECT_EQ(3, std::distance(std::filesystem::directory_iterator(tmp.Folder()), {}));
 
     // A folder that does not exist.
     EXPECT_FALSE(cfg.Write(tmp.Path("fehlt/projekt.cfg").c_str()));
@@ -311,4 +307,5 @@ TEST(CQoConfigFileFiles, FailedWriteLeavesTheOldFileIntact)
     // And a good write replaces the old file completely.
     EXPECT_TRUE(cfg.Write(path.c_str()));
     EXPECT_EQ("[Neu]\r\nk=v\r\n", ReadBytes(path));
+    EXPECT_EQ("fremd", ReadBytes(path + ".~tmp"));
 }

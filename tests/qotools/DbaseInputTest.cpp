@@ -366,6 +366,8 @@ TEST(DbaseInputDamaged, HeadersThatAreNotDbaseRaiseClearErrors)
     noFields[32] = 0x0D;
     std::string zeroRecordLength = good;
     zeroRecordLength[10] = 0;
+    std::string noEndMark = good;
+    noEndMark[8] = char(32 + 64); // the header ends with the descriptors, without 0x0D
 
     std::vector<Case> cases = {
         {"zero bytes", "", "zu kurz"},
@@ -380,6 +382,7 @@ TEST(DbaseInputDamaged, HeadersThatAreNotDbaseRaiseClearErrors)
         {"fields longer than record", smallRecord, "passen nicht"},
         {"no fields", noFields, "keine Felder"},
         {"record length 0", zeroRecordLength, "Satzl\xE4nge"},
+        {"descriptions without end mark", noEndMark, "Endemarke 0x0D"},
     };
     for (Case const &c : cases) {
         SCOPED_TRACE(c.what);
@@ -433,6 +436,23 @@ TEST(DbaseInputDamaged, RecordsMissingAtTheEndRaiseWhenReached)
     EXPECT_TRUE(counting.AbsoluteRow(2));
     EXPECT_EQ("c", Row(counting)[0]);
     EXPECT_THROW(counting.AbsoluteRow(3), CQoException);
+
+    // A count far beyond the file (2^31 and more: negative as a 32-bit row
+    // number) is held to the records there and the first missing one.
+    for (unsigned long declared : {0x80000000ul, 0xFFFFFFFFul}) {
+        SCOPED_TRACE(declared);
+        std::string huge = MakeDbf(kTwoFields, {Rec("a", "1"), Rec("b", "2")});
+        for (int i = 0; i < 4; ++i)
+            huge[4 + i] = char((declared >> (8 * i)) & 0xFF);
+        WriteBytes(path, huge);
+        CQoInputFilterDbase34 big;
+        big.SkipDeleted(false);
+        big.Init(path.c_str());
+        EXPECT_EQ(3, big.NumRows());
+        EXPECT_EQ(static_cast<long long>(declared), big.DeclaredRecords());
+        EXPECT_TRUE(big.AbsoluteRow(1));
+        EXPECT_THROW(big.AbsoluteRow(2), CQoException);
+    }
 }
 
 TEST(DbaseInputDamaged, FileCutWhileReading)

@@ -49,3 +49,45 @@ file(READ ${project}/qoconvert.log log)
 if(NOT rc EQUAL 1 OR NOT log MATCHES "E:2101 Im Projekt '[^']*qoconvert.ini' sind Eingabe- und Ausgabedatei nicht eingetragen., Autoreturn: ok")
   message(FATAL_ERROR "incomplete project: exit ${rc}, log:\n${log}")
 endif()
+
+# Projects that must be refused with exit code 1, a reason in the log, and
+# the input untouched. The output named as the input under other spellings
+# would otherwise be truncated before it is read.
+file(COPY_FILE ${project}/kunden.txt ${project}/kunden.orig)
+set(cases
+    "same file|Datei=kunden.txt\nZeichensatz=1|ist die Eingabedatei"
+    "other case|Datei=KUNDEN.TXT\nZeichensatz=1|ist die Eingabedatei"
+    "dot-dot path|Datei=./sub/../kunden.txt\nZeichensatz=1|ist die Eingabedatei"
+    "unknown charset|Datei=kunden-neu.txt\nZeichensatz=7|Unbekannter Zeichensatz '7'"
+    "charset not a number|Datei=kunden-neu.txt\nZeichensatz=dos|Unbekannter Zeichensatz 'dos'")
+foreach(case IN LISTS cases)
+  string(REPLACE "|" ";" parts "${case}")
+  list(GET parts 0 what)
+  list(GET parts 1 output)
+  list(GET parts 2 expect)
+  string(REPLACE "\\n" "\n" output "${output}")
+  file(WRITE ${project}/qoconvert.ini "[Eingabe]\nDatei=kunden.txt\nZeichensatz=0\n[Ausgabe]\n${output}\n")
+  file(REMOVE ${project}/qoconvert.log)
+  execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                  RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+  file(READ ${project}/qoconvert.log log)
+  execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/kunden.txt ${project}/kunden.orig
+                  RESULT_VARIABLE changed)
+  if(NOT rc EQUAL 1 OR NOT changed EQUAL 0 OR NOT log MATCHES "E:2[0-9]+ [^\n]*${expect}"
+     OR NOT err MATCHES "${expect}" OR EXISTS ${project}/kunden-neu.txt)
+    message(FATAL_ERROR "${what}: exit ${rc}, input changed: ${changed}\nlog:\n${log}\nconsole:\n${err}")
+  endif()
+endforeach()
+
+# No temporary file of the output is left behind, by the good run or the refused ones.
+file(GLOB leftovers ${project}/qo*.tmp ${project}/*.~tmp)
+if(leftovers)
+  message(FATAL_ERROR "temporary files left: ${leftovers}")
+endif()
+
+# A project folder that does not exist: exit code 1 and the reason on the console.
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}/fehlt
+                RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+if(NOT rc EQUAL 1 OR NOT err MATCHES "Der Projektordner '[^']*fehlt' existiert nicht")
+  message(FATAL_ERROR "missing project folder: exit ${rc}, console:\n${err}")
+endif()
