@@ -7,6 +7,7 @@
 #include "CQoException.h"
 #include "CQoInputFilterDbase34.h"
 #include "CQoOutputFilterDbase.h"
+#include "FuzzSupport.h"
 
 #include <cstdint>
 #include <cstdio>
@@ -17,21 +18,12 @@
 
 namespace {
 
+using fuzz::Row;
+
 std::string const &FilePath()
 {
-    static std::string const path = "/tmp/fuzz_dbase_" + std::to_string(getpid()) + ".dbf";
+    static std::string const path = fuzz::TempPath("fuzz_dbase") + ".dbf";
     return path;
-}
-
-std::vector<std::string> Row(CQoInputFilterDbase34 &dbf)
-{
-    std::vector<std::string> row;
-    CQoString value;
-    for (int c = 0; c < dbf.NumCols(); ++c) {
-        dbf.Value(c, value);
-        row.push_back(value.Str());
-    }
-    return row;
 }
 
 void ReadAll(bool skipDeleted)
