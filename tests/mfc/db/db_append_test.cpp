@@ -1,0 +1,158 @@
+// Appending: bulk rows read back whole, failures that say exactly which rows
+// are stored, and an SQLite file that other programs read as UTF-8.
+#include "DbTestSupport.h"
+
+#include "PythonPeer.h"
+
+class DbAppendTest : public DbTest {
+protected:
+  // Appends nRows rows (k = row number, v = a text) and returns the failure
+  // message, "" when every row went in. pfnBad may replace a row's key.
+  template <typename F>
+  CString Append(const CString& strTable, long nRows, DWORD dwOptions, F&& badKey, long* plFirstRowNotStored,
+                 long* plRowsStored = nullptr) {
+    CTextSet rs(&m_db);
+    rs.Open(CRecordset::snapshot, "select * from " + strTable, CRecordset::appendOnly | dwOptions);
+    CString strError;
+    for (long i = 0; i < nRows; ++i) {
+      CString strError1 = DbError(
+          [&] {
+            rs.AddNew();
+            rs.m_values[0].Format("%ld", i);
+            rs.m_values[1].Format("Zeile %ld \xE4", i);
+            badKey(i, rs.m_values[0]);
+            rs.Update();
+          },
+          plFirstRowNotStored);
+      if (!strError1.IsEmpty() && strError.IsEmpty()) strError = strError1;
+      if (!strError1.IsEmpty() && (dwOptions & CRecordset::optimizeBulkAdd)) break;
+    }
+    if (strError.IsEmpty()) strError = DbError([&] { rs.Close(); }, plFirstRowNotStored);
+    if (plRowsStored != nullptr) *plRowsStored = rs.GetRowsStored();
+    return strError;
+  }
+};
+
+TEST_P(DbAppendTest, BulkRowsAreStoredAndReadBack) {
+  MakeTable("mfcdb_bulk", "k varchar(10), v varchar(40)");
+  long lFirst = -2, lStored = 0;
+  EXPECT_EQ("", Append("mfcdb_bulk", 25000, CRecordset::optimizeBulkAdd, [](long, CString&) {}, &lFirst, &lStored));
+  EXPECT_EQ(25000, lStored);
+  EXPECT_EQ(25000, Count("mfcdb_bulk"));
+
+  CTextSet rs(&m_db);
+  rs.Open(CRecordset::snapshot, "select k, v from mfcdb_bulk", CRecordset::readOnly);
+  long nRows = 0;
+  long nSumOfKeys = 0;
+  for (; !rs.IsEOF(); rs.MoveNext(), ++nRows) {
+    nSumOfKeys += atol(rs.m_values[0]);
+    CString strExpected;
+    strExpected.Format("Zeile %s \xE4", (LPCSTR)rs.m_values[0]);
+    if (rs.m_values[1] != strExpected) ADD_FAILURE() << (LPCSTR)rs.m_values[1];
+  }
+  EXPECT_EQ(25000, nRows);
+  EXPECT_EQ(25000L * 24999L / 2, nSumOfKeys);
+  EXPECT_EQ(25000, rs.GetRecordCount());
+}
+
+// What the failure says is stored is what a fresh count finds.
+TEST_P(DbAppendTest, FailedRowsAreNamedAndNothingElseIsLost) {
+  struct Case {
+    const char* name;
+    const char* columns;
+    long rows;
+    long badRow;
+    const char* badKey;
+    DWORD options;
+    long firstNotStored;
+    long inTable;
+    bool postgresOnly;
+  } cases[] = {
+      // The duplicate lies after the first commit: the batches since are lost.
+      {"unique", "k varchar(10) primary key, v varchar(40)", 60000, 55555, "7", CRecordset::optimizeBulkAdd, 50000,
+       50000, false},
+      {"too long", "k varchar(3), v varchar(40)", 10, 2, "abcd", CRecordset::optimizeBulkAdd, 0, 0, true},
+      // One row at a time: only the failing row is missing.
+      {"single rows", "k varchar(10) primary key, v varchar(40)", 6, 3, "1", 0, 3, 5, false},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    if (c.postgresOnly && !IsPostgres()) continue;
+    MakeTable("mfcdb_fail", c.columns);
+    long lFirst = -2;
+    CString strError = Append("mfcdb_fail", c.rows, c.options,
+                              [&](long i, CString& strKey) {
+                                if (i == c.badRow) strKey = c.badKey;
+                              },
+                              &lFirst);
+    EXPECT_FALSE(strError.IsEmpty());
+    EXPECT_EQ(c.firstNotStored, lFirst) << (LPCSTR)strError;
+    EXPECT_EQ(c.inTable, Count("mfcdb_fail"));
+    CString strRow;
+    strRow.Format("%ld.", c.firstNotStored + 1);
+    EXPECT_GE(strError.Find(strRow), 0) << (LPCSTR)strError;
+  }
+}
+
+TEST_P(DbAppendTest, RecordsetRefusesRowsAfterAFailedBatch) {
+  MakeTable("mfcdb_refuse", "k varchar(10) primary key, v varchar(40)");
+  CTextSet rs(&m_db);
+  rs.Open(CRecordset::snapshot, "select * from mfcdb_refuse", CRecordset::appendOnly | CRecordset::optimizeBulkAdd);
+  for (const char* key : {"a", "b", "a"}) {
+    rs.AddNew();
+    rs.m_values[0] = key;
+    EXPECT_TRUE(rs.Update());   // queued
+  }
+  long lFirst = -2;
+  EXPECT_NE("", DbError([&] { rs.FlushBulkAdd(); }, &lFirst));
+  EXPECT_EQ(0, lFirst);
+  lFirst = -2;
+  EXPECT_NE("", DbError([&] { rs.AddNew(); }, &lFirst));
+  EXPECT_EQ(0, lFirst);
+  EXPECT_EQ("", DbError([&] { rs.Close(); }));
+  EXPECT_EQ(0, Count("mfcdb_refuse"));
+  // The connection commits by itself again.
+  m_db.ExecuteSQL("insert into mfcdb_refuse values ('z', 'z')");
+  CDatabase other;
+  other.OpenEx(m_strConnect);
+  CTextSet count(&other);
+  count.Open(CRecordset::snapshot, "select count(*) from mfcdb_refuse", CRecordset::readOnly);
+  EXPECT_STREQ("1", count.m_values[0]);
+}
+
+INSTANTIATE_TEST_SUITE_P(Drivers, DbAppendTest, testing::Values(Driver::SQLite, Driver::PostgreSQL), DriverName);
+
+// The file holds UTF-8: the sqlite3 shell reads what we wrote, and we read
+// what it wrote, both as the same letters.
+TEST(DbSqliteFile, HoldsUtf8ThatTheShellShares) {
+  PeerFolder folder;
+  if (!folder.Usable()) GTEST_SKIP() << "no Z:\\tmp in this Wine prefix";
+  std::string file = folder.Path("shared.db");
+  CDatabase db;
+  db.OpenEx(("Driver=SQLite3;Database=" + file).c_str());
+  db.ExecuteSQL("create table t (name varchar(20))");
+  {
+    CTextSet rs(&db);
+    rs.Open(CRecordset::snapshot, "select * from t", CRecordset::appendOnly);
+    rs.AddNew();
+    rs.m_values[0] = "M\xFCller";
+    rs.Update();
+  }
+  db.Close();
+  EXPECT_NE(std::string::npos, ReadWholeFile(file).find("M\xC3\xBCller"));
+
+  std::string script = "cd " + folder.UnixPath("") + " && sqlite3 shared.db 'select hex(name) from t' > hex.txt && "
+                       "sqlite3 shared.db \"insert into t values ('J\xC3\xBCrgen')\" && echo ok > done\n";
+  std::ofstream(folder.Path("peer.sh"), std::ios::binary) << script;
+  std::system(("start /wait /unix /bin/sh " + folder.UnixPath("peer.sh") + " >NUL 2>&1").c_str());
+  for (int i = 0; i < 600 && !std::filesystem::exists(folder.Path("done")); ++i)
+    std::this_thread::sleep_for(std::chrono::milliseconds(100));
+  if (!std::filesystem::exists(folder.Path("done"))) GTEST_SKIP() << "the host's sqlite3 could not be started";
+  EXPECT_EQ("4DC3BC6C6C6572\n", ReadWholeFile(folder.Path("hex.txt")));
+
+  db.OpenEx(("Driver=SQLite3;Database=" + file).c_str());
+  CTextSet rs(&db);
+  rs.Open(CRecordset::snapshot, "select * from t where name like 'J%'", CRecordset::readOnly);
+  ASSERT_FALSE(rs.IsEOF());
+  EXPECT_STREQ("J\xFCrgen", rs.m_values[0]);
+}

@@ -1,0 +1,130 @@
+// Connecting, the diagnostics of failures, and what the connection layer
+// does to connect strings and statements.
+#include "DbTestSupport.h"
+
+#include <windows.h>
+
+// An unknown driver, and a database file that is gone (the driver must not
+// make a new empty one in its place).
+TEST(DbConnect, FailureCarriesTheDriverDiagnostics) {
+  std::string missing = (std::filesystem::temp_directory_path() / UniqueLeaf("qo_missing_")).string() + ".db";
+  struct Case {
+    std::string connect;
+    const char* state;        // expected SQLSTATE of the first record
+    const char* origin;       // expected in m_strStateNativeOrigin
+  } cases[] = {
+      {"Database=x", "IM002", "State:IM002,Native:0,Origin:[unixODBC][Driver Manager]"},
+      {"Driver={No Such Driver 42};Database=x", "", "State:01000,Native:0,Origin:[unixODBC][Driver Manager]"},
+      {"ODBC;Driver=SQLite3;NoCreat=1;Database=" + missing, "", "State:"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.connect);
+    CDatabase db;
+    try {
+      db.OpenEx(c.connect.c_str());
+      FAIL() << "connected";
+    } catch (CDBException* e) {
+      EXPECT_EQ(SQL_ERROR, e->m_nRetCode);
+      EXPECT_FALSE(e->m_strError.IsEmpty());
+      if (*c.state != '\0') {
+        EXPECT_STREQ(c.state, e->m_strSqlState);
+      }
+      EXPECT_EQ(0, e->m_strStateNativeOrigin.Find(c.origin)) << (LPCSTR)e->m_strStateNativeOrigin;
+      EXPECT_EQ(-1, e->m_lFirstRowNotStored);
+      char szMessage[512];
+      EXPECT_TRUE(e->GetErrorMessage(szMessage, sizeof(szMessage)));
+      EXPECT_STREQ(e->m_strError, szMessage);
+      e->Delete();
+    }
+    EXPECT_FALSE(db.IsOpen());
+    EXPECT_FALSE(std::filesystem::exists(missing));
+  }
+}
+
+// The Linux drivers take host paths: a Windows path, absolute or relative to
+// the current folder, must name the same file for them as for the program.
+TEST(DbConnect, WindowsPathsReachTheDriverAsTheSameFile) {
+  std::string leaf = UniqueLeaf("qo_path_") + ".db";
+  std::string absolute = (std::filesystem::temp_directory_path() / leaf).string();
+  std::string relative = UniqueLeaf("qo_rel_") + ".db";
+  ASSERT_EQ(':', absolute[1]) << absolute;
+  for (const std::string& path : {absolute, relative}) {
+    SCOPED_TRACE(path);
+    {
+      CDatabase db;
+      db.OpenEx(("Driver={SQLite3};Database={" + path + "}").c_str());
+      db.ExecuteSQL("create table t (a varchar(10))");
+    }
+    EXPECT_TRUE(std::filesystem::exists(path));
+    std::error_code ignored;
+    std::filesystem::remove(path, ignored);
+  }
+}
+
+TEST(DbConnect, BadDatabaseFilesRaiseClearErrors) {
+  std::string notDb = (std::filesystem::temp_directory_path() / (UniqueLeaf("qo_text_") + ".db")).string();
+  std::ofstream(notDb, std::ios::binary) << std::string(4096, 'x');
+  std::string readOnly = (std::filesystem::temp_directory_path() / (UniqueLeaf("qo_ro_") + ".db")).string();
+  {
+    CDatabase db;
+    db.OpenEx(("Driver=SQLite3;Database=" + readOnly).c_str());
+    db.ExecuteSQL("create table t (a varchar(10))");
+  }
+  struct Case {
+    std::string connect;
+    DWORD options;
+    const char* expected;   // in the message
+  } cases[] = {
+      {"Driver=SQLite3;Database=" + notDb, 0, "not a database"},
+      {"Driver=SQLite3;Database=" + readOnly, CDatabase::openReadOnly, "readonly"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.connect);
+    CString strError = DbError([&] {
+      CDatabase db;
+      db.OpenEx(c.connect.c_str(), c.options);
+      db.ExecuteSQL("insert into t values ('x')");
+    });
+    EXPECT_GE(strError.Find(c.expected), 0) << (LPCSTR)strError;
+  }
+  std::error_code ignored;
+  std::filesystem::remove(notDb, ignored);
+  std::filesystem::remove(readOnly, ignored);
+}
+
+class DbConnectTest : public DbTest {};
+
+TEST_P(DbConnectTest, StatementFailuresRaiseAndNoRowsIsNoFailure) {
+  MakeTable("mfcdb_noop", "a varchar(10)");
+  // Nothing to delete: the driver answers SQL_NO_DATA, which is not an error.
+  EXPECT_EQ("", DbError([&] { m_db.ExecuteSQL("delete from mfcdb_noop"); }));
+  CString strState;
+  CString strError = DbError([&] { m_db.ExecuteSQL("select * from mfcdb_no_such_table"); }, nullptr, &strState);
+  EXPECT_GE(strError.Find("mfcdb_no_such_table"), 0) << (LPCSTR)strError;
+  EXPECT_FALSE(strState.IsEmpty());
+  // The connection is still usable after a failed statement.
+  EXPECT_EQ(0, Count("mfcdb_noop"));
+}
+
+TEST_P(DbConnectTest, ConnectionIsPreparedForFlatReading) {
+  CString strConnect = m_db.GetConnect();
+  if (IsPostgres()) {
+    EXPECT_EQ("PostgreSQL", m_db.GetDatabaseName());
+    EXPECT_EQ(CDatabase::textBytes, m_db.GetTextForm());
+    const char* pszLog = std::getenv("QO_PG_LOG");
+    if (pszLog == nullptr) GTEST_SKIP() << "QO_PG_LOG names no statement log";
+    MakeTable("mfcdb_flat", "a varchar(10)");
+    m_db.ExecuteSQL("insert into mfcdb_flat values ('1')");
+    EXPECT_EQ(1, Count("mfcdb_flat"));
+    std::string log = ReadWholeFile(std::string("Z:") + pszLog);
+    EXPECT_NE(std::string::npos, log.find("SET client_encoding TO 'WIN1252'"));
+    // The driver reads through a server cursor in slices, not the whole result.
+    EXPECT_NE(std::string::npos, log.find("fetch 10000 in")) << log.substr(log.size() > 2000 ? log.size() - 2000 : 0);
+  } else {
+    EXPECT_EQ("SQLite", m_db.GetDatabaseName());
+    EXPECT_EQ(CDatabase::textUtf8, m_db.GetTextForm());
+    EXPECT_GE(strConnect.Find("StepAPI=1"), 0) << (LPCSTR)strConnect;
+  }
+}
+
+INSTANTIATE_TEST_SUITE_P(Drivers, DbConnectTest, testing::Values(Driver::SQLite, Driver::PostgreSQL), DriverName);
