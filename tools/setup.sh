@@ -8,7 +8,7 @@ PACKAGES="cmake make g++ clang libclang-rt-14-dev googletest libgtest-dev
   g++-mingw-w64-x86-64-posix binutils-mingw-w64-x86-64
   wine wine64 xvfb x11-utils xdotool imagemagick
   python3 python3-dbf python3-dbfread
-  unixodbc libsqliteodbc sqlite3 odbc-postgresql postgresql"
+  unixodbc unixodbc-dev libsqliteodbc sqlite3 odbc-postgresql postgresql"
 missing=
 for p in $PACKAGES; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing="$missing $p"

@@ -223,8 +223,10 @@ void CRecordset::SendBatch() {
     pException = new CDBException(rc == SQL_SUCCESS_WITH_INFO || SQL_SUCCEEDED(rc) ? SQL_ERROR : rc);
     pException->BuildErrorString(m_pDatabase, m_hstmt, "SQLExecute");
   }
+  // The arrays end with this call: the statement must not keep pointing at them.
   SQLSetStmtAttr(m_hstmt, SQL_ATTR_PARAM_STATUS_PTR, NULL, 0);
   SQLFreeStmt(m_hstmt, SQL_CLOSE);
+  SQLFreeStmt(m_hstmt, SQL_RESET_PARAMS);
 
   for (qodb::QueuedColumn& column : st.queue) {
     column.data.clear();

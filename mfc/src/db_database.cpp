@@ -255,6 +255,10 @@ BOOL CDatabase::OpenEx(LPCTSTR lpszConnectString, DWORD dwOptions) {
 
     if (strDBMS.Find("sqlite") >= 0) {
       m_nTextForm = textUtf8;
+      // NoTXN=1 makes the SQLite driver commit every statement while it
+      // still says it has transactions: a rollback would undo nothing.
+      const ConnectPair* pNoTxn = FindKey(ParseConnect(m_strConnect), "NoTXN");
+      if (pNoTxn != NULL && !pNoTxn->strValue.IsEmpty() && pNoTxn->strValue != "0") m_nTxnCapable = SQL_TC_NONE;
       // The SQLite driver takes no access mode: the database itself refuses
       // writes for this connection.
       if (m_bReadOnlyRequested) ExecuteSQL("PRAGMA query_only = 1");
@@ -276,6 +280,9 @@ BOOL CDatabase::OpenEx(LPCTSTR lpszConnectString, DWORD dwOptions) {
 void CDatabase::Close() {
   while (m_pFirstRecordset != NULL) {
     CRecordset* pSet = m_pFirstRecordset;
+    // A recordset that made this connection itself must not delete it while
+    // it is being closed here.
+    pSet->m_bOwnDatabase = FALSE;
     try {
       pSet->Close();
     } catch (CException* e) {

@@ -120,6 +120,36 @@ TEST_P(DbAppendTest, RecordsetRefusesRowsAfterAFailedBatch) {
   EXPECT_STREQ("1", count.m_values[0]);
 }
 
+// A driver without transactions gets every row on its own: a failure costs
+// that row only.
+TEST(DbAppendNoTransactions, EachUpdateStoresItsRow) {
+  std::string file = (std::filesystem::temp_directory_path() / (UniqueLeaf("qo_notxn_") + ".db")).string();
+  CDatabase db;
+  db.OpenEx(("Driver=SQLite3;NoTXN=1;Database=" + file).c_str());
+  ASSERT_FALSE(db.CanTransact());
+  db.ExecuteSQL("create table t (k varchar(10) primary key)");
+  CTextSet rs(&db);
+  rs.Open(CRecordset::snapshot, "select * from t", CRecordset::appendOnly | CRecordset::optimizeBulkAdd);
+  std::vector<long> failed;
+  for (const char* key : {"a", "b", "a", "c"}) {
+    long lFirst = -2;
+    CString strError = DbError(
+        [&] {
+          rs.AddNew();
+          rs.m_values[0] = key;
+          rs.Update();
+        },
+        &lFirst);
+    if (!strError.IsEmpty()) failed.push_back(lFirst);
+  }
+  EXPECT_EQ(std::vector<long>{2}, failed);
+  rs.Close();
+  EXPECT_EQ(3, rs.GetRowsStored());
+  db.Close();
+  std::error_code ignored;
+  std::filesystem::remove(file, ignored);
+}
+
 INSTANTIATE_TEST_SUITE_P(Drivers, DbAppendTest, testing::Values(Driver::SQLite, Driver::PostgreSQL), DriverName);
 
 // The file holds UTF-8: the sqlite3 shell reads what we wrote, and we read

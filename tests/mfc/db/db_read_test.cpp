@@ -46,6 +46,9 @@ TEST_P(DbReadTest, TextAndOddNamesRoundTrip) {
     EXPECT_TRUE(strByName == strExpected2);
   }
   EXPECT_TRUE(rs.IsEOF());
+  // Empty members are stored as empty texts; only the row inserted without
+  // them holds NULL.
+  EXPECT_EQ(1, Count(strTable + " where \"a;b\" is null"));
 
   if (const char* pszLog = IsPostgres() ? std::getenv("QO_PG_LOG") : nullptr) {
     // The insert names the columns as the driver spelled them, quoted.
