@@ -106,6 +106,23 @@ TEST_P(DbConnectTest, StatementFailuresRaiseAndNoRowsIsNoFailure) {
   EXPECT_EQ(0, Count("mfcdb_noop"));
 }
 
+TEST_P(DbConnectTest, MissingDatabaseIsAConnectFailure) {
+  CString strConnect = m_strConnect;
+  if (IsPostgres())
+    strConnect.Replace("Database=qotest", "Database=qo_missing_db");
+  else
+    strConnect = ("Driver=SQLite3;NoCreat=1;Database=" + UniqueLeaf("qo_gone_") + ".db").c_str();
+  CDatabase db;
+  CString strState;
+  CString strError = DbError([&] { db.OpenEx(strConnect); }, nullptr, &strState);
+  EXPECT_FALSE(strError.IsEmpty());
+  EXPECT_FALSE(strState.IsEmpty());
+  if (IsPostgres()) {
+    EXPECT_GE(strError.Find("qo_missing_db"), 0) << (LPCSTR)strError;
+  }
+  EXPECT_FALSE(db.IsOpen());
+}
+
 TEST_P(DbConnectTest, ConnectionIsPreparedForFlatReading) {
   CString strConnect = m_db.GetConnect();
   if (IsPostgres()) {
