@@ -32,6 +32,10 @@ std::wstring WideFromUtf8(const char* p, int nLength);
 std::string ToDriver(int nTextForm, LPCSTR lpsz, int nLength = -1);
 CString FromDriver(int nTextForm, const char* p, int nLength = -1);
 
+// A column name as an exchange or a caller may write it, without the quotes
+// ("[Name]", "\"Name\"", `Name`).
+CString BareName(LPCSTR lpszName);
+
 // A CDBException that the layer raises itself (no driver diagnostics).
 CDBException* NewException(RETCODE nRetCode, const CString& strError);
 [[noreturn]] void Throw(RETCODE nRetCode, const CString& strError);
