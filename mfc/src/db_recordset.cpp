@@ -10,24 +10,29 @@
 #include <string.h>
 
 #include <exception>
+#include <vector>
 
 using qodb::StateOf;
 
 namespace {
 
 // Reads the whole value of column nColumn (1-based) of the fetched row in
-// pieces; FALSE for NULL.
+// pieces; FALSE for NULL. Most values fit the first, small piece; for a longer
+// one the rest is asked for in one piece when the driver says how long it is
+// (some drivers convert the whole value again for every piece).
 BOOL ReadValue(CDatabase* pdb, HSTMT hstmt, SQLUSMALLINT nColumn, CString& strValue) {
   const BOOL bWide = pdb->GetTextForm() == CDatabase::textUtf8;
   const SQLSMALLINT nCType = bWide ? SQL_C_WCHAR : SQL_C_CHAR;
   const SQLLEN nTerm = bWide ? (SQLLEN)sizeof(WCHAR) : 1;
-  // WCHAR-aligned piece buffer.
-  WCHAR buffer[2048];
-  const SQLLEN nBufferBytes = (SQLLEN)sizeof(buffer);
+  const SQLLEN kMaxPieceBytes = 16 << 20;   // a piece of unknown length
+  WCHAR first[2048];                        // WCHAR-aligned
+  std::vector<char> heap;
+  char* pBuffer = (char*)first;
+  SQLLEN nBufferBytes = (SQLLEN)sizeof(first);
   std::string bytes;
   for (;;) {
     SQLLEN nIndicator = 0;
-    SQLRETURN rc = SQLGetData(hstmt, nColumn, nCType, buffer, nBufferBytes, &nIndicator);
+    SQLRETURN rc = SQLGetData(hstmt, nColumn, nCType, pBuffer, nBufferBytes, &nIndicator);
     if (rc == SQL_NO_DATA) break;   // every piece has been read
     pdb->Check(rc, hstmt, "SQLGetData");
     if (nIndicator == SQL_NULL_DATA) {
@@ -44,20 +49,29 @@ BOOL ReadValue(CDatabase* pdb, HSTMT hstmt, SQLUSMALLINT nColumn, CString& strVa
       nPiece = nBufferBytes - nTerm;
       bMore = TRUE;
     } else if (nIndicator == SQL_NO_TOTAL) {
-      nPiece = bWide ? (SQLLEN)(wcsnlen(buffer, (size_t)(nBufferBytes / nTerm - 1)) * sizeof(WCHAR))
-                     : (SQLLEN)strnlen((const char*)buffer, (size_t)(nBufferBytes - 1));
+      nPiece = bWide ? (SQLLEN)(wcsnlen((const WCHAR*)pBuffer, (size_t)(nBufferBytes / nTerm - 1)) * sizeof(WCHAR))
+                     : (SQLLEN)strnlen(pBuffer, (size_t)(nBufferBytes - 1));
       bMore = FALSE;
     } else {
       qodb::Throw(SQL_ERROR, "Der ODBC-Treiber hat eine ungültige Länge eines Werts gemeldet.");
     }
-    if ((SQLLEN)bytes.size() + nPiece > qodb::kMaxValueBytes) {
+    // The indicator is the length still to come: checked before it sizes the next piece.
+    SQLLEN nTotal = (SQLLEN)bytes.size() + (bMore && nIndicator != SQL_NO_TOTAL ? nIndicator : nPiece);
+    if (nTotal > qodb::kMaxValueBytes) {
       CString strError;
       strError.Format("Ein Wert der Spalte %u ist länger als %ld MB und wird nicht gelesen.", (unsigned)nColumn,
                       (long)(qodb::kMaxValueBytes >> 20));
       qodb::Throw(SQL_ERROR, strError);
     }
-    bytes.append((const char*)buffer, (size_t)nPiece);
+    bytes.append(pBuffer, (size_t)nPiece);
     if (!bMore) break;
+    SQLLEN nNext = nIndicator != SQL_NO_TOTAL ? nIndicator - nPiece + nTerm
+                                               : (nBufferBytes < kMaxPieceBytes / 2 ? nBufferBytes * 2 : kMaxPieceBytes);
+    if (nNext < nTerm + 2) nNext = nTerm + 2;
+    if (bWide) nNext = (nNext + 1) & ~(SQLLEN)1;
+    heap.resize((size_t)nNext);
+    pBuffer = heap.data();
+    nBufferBytes = nNext;
   }
   if (bWide)
     strValue = qodb::Narrow((const WCHAR*)bytes.data(), (int)(bytes.size() / sizeof(WCHAR)));

@@ -55,6 +55,33 @@ TEST_P(DbAppendTest, BulkRowsAreStoredAndReadBack) {
   EXPECT_EQ(25000, rs.GetRecordCount());
 }
 
+// Values far longer than the exchange declared, many of them: the queue is
+// sent in smaller batches, and every value arrives whole.
+TEST_P(DbAppendTest, LongValuesArriveWhole) {
+  MakeTable("mfcdb_long", IsPostgres() ? "k varchar(10), v text" : "k varchar(10), v varchar(10)");
+  const int nRows = 40, nLength = 1 << 20;
+  {
+    CTextSet rs(&m_db);
+    rs.Open(CRecordset::snapshot, "select * from mfcdb_long", CRecordset::appendOnly | CRecordset::optimizeBulkAdd);
+    for (int i = 0; i < nRows; ++i) {
+      rs.AddNew();
+      rs.m_values[0].Format("%d", i);
+      rs.m_values[1] = CString((char)('A' + i % 26), nLength);
+      rs.Update();
+    }
+    rs.Close();
+  }
+  CTextSet rs(&m_db);
+  rs.Open(CRecordset::snapshot, "select k, v from mfcdb_long", CRecordset::readOnly);
+  int nSeen = 0;
+  for (; !rs.IsEOF(); rs.MoveNext(), ++nSeen) {
+    int i = atoi(rs.m_values[0]);
+    ASSERT_EQ(nLength, rs.m_values[1].GetLength()) << i;
+    EXPECT_EQ(CString((char)('A' + i % 26), nLength), rs.m_values[1]) << i;
+  }
+  EXPECT_EQ(nRows, nSeen);
+}
+
 // What the failure says is stored is what a fresh count finds.
 TEST_P(DbAppendTest, FailedRowsAreNamedAndNothingElseIsLost) {
   struct Case {
