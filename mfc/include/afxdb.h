@@ -324,7 +324,7 @@ protected:
   long m_lCurrentRow;        // 0-based, -1 before the first
   long m_lRecordCount;
   short m_nResultCols;
-  void* m_pState;            // columns, bindings, queued rows (db_recordset.cpp)
+  void* m_pState;            // columns, bindings, queued rows (db_private.h)
   long m_lRowsQueued;
   long m_lRowsStored;
   BOOL m_bAdding;
@@ -340,7 +340,7 @@ private:
   // Appending (db_append.cpp).
   void OpenForAppend();
   void RaiseIfFailed();
-  [[noreturn]] void FailAppend(CDBException* pException, long lRowsSent);
+  [[noreturn]] void FailAppend(CDBException* pException);
   void CommitAppended();
   void ReleaseAppend();
 

@@ -234,7 +234,7 @@ void CRecordset::SendBatch() {
     column.nWidest = 0;
   }
   st.lQueued = 0;
-  if (pException != NULL) FailAppend(pException, (long)nRows);
+  if (pException != NULL) FailAppend(pException);
   if (st.bOwnTransaction) {
     st.lRowsInTransaction += (long)nRows;
     if (st.lRowsInTransaction >= qodb::kCommitRows) CommitAppended();
@@ -250,13 +250,13 @@ void CRecordset::CommitAppended() {
   if (!SQL_SUCCEEDED(rc)) {
     CDBException* pException = new CDBException(rc);
     pException->BuildErrorString(m_pDatabase, SQL_NULL_HSTMT, "SQLEndTran");
-    FailAppend(pException, 0);
+    FailAppend(pException);
   }
   m_lRowsStored += st.lRowsInTransaction;
   st.lRowsInTransaction = 0;
 }
 
-void CRecordset::FailAppend(CDBException* pException, long lRowsSent) {
+void CRecordset::FailAppend(CDBException* pException) {
   qodb::RecordsetState& st = StateOf(m_pState);
   CString strNote;
   if (st.bOwnTransaction) {
@@ -269,7 +269,6 @@ void CRecordset::FailAppend(CDBException* pException, long lRowsSent) {
     st.bFailed = true;
   } else {
     // One row at a time: only this row is lost, the caller may go on.
-    UNUSED(lRowsSent);
     pException->m_lFirstRowNotStored = m_lRowsQueued - 1;
     strNote.Format("Der %ld. angefügte Datensatz wurde nicht gespeichert.", m_lRowsQueued);
   }
