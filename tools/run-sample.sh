@@ -20,6 +20,20 @@ printf '[Eingabe]\r\nDatei=kunden.txt\r\nZeichensatz=0\r\n[Ausgabe]\r\nDatei=kun
 # The program runs in the project folder, so the files are named relative to it.
 "$here/session" sh -c "cd '$project' && wine '$repo/${QO_BUILD:-build/win}/bin/qoconvert.exe' /batch ." && rc=0 || rc=$?
 
+# The same records into a table of an SQLite database file (no server needed),
+# read back with the sqlite3 shell.
+if [ $rc -eq 0 ]; then
+  db_project=build/sample-project-db
+  rm -rf "$db_project"
+  mkdir -p "$db_project"
+  cp "$project/kunden.txt" "$db_project/"
+  printf '[Eingabe]\r\nDatei=kunden.txt\r\nZeichensatz=0\r\n[Ausgabe]\r\nODBC=Driver=SQLite3;Database=kunden.db\r\nTabelle=Kunden\r\n' \
+    > "$db_project/qoconvert.ini"
+  "$here/session" sh -c "cd '$db_project' && wine '$repo/${QO_BUILD:-build/win}/bin/qoconvert.exe' /batch ." && rc=0 || rc=$?
+  echo "--- into SQLite: $db_project/kunden.db, table Kunden, read by the sqlite3 shell:"
+  sqlite3 -header -separator ' | ' "$db_project/kunden.db" 'select * from Kunden' || rc=1
+fi
+
 echo "--- qoconvert.log"
 iconv -f CP1252 -t UTF-8 "$project/qoconvert.log"
 if [ -f "$project/kunden-dos.txt" ]; then

@@ -2,6 +2,13 @@
 
 #include <CQoException.h>
 #include <CQoFile.h>
+#include <CQoInputFilterODBC.h>
+#include <CQoInputFilterTextVar.h>
+#include <CQoOutputFilterODBC.h>
+#include <CQoOutputFilterTextVar.h>
+
+#include <memory>
+#include <vector>
 
 namespace {
 const char kInput[] = "Eingabe";
@@ -19,6 +26,15 @@ void CConversion::ReadConfig(CQoConfigFile& config)
     ReadCharset(config, kInput, m_inputCharset);
     config.GetValue(kOutput, "Datei", m_outputFile);
     ReadCharset(config, kOutput, m_outputCharset);
+    config.GetValue(kInput, "ODBC", m_inputConnect);
+    config.GetValue(kInput, "Tabelle", m_inputTable);
+    config.GetValue(kInput, "SQL", m_inputSql);
+    config.GetValue(kOutput, "ODBC", m_outputConnect);
+    config.GetValue(kOutput, "Tabelle", m_outputTable);
+    if (InputIsDatabase() && m_inputTable.IsEmpty() && m_inputSql.IsEmpty())
+        CQoException::Throw("Zur ODBC-Eingabe fehlt die Tabelle (Tabelle=) oder die Abfrage (SQL=).", "Eingabe");
+    if (OutputIsDatabase() && m_outputTable.IsEmpty())
+        CQoException::Throw("Zur ODBC-Ausgabe fehlt die Tabelle (Tabelle=).", "Ausgabe");
 }
 
 void CConversion::ReadCharset(CQoConfigFile& config, const char* section, int& charset)
@@ -56,6 +72,130 @@ int CConversion::FileMode(int charset)
 }
 
 long CConversion::Run()
+{
+    return InputIsDatabase() || OutputIsDatabase() ? RunRecords() : RunLines();
+}
+
+namespace {
+// A column name as SQL takes it whatever it holds: in double quotes.
+CQoString Quoted(const CQoString& name)
+{
+    CQoString quoted = "\"";
+    for (int i = 0; i < name.GetLength(); ++i) {
+        quoted += CQoString(name.GetString() + i, 1);
+        if (name.GetAt(i) == '"')
+            quoted += "\"";
+    }
+    return quoted + "\"";
+}
+}
+
+long CConversion::RunRecords()
+{
+    // The input: a table or query of a data source, or a delimited file.
+    std::unique_ptr<CQoInputFilter> input;
+    if (InputIsDatabase()) {
+        CQoInputFilterODBC* odbc = new CQoInputFilterODBC(m_inputConnect);
+        input.reset(odbc);
+        odbc->Init("");
+        if (m_inputSql.IsEmpty())
+            odbc->InitTable(m_inputTable, CQoInputFilterDB::tableTable, false);
+        else
+            odbc->InitTable(m_inputSql, CQoInputFilterDB::tableSql, false);
+    } else {
+        CQoInputFilterTextVar* text = new CQoInputFilterTextVar;
+        input.reset(text);
+        text->Delimiter(';');
+        text->SetFirstRowHasNames(true);
+        text->CharSet(FileMode(m_inputCharset));
+        text->Init(m_inputFile);
+    }
+    int const columns = input->NumCols();
+    if (columns == 0)
+        CQoException::Throw("Die Eingabe hat keine Spalten.", "CConversion::Run");
+
+    // The output: a table (text columns wide enough for any value read), or
+    // a delimited file written beside its target and put in place at the end.
+    std::unique_ptr<CQoOutputFilter> output;
+    CQoFile file;
+    std::string temp;
+    if (OutputIsDatabase()) {
+        CQoOutputFilterODBC* odbc = new CQoOutputFilterODBC;
+        output.reset(odbc);
+        odbc->SetTableName(m_outputTable);
+        odbc->NumCols(columns);
+        for (int c = 0; c < columns; ++c) {
+            CQoString name;
+            input->ColName(c, name);
+            odbc->ColumnName(c, Quoted(name));
+            odbc->SetType(c, CQoOutputFilterDB::dbtypeText);
+            odbc->SetLength(c, 255);
+        }
+        odbc->UseDB(m_outputConnect);
+    } else {
+        if (CQoFile::SameFile(m_inputFile, m_outputFile))
+            CQoException::Throw("Die Ausgabedatei ist die Eingabedatei.", "CConversion::Run");
+        temp = CQoFile::NewTempFileBeside(m_outputFile);
+        if (temp.empty() || !file.Open(temp.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary)) {
+            if (!temp.empty())
+                CQoFile::Remove(temp.c_str());
+            CQoString text;
+            text.Format("Die Ausgabedatei '%s' kann nicht angelegt werden.", (const char*)m_outputFile);
+            CQoException::Throw(text, "CConversion::Run");
+        }
+        CQoOutputFilterTextVar* text = new CQoOutputFilterTextVar;
+        output.reset(text);
+        text->NumCols(columns);
+        for (int c = 0; c < columns; ++c) {
+            CQoString name;
+            input->ColName(c, name);
+            text->ColumnName(c, name);
+        }
+        text->WriteHeaderFlag(true);
+        text->FileCharSet(FileMode(m_outputCharset));
+        text->UseFile(&file, true);
+    }
+
+    long records = 0;
+    try {
+        if (!output->Init())
+            CQoException::Throw("Die Ausgabe kann nicht geschrieben werden.", "CConversion::Run");
+        output->WriteHeader();
+        CQoString value;
+        for (bool ok = input->FirstRow(); ok; ok = input->NextRow()) {
+            output->InitRow();
+            for (int c = 0; c < columns; ++c) {
+                input->Value(c, value);
+                output->Value(c, value);
+            }
+            if (!output->WriteRow())
+                CQoException::Throw("Ein Satz wurde nicht gespeichert.", "CConversion::Run");
+            ++records;
+        }
+        if (OutputIsDatabase())
+            static_cast<CQoOutputFilterODBC*>(output.get())->ReleaseDB();
+        else
+            output->ReleaseFile();
+    } catch (...) {
+        if (!temp.empty()) {
+            try {
+                output->ReleaseFile();
+            } catch (const CQoException&) {
+            }
+            CQoFile::Remove(temp.c_str());
+        }
+        throw;
+    }
+    if (!temp.empty() && !CQoFile::MoveOver(temp.c_str(), m_outputFile)) {
+        CQoFile::Remove(temp.c_str());
+        CQoString text;
+        text.Format("Die Ausgabedatei '%s' kann nicht ersetzt werden.", (const char*)m_outputFile);
+        CQoException::Throw(text, "CConversion::Run");
+    }
+    return records;
+}
+
+long CConversion::RunLines()
 {
     // Writing over the input would destroy it before it is read: the same
     // file under another spelling (case, "..", "./") counts as the same.

@@ -1,9 +1,19 @@
 // CConversion - one conversion job of the sample program: read the records
-// of a text file in one character set and write them in another.
+// of a text file in one character set and write them in another, or move the
+// records of a delimited text file (names in the first line, ';' between
+// fields) into a table of an ODBC data source, or a table or query of one
+// into such a text file or another table.
 //
 // The job's settings live in the project's configuration file (section
 // "Eingabe" and "Ausgabe"), so that a project converts the same way
-// interactively and from the command line.
+// interactively and from the command line:
+//
+//     [Eingabe]                 [Ausgabe]
+//     Datei=kunden.txt          ODBC=Driver=SQLite3;Database=kunden.db
+//     Zeichensatz=0             Tabelle=Kunden
+//
+// An input reads from ODBC when "ODBC" holds a connect string; "Tabelle"
+// names its table, or "SQL" gives a statement instead.
 #pragma once
 
 #include <CQoConfigFile.h>
@@ -31,8 +41,19 @@ public:
     int m_inputCharset;
     CQoString m_outputFile;
     int m_outputCharset;
+    // ODBC connect strings (empty: the side is a file), table, statement.
+    CQoString m_inputConnect;
+    CQoString m_inputTable;
+    CQoString m_inputSql;
+    CQoString m_outputConnect;
+    CQoString m_outputTable;
+
+    bool InputIsDatabase() const { return !m_inputConnect.IsEmpty(); }
+    bool OutputIsDatabase() const { return !m_outputConnect.IsEmpty(); }
 
 private:
+    long RunLines();
+    long RunRecords();
     static int FileMode(int charset);
     static void ReadCharset(CQoConfigFile& config, const char* section, int& charset);
 };

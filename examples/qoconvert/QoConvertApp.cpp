@@ -25,6 +25,32 @@ CQoString InProject(const CQoString& folder, const CQoString& file)
     return absolute || file.IsEmpty() ? file : folder + "\\" + file;
 }
 
+// The value of Database= or DBQ= in a connect string, made absolute against
+// the project folder like the file names.
+CQoString ConnectInProject(const CQoString& folder, const CQoString& connect)
+{
+    CQoString result;
+    int start = 0;
+    while (start <= connect.GetLength()) {
+        int end = connect.Find(';', start);
+        if (end < 0)
+            end = connect.GetLength();
+        CQoString part = connect.Mid(start, end - start);
+        int equals = part.Find('=');
+        if (equals > 0) {
+            CQoString key = part.Left(equals);
+            key.Trim();
+            if (_stricmp(key, "Database") == 0 || _stricmp(key, "DBQ") == 0)
+                part = part.Left(equals + 1) + InProject(folder, part.Mid(equals + 1));
+        }
+        if (!result.IsEmpty() || start > 0)
+            result += ";";
+        result += part;
+        start = end + 1;
+    }
+    return result;
+}
+
 // A batch run has no window: its errors go to the console that started it
 // (attached when the program has none of its own) as well as to the log.
 void ToConsole(const char* text)
@@ -141,7 +167,8 @@ bool CQoConvertApp::Convert()
         Refuse(2104, text);
         return false;
     }
-    if (job.m_inputFile.IsEmpty() || job.m_outputFile.IsEmpty()) {
+    if ((job.m_inputFile.IsEmpty() && !job.InputIsDatabase())
+        || (job.m_outputFile.IsEmpty() && !job.OutputIsDatabase())) {
         CString text;
         text.Format(IDS_NO_PROJECT, (const char*)m_projectFile);
         Refuse(2101, text);
@@ -150,6 +177,9 @@ bool CQoConvertApp::Convert()
 
     job.m_inputFile = InProject(m_projectFolder, job.m_inputFile);
     job.m_outputFile = InProject(m_projectFolder, job.m_outputFile);
+    // Database files named in a connect string are relative to the project too.
+    job.m_inputConnect = ConnectInProject(m_projectFolder, job.m_inputConnect);
+    job.m_outputConnect = ConnectInProject(m_projectFolder, job.m_outputConnect);
     try {
         CWaitCursor wait;
         long records = job.Run();

@@ -91,3 +91,22 @@ execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}/fehlt
 if(NOT rc EQUAL 1 OR NOT err MATCHES "Der Projektordner '[^']*fehlt' existiert nicht")
   message(FATAL_ERROR "missing project folder: exit ${rc}, console:\n${err}")
 endif()
+
+# Through a database: the delimited file into a table of an SQLite file, and
+# the table back into a delimited file; the records arrive unchanged.
+file(WRITE ${project}/qoconvert.ini
+     "[Eingabe]\nDatei=kunden.txt\nZeichensatz=0\n[Ausgabe]\nODBC=Driver=SQLite3;Database=kunden.db\nTabelle=Kunden\n")
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+file(WRITE ${project}/qoconvert.ini
+     "[Eingabe]\nODBC=Driver=SQLite3;Database=kunden.db\nSQL=select * from Kunden\n[Ausgabe]\nDatei=zurueck.txt\nZeichensatz=0\n")
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                RESULT_VARIABLE rc2 OUTPUT_QUIET ERROR_VARIABLE err2 TIMEOUT 120)
+execute_process(COMMAND sh -c "sed 's/$/\r/' '${SOURCE_DIR}/sample/kunden.txt.utf8' | iconv -f UTF-8 -t CP1252"
+                OUTPUT_FILE ${project}/expected-ansi.txt)
+execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/zurueck.txt ${project}/expected-ansi.txt
+                RESULT_VARIABLE differs)
+if(NOT rc EQUAL 0 OR NOT rc2 EQUAL 0 OR NOT differs EQUAL 0)
+  file(READ ${project}/qoconvert.log log)
+  message(FATAL_ERROR "through SQLite: exit ${rc}/${rc2}, differs ${differs}\n${err}${err2}\nlog:\n${log}")
+endif()

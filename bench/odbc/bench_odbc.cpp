@@ -1,0 +1,122 @@
+// Writing a large delimited file into a table through CQoOutputFilterODBC and
+// reading the table back through CQoInputFilterODBC, for SQLite and (when
+// QO_PG_CONNECT names a server) PostgreSQL. bench/odbc/run.sh runs it beside
+// sqlite3's .import and psql's \copy of the same file.
+//
+//   bench_odbc <delimited file> <folder for the SQLite file>
+#include <CQoException.h>
+#include <CQoInputFilterODBC.h>
+#include <CQoInputFilterTextVar.h>
+#include <CQoOutputFilterODBC.h>
+
+#include <windows.h>
+#include <psapi.h>
+
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+
+namespace {
+typedef std::chrono::steady_clock Clock;
+
+double Seconds(Clock::time_point since)
+{
+    return std::chrono::duration<double>(Clock::now() - since).count();
+}
+
+double WorkingSetMB()
+{
+    PROCESS_MEMORY_COUNTERS counters;
+    counters.cb = sizeof counters;
+    if (!GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters))
+        return 0;
+    return static_cast<double>(counters.WorkingSetSize) / 1e6;
+}
+
+void Write(const char* what, const std::string& connect, const char* file)
+{
+    CQoInputFilterTextVar in;
+    in.Delimiter(';');
+    in.SetFirstRowHasNames(true);
+    in.Init(file);
+    int const cols = in.NumCols();
+    CQoOutputFilterODBC out;
+    out.SetTableName("bench");
+    out.NumCols(cols);
+    for (int c = 0; c < cols; ++c) {
+        CQoString name;
+        in.ColName(c, name);
+        out.ColumnName(c, name);
+        out.SetLength(c, 60);
+    }
+    out.UseDB(connect.c_str());
+    Clock::time_point start = Clock::now();
+    out.Init();
+    long rows = 0;
+    CQoString value;
+    for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
+        out.InitRow();
+        for (int c = 0; c < cols; ++c) {
+            in.Value(c, value);
+            out.Value(c, value);
+        }
+        out.WriteRow();
+        ++rows;
+    }
+    out.ReleaseDB();
+    double t = Seconds(start);
+    std::printf("%s: CQoOutputFilterODBC wrote %ld rows x %d columns in %.2f s = %.0f rows/s\n", what, rows, cols, t,
+                rows / t);
+}
+
+void Read(const char* what, const std::string& connect)
+{
+    CQoInputFilterODBC in(connect.c_str());
+    in.Init("");
+    double before = WorkingSetMB();
+    Clock::time_point start = Clock::now();
+    in.InitTable("bench", CQoInputFilterDB::tableTable, false);
+    long rows = 0;
+    std::size_t bytes = 0;
+    double at100k = 0;
+    CQoString value;
+    for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
+        for (int c = 0; c < in.NumCols(); ++c) {
+            in.Value(c, value);
+            bytes += static_cast<std::size_t>(value.GetLength());
+        }
+        if (++rows == 100000)
+            at100k = WorkingSetMB();
+    }
+    double t = Seconds(start);
+    std::printf("%s: CQoInputFilterODBC read %ld rows in %.2f s = %.0f rows/s (%zu value bytes); working set "
+                "%.1f MB before, %.1f MB after 100,000 rows, %.1f MB at the end\n",
+                what, rows, t, rows / t, bytes, before, at100k, WorkingSetMB());
+}
+} // namespace
+
+int main(int argc, char** argv)
+{
+    if (argc < 3) {
+        std::fprintf(stderr, "bench_odbc <delimited file> <folder for the SQLite file>\n");
+        return 2;
+    }
+    try {
+        std::string db = std::string(argv[2]) + "\\bench_odbc.db";
+        DeleteFileA(db.c_str());
+        std::string sqlite = "Driver=SQLite3;Database=" + db;
+        Write("SQLite", sqlite, argv[1]);
+        Read("SQLite", sqlite);
+        if (const char* pg = std::getenv("QO_PG_CONNECT")) {
+            Write("PostgreSQL", pg, argv[1]);
+            Read("PostgreSQL", pg);
+        } else {
+            std::printf("PostgreSQL: QO_PG_CONNECT is not set\n");
+        }
+    } catch (const CQoException& e) {
+        std::fprintf(stderr, "bench_odbc: %s\n", e.Message());
+        return 1;
+    }
+    return 0;
+}
