@@ -106,8 +106,13 @@ int main(int argc, char** argv)
         std::string db = std::string(argv[2]) + "\\bench_odbc.db";
         DeleteFileA(db.c_str());
         std::string sqlite = "Driver=SQLite3;Database=" + db;
-        Write("SQLite", sqlite, argv[1]);
-        Read("SQLite", sqlite);
+        const char* only = std::getenv("QO_BENCH_ONLY");   // "sqlite" or "postgres", for profiling one
+        if (!only || std::string(only) == "sqlite") {
+            Write("SQLite", sqlite, argv[1]);
+            Read("SQLite", sqlite);
+        }
+        if (only && std::string(only) == "sqlite")
+            return 0;
         if (const char* pg = std::getenv("QO_PG_CONNECT")) {
             Write("PostgreSQL", pg, argv[1]);
             Read("PostgreSQL", pg);

@@ -339,6 +339,7 @@ private:
   void SetAfterLast();
   // Appending (db_append.cpp).
   void OpenForAppend();
+  void PrepareMultiRowInsert(const CString& strInsert, const CString& strMarkers);
   void RaiseIfFailed();
   [[noreturn]] void FailAppend(CDBException* pException);
   void CommitAppended();

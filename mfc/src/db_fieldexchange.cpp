@@ -79,14 +79,10 @@ void CRecordset::ExchangeText(CFieldExchange* pFX, LPCTSTR szName, CString& valu
     ASSERT(nField < st.bindings.size() && nField < st.pending.size());
     std::string& out = st.pending[nField];
     if (m_pDatabase->GetTextForm() == CDatabase::textUtf8) {
-      // One UTF-16 unit per Windows-1252 byte: converted straight into place,
-      // as this runs for every value of every appended row.
-      int nLength = value.GetLength();
-      out.resize((size_t)nLength * sizeof(WCHAR));
-      if (nLength > 0 && MultiByteToWideChar(1252, 0, value, nLength, (LPWSTR)&out[0], nLength) != nLength) {
-        std::wstring wide = qodb::Widen(value, nLength);
-        out.assign((const char*)wide.data(), wide.size() * sizeof(WCHAR));
-      }
+      // The store keeps UTF-8 and takes narrow text as it comes: converted
+      // here, the driver has nothing left to convert.
+      out.clear();
+      qodb::AppendUtf8(out, value, (size_t)value.GetLength());
     } else {
       out.assign((LPCSTR)value, (size_t)value.GetLength());
     }

@@ -30,6 +30,9 @@ std::wstring WideFromUtf8(const char* p, int nLength);
 // Text the program hands to the driver (SQL, names) in the driver's form, and
 // text from the driver (names, messages) back in Windows-1252.
 std::string ToDriver(int nTextForm, LPCSTR lpsz, int nLength = -1);
+// Appends the UTF-8 form of Windows-1252 text to `out`, through a table: this
+// runs for every value of every appended row.
+void AppendUtf8(std::string& out, const char* p, size_t nLength);
 CString FromDriver(int nTextForm, const char* p, int nLength = -1);
 
 // A column name as an exchange or a caller may write it, without the quotes
@@ -110,6 +113,19 @@ struct RecordsetState {
   long lRowsInTransaction = 0;   // sent since the last commit
   std::vector<QueuedColumn> queue;
   long lQueued = 0;              // rows in the queue
+  // The rows of a batch as the driver reads them: row-wise, each row holding
+  // every value at its column's width (NUL-terminated) and their lengths.
+  // The layout only grows, so the arrays stay bound from batch to batch.
+  std::vector<size_t> widths;          // bytes a value of each column may have
+  std::vector<size_t> valueOffsets;    // of each value within a row
+  std::vector<size_t> lengthOffsets;   // of each length within a row
+  size_t nRowBytes = 0;
+  std::vector<char> rows;              // the batch
+  // An insert of several rows at once, where the driver can take one: it
+  // parses once for many rows.
+  HSTMT hMulti = SQL_NULL_HSTMT;
+  long nRowsPerInsert = 1;
+  bool bMultiBound = false;
   std::vector<std::string> pending;   // the row being stored, one value per binding
 };
 

@@ -46,6 +46,42 @@ std::wstring WideFromUtf8(const char* p, int nLength) {
   return wide;
 }
 
+namespace {
+// The UTF-8 bytes of each Windows-1252 byte (bytes 0..127 are their own).
+struct Utf8Table {
+  char bytes[256][4];
+  unsigned char lengths[256];
+  Utf8Table() {
+    for (int c = 0; c < 256; ++c) {
+      char in = (char)c;
+      WCHAR wide = 0;
+      if (MultiByteToWideChar(kCodePage, 0, &in, 1, &wide, 1) != 1) wide = (WCHAR)c;
+      lengths[c] = (unsigned char)WideCharToMultiByte(CP_UTF8, 0, &wide, 1, bytes[c], 4, NULL, NULL);
+    }
+  }
+};
+const Utf8Table& Table() {
+  static const Utf8Table table;
+  return table;
+}
+}  // namespace
+
+void AppendUtf8(std::string& out, const char* p, size_t nLength) {
+  const Utf8Table& table = Table();
+  const size_t nStart = out.size();
+  out.resize(nStart + nLength * 3);
+  char* q = &out[nStart];
+  for (size_t i = 0; i < nLength; ++i) {
+    unsigned char c = (unsigned char)p[i];
+    if (c < 0x80) {
+      *q++ = (char)c;
+    } else {
+      for (unsigned char k = 0; k < table.lengths[c]; ++k) *q++ = table.bytes[c][k];
+    }
+  }
+  out.resize((size_t)(q - &out[nStart]) + nStart);
+}
+
 std::string ToDriver(int nTextForm, LPCSTR lpsz, int nLength) {
   if (lpsz == NULL) return std::string();
   if (nLength < 0) nLength = lstrlenA(lpsz);

@@ -142,8 +142,9 @@ TEST_P(OdbcFilters, WhatTheOutputWritesTheInputReadsBackExactly)
     for (Move m : std::vector<Move>{{3, true}, {1, true}, {4, true}, {0, true}, {5, false}, {-1, false}}) {
         SCOPED_TRACE(m.row);
         EXPECT_EQ(m.found, in.AbsoluteRow(m.row));
-        if (m.found)
+        if (m.found) {
             EXPECT_EQ(kRows[m.row], Current(in));
+        }
     }
     ASSERT_TRUE(in.AbsoluteRow(4));
     EXPECT_FALSE(in.NextRow());
