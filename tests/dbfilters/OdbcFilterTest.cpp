@@ -8,6 +8,8 @@
 #include <CQoInterActive.h>
 #include <CQoOutputFilterODBC.h>
 
+#include <DialogDriver.h>
+
 #include <fstream>
 #include <functional>
 #include <sstream>
@@ -203,6 +205,30 @@ TEST_P(OdbcFilters, EveryInitRecreatesTheTableAndUnusableSettingsLoseNothing)
     EXPECT_NE(std::string::npos, ErrorOf([&] { out.Init(); }).find("unbekannter Datentyp 7"));
     out.ReleaseDB();
     EXPECT_EQ(5, count());
+
+    // A name that needs quoting comes quoted from the host and is used as given.
+    const char* odd = "\"Kunden; M\xFCller's\"";
+    WriteRows(m_connect, odd);
+    CQoInputFilterODBC named(m_connect.c_str());
+    named.Init("");
+    named.InitTable(odd, CQoInputFilterDB::tableTable, true);
+    EXPECT_EQ(kRows, Walk(named));
+
+    // With errors shown, the data source's message is a message box, not an exception.
+    qotest::DialogDriver driver;
+    driver.Expect([](qotest::Dialog& d) {
+        std::string text = d.MessageText();
+        EXPECT_TRUE(text.find("syntax") != std::string::npos || text.find("drop") != std::string::npos) << text;
+        d.Press(IDOK);
+    });
+    CQoOutputFilterODBC shown;
+    shown.SetTableName("drop");   // a keyword: the create statement fails
+    shown.NumCols(1);
+    shown.SetShowError(true);
+    shown.UseDB(m_connect.c_str());
+    EXPECT_EQ("", ErrorOf([&] { EXPECT_TRUE(shown.Init()); }));
+    EXPECT_FALSE(shown.WriteRow()) << "no table, no row";
+    EXPECT_TRUE(driver.Done());
 
     // Before Init nothing is written.
     CQoOutputFilterODBC idle;
