@@ -8,6 +8,7 @@ PACKAGES="cmake make g++ clang libclang-rt-14-dev googletest libgtest-dev
   g++-mingw-w64-x86-64-posix binutils-mingw-w64-x86-64
   wine wine64 xvfb x11-utils xdotool imagemagick
   python3 python3-dbf python3-dbfread
+  zlib1g-dev libz-mingw-w64-dev python3-openpyxl python3-xlsxwriter python3-xlrd python3-xlwt
   unixodbc unixodbc-dev libsqliteodbc sqlite3 odbc-postgresql postgresql"
 missing=
 for p in $PACKAGES; do

@@ -1,0 +1,396 @@
+// The workbook reader on real files: workbooks written by python3-openpyxl
+// (inline strings) and python3-xlsxwriter (shared strings, rich text), in
+// both date systems, every cell checked against what openpyxl reads from the
+// same file (a chart sheet between them is no table); and damaged or foreign files, which must raise a clear error.
+#include "CQoException.h"
+#include "CQoXlsxReader.h"
+
+#include "PythonPeer.h"
+#include "TempFolder.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <cstdlib>
+#include <map>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace {
+
+using Cell = CQoXlsxReader::Cell;
+
+// Two sheets of the same content through either writer. The second sheet
+// starts at C3 and has a gap row, so its range does not start at A1.
+char const writeWorkbooks[] = R"(
+import datetime, openpyxl, xlsxwriter
+rows = [
+    ['Name', 'Betrag', 'Datum', 'Aktiv', 'Bemerkung'],
+    ['M\u00fcller & S\u00f6hne <GmbH>', 1234.5, datetime.datetime(2024, 2, 29, 12, 30), True, '  Leerzeichen  '],
+    ['\u00c4rger \u20ac \u201ezitiert\u201c', -0.125, datetime.date(1900, 1, 1), False, 'Zeile 1\nZeile 2'],
+    [None, 1e20, datetime.datetime(1999, 12, 31, 23, 59, 59), None, 'Griechisch \u03a9 und \u4e2d'],
+    [],
+    ['nach der L\u00fccke', 7, None, True, None],
+]
+other = [['x', 'y'], [1, None], [None, 'z\u00df']]
+for epoch in (1900, 1904):
+    wb = openpyxl.Workbook()
+    if epoch == 1904:
+        wb.epoch = openpyxl.utils.datetime.CALENDAR_MAC_1904
+    ws = wb.active
+    ws.title = 'Tabelle1'
+    for r, row in enumerate(rows, 1):
+        for c, v in enumerate(row, 1):
+            if v is not None:
+                ws.cell(r, c, v)
+                if isinstance(v, (datetime.date, datetime.datetime)):
+                    ws.cell(r, c).number_format = 'DD.MM.YYYY hh:mm:ss'
+    ws2 = wb.create_sheet('Gr\u00fc\u00dfe')
+    for r, row in enumerate(other, 3):
+        for c, v in enumerate(row, 3):
+            if v is not None:
+                ws2.cell(r + (1 if r > 3 else 0), c, v)
+    wb.save(os.path.join(folder, 'openpyxl%d.xlsx' % epoch))
+
+    wb = xlsxwriter.Workbook(os.path.join(folder, 'xlsxwriter%d.xlsx' % epoch), {'date_1904': epoch == 1904})
+    ws = wb.add_worksheet('Tabelle1')
+    datefmt = wb.add_format({'num_format': 'dd/mm/yy hh:mm'})
+    bold = wb.add_format({'bold': True})
+    for r, row in enumerate(rows):
+        for c, v in enumerate(row):
+            if isinstance(v, (datetime.date, datetime.datetime)):
+                ws.write_datetime(r, c, v, datefmt)
+            elif v is not None:
+                ws.write(r, c, v)
+    ws.write_rich_string(len(rows), 0, 'reich ', bold, 'formatiert', ' \u00e4')
+    ws.write_blank(len(rows) + 3, 8, None, bold)
+    chart = wb.add_chart({'type': 'line'})
+    chart.add_series({'values': "='Tabelle1'!$B$2:$B$4"})
+    wb.add_chartsheet('Diagramm').set_chart(chart)
+    ws2 = wb.add_worksheet('Gr\u00fc\u00dfe')
+    for r, row in enumerate(other, 2):
+        for c, v in enumerate(row, 2):
+            if v is not None:
+                ws2.write(r + (1 if r > 2 else 0), c, v)
+    wb.close()
+)";
+
+// What openpyxl reads: per sheet its name, then every cell holding a value
+// as row, column, kind and value (text as Windows-1252 bytes in hex).
+char const readWorkbooks[] = R"(
+import datetime, openpyxl
+from openpyxl.utils.datetime import to_excel
+for name in ('openpyxl1900', 'openpyxl1904', 'xlsxwriter1900', 'xlsxwriter1904'):
+    wb = openpyxl.load_workbook(os.path.join(folder, name + '.xlsx'))
+    out = []
+    for ws in wb.worksheets:
+        out.append('sheet\t' + ws.title.encode('cp1252', 'replace').hex())
+        for row in ws.iter_rows():
+            for cell in row:
+                v = cell.value
+                if v is None:
+                    continue
+                if isinstance(v, bool):
+                    kind, text = 'b', str(int(v))
+                elif isinstance(v, (int, float)):
+                    kind, text = 'n', repr(float(v))
+                elif isinstance(v, (datetime.datetime, datetime.date, datetime.time)):
+                    kind, text = 'd', repr(float(to_excel(v)))
+                elif cell.data_type == 'e':
+                    kind, text = 'e', v.encode('cp1252', 'replace').hex()
+                else:
+                    kind, text = 's', str(v).encode('cp1252', 'replace').hex()
+                out.append('%d\t%d\t%s\t%s' % (cell.row, cell.column, kind, text))
+    open(os.path.join(folder, name + '.peer'), 'w').write('\n'.join(out))
+)";
+
+std::string FromHex(std::string const &hex)
+{
+    std::string bytes;
+    for (std::size_t i = 0; i + 1 < hex.size(); i += 2)
+        bytes += char(std::strtol(hex.substr(i, 2).c_str(), nullptr, 16));
+    return bytes;
+}
+
+std::vector<std::string> Split(std::string const &line)
+{
+    std::vector<std::string> parts;
+    std::size_t start = 0;
+    for (std::size_t tab; (tab = line.find('\t', start)) != std::string::npos; start = tab + 1)
+        parts.push_back(line.substr(start, tab - start));
+    parts.push_back(line.substr(start));
+    return parts;
+}
+
+struct PeerSheet {
+    std::string name;
+    std::map<std::pair<long, int>, std::pair<int, std::string>> cells;   // (row, col) -> (kind, value)
+};
+
+std::vector<PeerSheet> ReadPeer(std::string const &path)
+{
+    std::vector<PeerSheet> sheets;
+    for (std::string const &line : ReadPeerLines(path)) {
+        std::vector<std::string> p = Split(line);
+        if (p[0] == "sheet") {
+            sheets.push_back(PeerSheet{FromHex(p[1]), {}});
+            continue;
+        }
+        int kind = p[2] == "b" ? Cell::typeBoolean : p[2] == "n" ? Cell::typeNumber
+                 : p[2] == "d" ? Cell::typeDate : p[2] == "e" ? Cell::typeError : Cell::typeText;
+        std::string value = kind == Cell::typeText || kind == Cell::typeError ? FromHex(p[3]) : p[3];
+        sheets.back().cells[{std::atol(p[0].c_str()), std::atoi(p[1].c_str())}] = {kind, value};
+    }
+    return sheets;
+}
+
+class XlsxPeer : public ::testing::Test {
+protected:
+    static void SetUpTestSuite()
+    {
+        s_folder = new PeerFolder;
+        s_ready = s_folder->Usable() && RunPython(*s_folder, "write", writeWorkbooks) &&
+                  RunPython(*s_folder, "read", readWorkbooks);
+    }
+    static void TearDownTestSuite()
+    {
+        delete s_folder;
+        s_folder = nullptr;
+    }
+    static PeerFolder *s_folder;
+    static bool s_ready;
+};
+PeerFolder *XlsxPeer::s_folder = nullptr;
+bool XlsxPeer::s_ready = false;
+
+TEST_F(XlsxPeer, EveryCellReadsAsOpenpyxlReadsIt)
+{
+    if (!s_ready)
+        PEER_UNAVAILABLE();
+    for (char const *name : {"openpyxl1900", "openpyxl1904", "xlsxwriter1900", "xlsxwriter1904"}) {
+        SCOPED_TRACE(name);
+        std::vector<PeerSheet> peer = ReadPeer(s_folder->Path((std::string(name) + ".peer").c_str()));
+        CQoXlsxReader reader;
+        reader.Open(s_folder->Path((std::string(name) + ".xlsx").c_str()).c_str());
+        EXPECT_EQ(std::string(name).find("1904") != std::string::npos, reader.Date1904());
+        ASSERT_EQ(int(peer.size()), reader.SheetCount());
+        for (int sheet = 0; sheet < reader.SheetCount(); ++sheet) {
+            PeerSheet const &expected = peer[std::size_t(sheet)];
+            SCOPED_TRACE(expected.name);
+            EXPECT_EQ(expected.name, reader.SheetName(sheet).Str());
+            long top = 1 << 30, bottom = 0;
+            int left = 1 << 30, right = 0;
+            for (auto const &c : expected.cells) {
+                top = std::min(top, c.first.first);
+                bottom = std::max(bottom, c.first.first);
+                left = std::min(left, c.first.second);
+                right = std::max(right, c.first.second);
+            }
+            reader.OpenSheet(sheet);
+            ASSERT_EQ(right - left + 1, reader.ColumnCount());
+            ASSERT_EQ(bottom - top + 1, reader.RowCount());
+            EXPECT_EQ(top, reader.FirstRowNumber());
+            EXPECT_EQ(left, reader.FirstColumnNumber());
+            std::vector<Cell> row;
+            long r = top;
+            std::size_t matched = 0;
+            for (; reader.NextRow(row); ++r) {
+                ASSERT_EQ(std::size_t(reader.ColumnCount()), row.size());
+                for (int c = 0; c < int(row.size()); ++c) {
+                    SCOPED_TRACE("row " + std::to_string(r) + " column " + std::to_string(left + c));
+                    auto found = expected.cells.find({r, left + c});
+                    Cell const &got = row[std::size_t(c)];
+                    if (found == expected.cells.end()) {
+                        EXPECT_EQ(Cell::typeEmpty, got.type);
+                        continue;
+                    }
+                    ++matched;
+                    int kind = found->second.first;
+                    std::string const &value = found->second.second;
+                    ASSERT_EQ(kind, got.type);
+                    if (kind == Cell::typeText || kind == Cell::typeError)
+                        EXPECT_EQ(value, got.text.Str());
+                    else if (kind == Cell::typeDate)   // openpyxl rounds to microseconds
+                        EXPECT_NEAR(std::strtod(value.c_str(), nullptr), got.number, 1e-6);
+                    else
+                        EXPECT_EQ(std::strtod(value.c_str(), nullptr), got.number);
+                }
+            }
+            EXPECT_EQ(bottom + 1, r);
+            EXPECT_EQ(expected.cells.size(), matched);
+        }
+    }
+}
+
+TEST_F(XlsxPeer, SheetsAreFoundAsTheDatabaseEngineNamesThem)
+{
+    if (!s_ready)
+        PEER_UNAVAILABLE();
+    CQoXlsxReader reader;
+    reader.Open(s_folder->Path("xlsxwriter1900.xlsx").c_str());
+    struct {
+        char const *name;
+        int index;
+    } const cases[] = {
+        {"Tabelle1", 0}, {"Tabelle1$", 0}, {"TABELLE1$", 0}, {"gr\374\337e$", 1}, {"GR\334\337E", 1},
+        {"Tabelle1$$", -1}, {"Tabelle", -1}, {"", -1},
+    };
+    for (auto const &c : cases)
+        EXPECT_EQ(c.index, reader.FindSheet(c.name)) << c.name;
+}
+
+TEST_F(XlsxPeer, RewindReadsTheSameRowsAgain)
+{
+    if (!s_ready)
+        PEER_UNAVAILABLE();
+    CQoXlsxReader reader;
+    reader.Open(s_folder->Path("openpyxl1900.xlsx").c_str());
+    reader.OpenSheet(0);
+    std::vector<std::vector<std::string>> first, second;
+    std::vector<Cell> row;
+    auto text = [](std::vector<Cell> const &cells) {
+        std::vector<std::string> out;
+        for (Cell const &c : cells)
+            out.push_back(std::to_string(c.type) + ":" + std::to_string(c.number) + ":" + c.text.Str());
+        return out;
+    };
+    for (int i = 0; i < 3 && reader.NextRow(row); ++i)
+        first.push_back(text(row));
+    EXPECT_EQ(6, reader.RowCount());   // does not move the reading
+    while (reader.NextRow(row))
+        first.push_back(text(row));
+    reader.RewindSheet();
+    while (reader.NextRow(row))
+        second.push_back(text(row));
+    EXPECT_EQ(6u, first.size());
+    EXPECT_EQ(first, second);
+}
+
+// Damaged and foreign files: each raises CQoException with a German text
+// that says what is wrong and names the file.
+char const writeFaults[] = R"(
+import io, zipfile, xlwt, openpyxl
+wb = openpyxl.Workbook()
+ws = wb.active
+for r in range(1, 200):
+    ws.append(['Zeile %d' % r, r * 1.5, 'Text %d' % (r * 7)])
+good = os.path.join(folder, 'good.xlsx')
+wb.save(good)
+data = open(good, 'rb').read()
+open(os.path.join(folder, 'truncated.xlsx'), 'wb').write(data[:len(data) // 2])
+
+def rewrite(name, change, compression=zipfile.ZIP_DEFLATED):
+    src = zipfile.ZipFile(good)
+    buf = io.BytesIO()
+    with zipfile.ZipFile(buf, 'w', compression) as out:
+        for info in src.infolist():
+            body = change(info.filename, src.read(info.filename))
+            if body is not None:
+                out.writestr(info.filename, body)
+    open(os.path.join(folder, name), 'wb').write(buf.getvalue())
+
+rewrite('noworkbook.xlsx', lambda n, b: None if n in ('xl/workbook.xml', '[Content_Types].xml') else b)
+rewrite('badxml.xlsx', lambda n, b: b[:len(b) // 2] if n == 'xl/worksheets/sheet1.xml' else b)
+rewrite('stored.xlsx', lambda n, b: b, zipfile.ZIP_STORED)
+
+def member(path, name):
+    z = zipfile.ZipFile(path)
+    info = z.getinfo(name)
+    raw = open(path, 'rb').read()
+    start = info.header_offset + 30 + int.from_bytes(raw[info.header_offset + 26:info.header_offset + 28], 'little') \
+        + int.from_bytes(raw[info.header_offset + 28:info.header_offset + 30], 'little')
+    return bytearray(raw), info.header_offset, start, info.compress_size
+
+raw, header, start, size = member(good, 'xl/worksheets/sheet1.xml')
+for i in range(start + size // 3, start + size // 3 + 40):
+    raw[i] ^= 0x5A
+open(os.path.join(folder, 'deflate.xlsx'), 'wb').write(bytes(raw))
+
+raw, header, start, size = member(os.path.join(folder, 'stored.xlsx'), 'xl/worksheets/sheet1.xml')
+raw[start + size // 2] ^= 0x01
+open(os.path.join(folder, 'crc.xlsx'), 'wb').write(bytes(raw))
+
+raw, header, start, size = member(good, 'xl/worksheets/sheet1.xml')
+raw[header + 14:header + 26] = bytes(12)
+open(os.path.join(folder, 'zerolocal.xlsx'), 'wb').write(bytes(raw))
+
+book = xlwt.Workbook()
+book.add_sheet('Tabelle1').write(0, 0, 'alt')
+book.save(os.path.join(folder, 'old.xls'))
+)";
+
+TEST(XlsxFaults, DamagedAndForeignFilesRaiseAClearError)
+{
+    PeerFolder folder;
+    if (!folder.Usable() || !RunPython(folder, "faults", writeFaults))
+        PEER_UNAVAILABLE();
+    // A password-protected workbook: an OLE compound file whose directory
+    // names the stream EncryptedPackage.
+    std::string ole("\xD0\xCF\x11\xE0\xA1\xB1\x1A\xE1", 8);
+    ole.resize(1024, '\0');
+    for (char c : std::string("EncryptedPackage"))
+        ole += std::string(1, c) + '\0';
+    ole.resize(2048, '\0');
+    WriteBytes(folder.Path("protected.xlsx"), ole);
+    WriteBytes(folder.Path("text.xlsx"), "Name;Betrag\nM\374ller;12\n");
+
+    struct {
+        char const *file;
+        bool atOpen;        // else when the first sheet is read
+        char const *says;
+    } const cases[] = {
+        {"missing.xlsx", true, "nicht gefunden"},
+        {"text.xlsx", true, "keine Excel-Arbeitsmappe"},
+        {"truncated.xlsx", true, "besch\344digt"},
+        {"noworkbook.xlsx", true, "keine Excel-Arbeitsmappe"},
+        {"old.xls", true, "im alten Excel-Format (.xls)"},
+        {"protected.xlsx", true, "Kennwortschutz in Excel entfernen"},
+        {"badxml.xlsx", false, "besch\344digt"},
+        {"deflate.xlsx", false, "besch\344digt"},
+        {"crc.xlsx", false, "Pr\374fsumme"},
+    };
+    for (auto const &c : cases) {
+        SCOPED_TRACE(c.file);
+        std::string path = folder.Path(c.file);
+        CQoXlsxReader reader;
+        try {
+            reader.Open(path.c_str());
+            ASSERT_FALSE(c.atOpen) << "opened";
+            reader.OpenSheet(0);
+            std::vector<Cell> row;
+            while (reader.NextRow(row)) {
+            }
+            ADD_FAILURE() << "read without error";
+        } catch (CQoException const &e) {
+            EXPECT_NE(std::string::npos, std::string(e.Message()).find(c.says)) << e.Message();
+            EXPECT_NE(std::string::npos, std::string(e.Message()).find(path)) << e.Message();
+        }
+        if (c.atOpen)
+            EXPECT_FALSE(reader.IsOpen());
+    }
+}
+
+TEST(XlsxFaults, SizesComeFromTheCentralDirectory)
+{
+    PeerFolder folder;
+    if (!folder.Usable() || !RunPython(folder, "faults", writeFaults))
+        PEER_UNAVAILABLE();
+    // Stored members and a local header whose CRC and sizes are 0 read as the original.
+    std::vector<std::vector<std::string>> rows[3];
+    char const *files[3] = {"good.xlsx", "stored.xlsx", "zerolocal.xlsx"};
+    for (int f = 0; f < 3; ++f) {
+        CQoXlsxReader reader;
+        reader.Open(folder.Path(files[f]).c_str());
+        reader.OpenSheet(0);
+        std::vector<Cell> row;
+        while (reader.NextRow(row))
+            rows[f].push_back({row[0].text.Str(), std::to_string(row[1].number), row[2].text.Str()});
+    }
+    ASSERT_EQ(199u, rows[0].size());
+    EXPECT_EQ((std::vector<std::string>{"Zeile 199", std::to_string(298.5), "Text 1393"}), rows[0].back());
+    EXPECT_EQ(rows[0], rows[1]);
+    EXPECT_EQ(rows[0], rows[2]);
+}
+
+} // namespace
