@@ -7,7 +7,9 @@
 // as cells typed as the workbook stores them: numbers, text converted to
 // Windows-1252 ('?' for characters it lacks), booleans, dates as Excel serial
 // numbers (1900 system; a 1904 workbook's dates are moved onto it) and error
-// values such as "#DIV/0!".
+// values such as "#DIV/0!". A formula cell gives the result Excel stored
+// with it (none: empty); characters Excel writes as _xHHHH_ come back as
+// themselves.
 //
 // The table of a sheet is its used range: from the first to the last row and
 // from the first to the last column that hold a value. Rows come back densely
@@ -15,10 +17,16 @@
 // ColumnCount cells wide. Cells that carry only formatting are empty and do
 // not widen the range.
 //
-// Memory: the shared strings of the workbook (Windows-1252) and the inflated
-// XML of the open sheet are held; one zip member may inflate to at most 1 GiB.
-// OpenSheet reads the sheet once to find its range, so ColumnCount and
-// RowCount are known before the first row.
+// Memory: the shared strings of the workbook (in Windows-1252) and the
+// inflated XML of the open sheet are held, nothing else of the file. Bounds,
+// each checked before it sizes anything: at most 100,000 zip members; a
+// member inflates to at most 1 GiB and to at most 200 times its compressed
+// size plus 1 MiB (real sheets compress 10 to 15 times; more is a zip bomb);
+// at most 16,777,216 shared strings and 65,536 cell or number formats;
+// rows 1..1,048,576 and columns A..XFD as in Excel. OpenSheet reads the sheet
+// once to find its range, so ColumnCount and RowCount are known before the
+// first row. A row holds ColumnCount cells: a sheet with values in A1 and
+// XFD1048576 is a table of a million rows of 16,384 cells, read one at a time.
 //
 // Failures of the file (missing, not a workbook, an old .xls, password
 // protection, damaged zip or XML, sizes beyond the bounds) raise CQoException

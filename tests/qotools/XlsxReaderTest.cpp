@@ -74,6 +74,17 @@ for epoch in (1900, 1904):
             if v is not None:
                 ws2.write(r + (1 if r > 2 else 0), c, v)
     wb.close()
+
+# Texts as Excel escapes them (_xHHHH_), in shared and in inline strings; the
+# writer's own input is the expected value.
+escapes = ['_x0041_ w\u00f6rtlich', 'a\x01b', 'Zeile\r\nZwei', 'Tab\tEnde', '_x005F_', '\u20ac_x20AC_']
+for name, options in (('escapes_shared', {}), ('escapes_inline', {'constant_memory': True})):
+    wb = xlsxwriter.Workbook(os.path.join(folder, name + '.xlsx'), options)
+    ws = wb.add_worksheet()
+    for r, text in enumerate(escapes):
+        ws.write_string(r, 0, text)
+    wb.close()
+open(os.path.join(folder, 'escapes.expected'), 'w').write('\n'.join(t.encode('cp1252', 'replace').hex() for t in escapes))
 )";
 
 // What openpyxl reads: per sheet its name, then every cell holding a value
@@ -267,6 +278,123 @@ TEST_F(XlsxPeer, RewindReadsTheSameRowsAgain)
     EXPECT_EQ(first, second);
 }
 
+TEST_F(XlsxPeer, EscapedCharactersReadAsWritten)
+{
+    if (!s_ready)
+        PEER_UNAVAILABLE();
+    std::vector<std::string> expected;
+    for (std::string const &line : ReadPeerLines(s_folder->Path("escapes.expected")))
+        expected.push_back(FromHex(line));
+    for (char const *name : {"escapes_shared.xlsx", "escapes_inline.xlsx"}) {
+        SCOPED_TRACE(name);
+        CQoXlsxReader reader;
+        reader.Open(s_folder->Path(name).c_str());
+        reader.OpenSheet(0);
+        std::vector<std::string> got;
+        std::vector<Cell> row;
+        while (reader.NextRow(row))
+            got.push_back(row.at(0).text.Str());
+        EXPECT_EQ(expected, got);
+    }
+}
+
+// A workbook written part by part (Python's zipfile as the container):
+// namespace prefixes, rows and cells without numbers, every cell type,
+// rich text with a phonetic guide, entities, custom number formats, an
+// unknown style index, absolute and relative part targets, an empty sheet.
+char const writeHandMade[] = R"(
+import zipfile
+ns = 'xmlns="http://schemas.openxmlformats.org/spreadsheetml/2006/main" '
+rel = 'http://schemas.openxmlformats.org/officeDocument/2006/relationships'
+parts = {
+ '[Content_Types].xml': '<Types xmlns="http://schemas.openxmlformats.org/package/2006/content-types">'
+   '<Override PartName="/xl/workbook.xml" ContentType="application/vnd.openxmlformats-officedocument.spreadsheetml.sheet.main+xml"/></Types>',
+ 'xl/workbook.xml': '<workbook ' + ns + 'xmlns:r="' + rel + '"><sheets>'
+   '<sheet name="Daten &amp; mehr" sheetId="1" r:id="rId1"/><sheet name="Leer" sheetId="2" r:id="rId2"/></sheets></workbook>',
+ 'xl/_rels/workbook.xml.rels': '<Relationships xmlns="http://schemas.openxmlformats.org/package/2006/relationships">'
+   '<Relationship Id="rId1" Type="' + rel + '/worksheet" Target="/xl/worksheets/a.xml"/>'
+   '<Relationship Id="rId2" Type="' + rel + '/worksheet" Target="worksheets/../worksheets/b.xml"/>'
+   '<Relationship Id="rId3" Type="' + rel + '/sharedStrings" Target="sharedStrings.xml"/>'
+   '<Relationship Id="rId4" Type="' + rel + '/styles" Target="styles.xml"/></Relationships>',
+ 'xl/sharedStrings.xml': '<sst ' + ns + 'count="1"><si><r><t>Kurs</t></r><r><rPr><b/></rPr>'
+   '<t xml:space="preserve"> &#x20AC;&#8364;&apos;</t></r><rPh sb="0" eb="1"><t>\u3075\u308a</t></rPh></si></sst>',
+ 'xl/styles.xml': '<styleSheet ' + ns + '><numFmts count="3">'
+   '<numFmt numFmtId="164" formatCode="&quot;Jahr &quot;0"/><numFmt numFmtId="165" formatCode="[Red]0.00"/>'
+   '<numFmt numFmtId="166" formatCode="[h]:mm"/></numFmts><cellXfs count="5"><xf numFmtId="0"/>'
+   '<xf numFmtId="14"/><xf numFmtId="164"/><xf numFmtId="166"/><xf numFmtId="165"/></cellXfs></styleSheet>',
+ 'xl/worksheets/a.xml': '<?xml version="1.0" encoding="UTF-8"?><!-- von Hand -->'
+   '<x:worksheet xmlns:x="http://schemas.openxmlformats.org/spreadsheetml/2006/main"><x:sheetData>'
+   '<x:row><x:c><x:v>1</x:v></x:c><x:c t="str"><x:f>A1</x:f><x:v>Formel &amp; Text</x:v></x:c></x:row>'
+   '<x:row><x:c r="B3" t="e"><x:v>#DIV/0!</x:v></x:c></x:row>'
+   '<x:row><x:c t="b"><x:v>1</x:v></x:c><x:c s="1"/><x:c t="d"><x:v>2026-12-06T12:00:00</x:v></x:c></x:row>'
+   '<x:row r="6"><x:c r="A6" t="s"><x:v>0</x:v></x:c><x:c r="C6" s="1"><x:v>45000.25</x:v></x:c>'
+   '<x:c r="D6" s="2"><x:v>3</x:v></x:c><x:c r="E6" s="3"><x:v>1.5</x:v></x:c>'
+   '<x:c r="F6" s="99"><x:v>7</x:v></x:c><x:c r="G6" s="4"><x:v>2</x:v></x:c></x:row>'
+   '</x:sheetData></x:worksheet>',
+ 'xl/worksheets/b.xml': '<worksheet ' + ns + '><sheetData/></worksheet>',
+}
+with zipfile.ZipFile(os.path.join(folder, 'handmade.xlsx'), 'w', zipfile.ZIP_DEFLATED) as z:
+    for name, text in parts.items():
+        z.writestr(name, text.encode('utf-8'))
+)";
+
+TEST(XlsxHandMade, EveryCellKindAndLayoutReads)
+{
+    PeerFolder folder;
+    if (!folder.Usable() || !RunPython(folder, "handmade", writeHandMade))
+        PEER_UNAVAILABLE();
+    CQoXlsxReader reader;
+    reader.Open(folder.Path("handmade.xlsx").c_str());
+    ASSERT_EQ(2, reader.SheetCount());
+    EXPECT_EQ("Daten & mehr", reader.SheetName(0).Str());
+    EXPECT_EQ(1, reader.FindSheet("LEER$"));
+
+    struct Expected {
+        long row;
+        int column;
+        int type;
+        double number;
+        char const *text;
+    } const cells[] = {
+        {1, 1, Cell::typeNumber, 1, ""},
+        {1, 2, Cell::typeText, 0, "Formel & Text"},
+        {3, 2, Cell::typeError, 0, "#DIV/0!"},
+        {4, 1, Cell::typeBoolean, 1, ""},
+        {4, 3, Cell::typeDate, 46362.5, ""},
+        {6, 1, Cell::typeText, 0, "Kurs \x80\x80'"},
+        {6, 3, Cell::typeDate, 45000.25, ""},   // built-in date format 14
+        {6, 4, Cell::typeNumber, 3, ""},        // "Jahr "0: the letters are quoted
+        {6, 5, Cell::typeDate, 1.5, ""},        // [h]:mm, elapsed time
+        {6, 6, Cell::typeNumber, 7, ""},        // unknown style: General
+        {6, 7, Cell::typeNumber, 2, ""},        // [Red]0.00: a colour, no date
+    };
+    reader.OpenSheet(0);
+    ASSERT_EQ(7, reader.ColumnCount());
+    ASSERT_EQ(6, reader.RowCount());
+    std::vector<std::vector<Cell>> rows;
+    std::vector<Cell> row;
+    while (reader.NextRow(row))
+        rows.push_back(row);
+    ASSERT_EQ(6u, rows.size());
+    std::size_t valued = 0;
+    for (auto const &r : rows)
+        for (Cell const &c : r)
+            valued += c.type != Cell::typeEmpty;
+    EXPECT_EQ(sizeof cells / sizeof *cells, valued);
+    for (Expected const &e : cells) {
+        SCOPED_TRACE(std::to_string(e.row) + "/" + std::to_string(e.column));
+        Cell const &c = rows[std::size_t(e.row - 1)][std::size_t(e.column - 1)];
+        EXPECT_EQ(e.type, c.type);
+        EXPECT_DOUBLE_EQ(e.number, c.number);
+        EXPECT_EQ(std::string(e.text), c.text.Str());
+    }
+
+    reader.OpenSheet(1);
+    EXPECT_EQ(0, reader.ColumnCount());
+    EXPECT_EQ(0, reader.RowCount());
+    EXPECT_FALSE(reader.NextRow(row));
+}
+
 // Damaged and foreign files: each raises CQoException with a German text
 // that says what is wrong and names the file.
 char const writeFaults[] = R"(
@@ -315,6 +443,19 @@ raw, header, start, size = member(good, 'xl/worksheets/sheet1.xml')
 raw[header + 14:header + 26] = bytes(12)
 open(os.path.join(folder, 'zerolocal.xlsx'), 'wb').write(bytes(raw))
 
+def declare(name, size):
+    raw = bytearray(data)
+    pos = raw.find(b'PK\x01\x02')
+    while pos >= 0:
+        n = int.from_bytes(raw[pos + 28:pos + 30], 'little')
+        if raw[pos + 46:pos + 46 + n] == b'xl/worksheets/sheet1.xml':
+            raw[pos + 24:pos + 28] = size(int.from_bytes(raw[pos + 20:pos + 24], 'little')).to_bytes(4, 'little')
+        pos = raw.find(b'PK\x01\x02', pos + 4)
+    open(os.path.join(folder, name), 'wb').write(bytes(raw))
+
+declare('huge.xlsx', lambda packed: 0x7FFFFFFF)
+declare('bomb.xlsx', lambda packed: packed * 300 + (2 << 20))
+
 book = xlwt.Workbook()
 book.add_sheet('Tabelle1').write(0, 0, 'alt')
 book.save(os.path.join(folder, 'old.xls'))
@@ -349,6 +490,8 @@ TEST(XlsxFaults, DamagedAndForeignFilesRaiseAClearError)
         {"badxml.xlsx", false, "besch\344digt"},
         {"deflate.xlsx", false, "besch\344digt"},
         {"crc.xlsx", false, "Pr\374fsumme"},
+        {"huge.xlsx", false, "gr\366\337er als 1 GB"},
+        {"bomb.xlsx", false, "ungew\366hnlich stark komprimiert"},
     };
     for (auto const &c : cases) {
         SCOPED_TRACE(c.file);
@@ -366,8 +509,9 @@ TEST(XlsxFaults, DamagedAndForeignFilesRaiseAClearError)
             EXPECT_NE(std::string::npos, std::string(e.Message()).find(c.says)) << e.Message();
             EXPECT_NE(std::string::npos, std::string(e.Message()).find(path)) << e.Message();
         }
-        if (c.atOpen)
+        if (c.atOpen) {
             EXPECT_FALSE(reader.IsOpen());
+        }
     }
 }
 

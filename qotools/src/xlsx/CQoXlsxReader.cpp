@@ -5,6 +5,7 @@
 #include "QoZipArchive.h"
 
 #include <charconv>
+#include <cstdint>
 #include <cmath>
 #include <map>
 
@@ -15,6 +16,12 @@ constexpr long maxRow = 1048576;
 constexpr int maxColumn = 16384;
 // Days between the 1904 and the 1900 date systems.
 constexpr double days1904 = 1462;
+// Shared strings of a workbook (4 bytes of index each, besides the text) and
+// entries of its style tables: far more than Excel itself writes (it stops
+// at 64,000 cell formats), few enough that a crafted part cannot make the
+// tables outgrow the part.
+constexpr std::size_t maxSharedStrings = 1u << 24;
+constexpr std::size_t maxStyles = 1u << 16;
 
 bool EndsWith(std::string_view text, std::string_view tail)
 {
@@ -201,6 +208,39 @@ bool ParseReference(std::string_view ref, int &column, long &row)
     return true;
 }
 
+// Text of a cell as Excel stores it: characters XML cannot carry are
+// written as _xHHHH_ (and a literal "_x" sequence as _x005F_x...).
+void Unescape(std::string &text)
+{
+    std::size_t at = text.find("_x");
+    if (at == std::string::npos)
+        return;
+    std::string out(text, 0, at);
+    auto hex = [](char c) {
+        return c >= '0' && c <= '9' ? c - '0' : c >= 'a' && c <= 'f' ? c - 'a' + 10 : c >= 'A' && c <= 'F' ? c - 'A' + 10 : -1;
+    };
+    while (at < text.size()) {
+        if (text.compare(at, 2, "_x") == 0 && at + 7 <= text.size() && text[at + 6] == '_') {
+            int value = 0;
+            bool good = true;
+            for (std::size_t k = at + 2; k < at + 6; ++k) {
+                int digit = hex(text[k]);
+                good = good && digit >= 0;
+                value = value * 16 + digit;
+            }
+            if (good) {
+                std::string utf8;
+                QoXmlScanner::Decode("&#" + std::to_string(value) + ";", utf8);
+                out += utf8;
+                at += 7;
+                continue;
+            }
+        }
+        out += text[at++];
+    }
+    text.swap(out);
+}
+
 std::string ColumnName(int column)
 {
     std::string name;
@@ -222,7 +262,8 @@ struct CQoXlsxReader::Impl {
     bool open = false;
     bool date1904 = false;
     std::vector<Sheet> sheets;
-    std::vector<std::string> shared;   // Windows-1252
+    std::string sharedText;            // Windows-1252, one after the other
+    std::vector<std::uint32_t> sharedEnd;   // end of each shared string in sharedText
     std::vector<char> xfIsDate;
 
     // The open sheet.
@@ -247,9 +288,10 @@ struct CQoXlsxReader::Impl {
     void LoadWorkbook();
     void LoadSharedStrings(std::string const &part);
     void LoadStyles(std::string const &part);
+    void AddShared(std::string &utf8Text, QoXmlScanner const &s);
     void StartSheet();
     bool ReadRawRow();
-    void ReadCell(long row, int &previousColumn);
+    void ReadCell(long &row, bool &rowKnown, int &previousColumn);
     void CollectText(char const *endName);
 };
 
@@ -346,7 +388,7 @@ void CQoXlsxReader::Impl::LoadSharedStrings(std::string const &part)
                 text.clear();
                 inItem = !s.Empty();
                 if (!inItem)
-                    shared.emplace_back();
+                    AddShared(text, s);
             } else if (s.Name() == "rPh" || s.Name() == "phoneticPr") {
                 // Phonetic guides repeat the reading of East Asian text; they are not part of the value.
                 s.SkipElement();
@@ -359,9 +401,19 @@ void CQoXlsxReader::Impl::LoadSharedStrings(std::string const &part)
             }
         } else if (k == QoXmlScanner::endTag && s.Name() == "si") {
             inItem = false;
-            shared.push_back(Ansi(text));
+            AddShared(text, s);
         }
     }
+}
+
+void CQoXlsxReader::Impl::AddShared(std::string &utf8Text, QoXmlScanner const &s)
+{
+    if (sharedEnd.size() >= maxSharedStrings)
+        s.Fail("mehr als 16777216 gemeinsame Texte");
+    Unescape(utf8Text);
+    QoAppendUtf8AsAnsi(utf8Text, sharedText);
+    // The part is at most 1 GiB and its text only shrinks on the way to Windows-1252.
+    sharedEnd.push_back(std::uint32_t(sharedText.size()));
 }
 
 void CQoXlsxReader::Impl::LoadStyles(std::string const &part)
@@ -377,6 +429,8 @@ void CQoXlsxReader::Impl::LoadStyles(std::string const &part)
             if (s.Name() == "numFmt") {
                 std::string_view code;
                 long id = 0;
+                if (custom.size() >= maxStyles)
+                    s.Fail("mehr als 65536 Zahlenformate");
                 if (s.Attribute("numFmtId", value) && ParseLong(value, id) && s.Attribute("formatCode", code))
                     custom[id] = IsDateFormat(Decoded(code));
             } else if (s.Name() == "cellXfs") {
@@ -385,6 +439,8 @@ void CQoXlsxReader::Impl::LoadStyles(std::string const &part)
                 long id = 0;
                 if (s.Attribute("numFmtId", value) && !ParseLong(value, id))
                     id = 0;
+                if (formats.size() >= maxStyles)
+                    s.Fail("mehr als 65536 Zellformate");
                 formats.push_back(id);
             }
         } else if (k == QoXmlScanner::endTag && s.Name() == "cellXfs") {
@@ -438,7 +494,9 @@ void CQoXlsxReader::Impl::CollectText(char const *endName)
     }
 }
 
-void CQoXlsxReader::Impl::ReadCell(long row, int &previousColumn)
+// A row without a number takes it from its first cell reference, else it
+// follows the row before.
+void CQoXlsxReader::Impl::ReadCell(long &row, bool &rowKnown, int &previousColumn)
 {
     QoXmlScanner &s = *scan;
     std::string_view value;
@@ -447,9 +505,15 @@ void CQoXlsxReader::Impl::ReadCell(long row, int &previousColumn)
         long cellRow = 0;
         if (!ParseReference(value, column, cellRow))
             s.Fail(("ung\374ltiger Zellbezug \"" + std::string(value) + "\"").c_str());
-        if (cellRow != row)
+        if (!rowKnown) {
+            if (cellRow <= parsedRow)
+                s.Fail(("Zeile " + std::to_string(cellRow) + " steht nicht in aufsteigender Reihenfolge").c_str());
+            row = cellRow;
+        } else if (cellRow != row) {
             s.Fail(("Zelle " + std::string(value) + " steht in Zeile " + std::to_string(row)).c_str());
+        }
     }
+    rowKnown = true;
     auto cellName = [&] { return ColumnName(column) + std::to_string(row); };
     if (column > maxColumn)
         s.Fail(("Zelle hinter Spalte XFD in Zeile " + std::to_string(row)).c_str());
@@ -519,10 +583,11 @@ void CQoXlsxReader::Impl::ReadCell(long row, int &previousColumn)
         }
     } else if (type == "s") {
         long index = 0;
-        if (!ParseLong(utf8, index) || index < 0 || index >= long(shared.size()))
+        if (!ParseLong(utf8, index) || index < 0 || index >= long(sharedEnd.size()))
             bad("Verweis auf einen nicht vorhandenen gemeinsamen Text");
         cell.type = Cell::typeText;
-        cell.text = shared[std::size_t(index)];
+        std::size_t begin = index == 0 ? 0 : sharedEnd[std::size_t(index) - 1];
+        cell.text.Assign(sharedText.data() + begin, sharedEnd[std::size_t(index)] - begin);
     } else if (type == "str") {
         cell.type = Cell::typeText;
     } else if (type == "b") {
@@ -541,6 +606,8 @@ void CQoXlsxReader::Impl::ReadCell(long row, int &previousColumn)
         s.Fail(("Zelle " + cellName() + ": unbekannter Zelltyp \"" + type + "\"").c_str());
     }
     if ((cell.type == Cell::typeText || cell.type == Cell::typeError) && type != "s") {
+        if (type == "inlineStr")
+            Unescape(utf8);
         std::string ansi;
         QoAppendUtf8AsAnsi(utf8, ansi);
         cell.text = CQoString(std::move(ansi));
@@ -566,13 +633,13 @@ bool CQoXlsxReader::Impl::ReadRawRow()
         }
         long row = parsedRow + 1;
         std::string_view value;
-        if (s.Attribute("r", value) && (!ParseLong(value, row) || row < 1 || row > maxRow))
+        bool rowKnown = s.Attribute("r", value);
+        if (rowKnown && (!ParseLong(value, row) || row < 1 || row > maxRow))
             s.Fail(("ung\374ltige Zeilennummer \"" + std::string(value) + "\"").c_str());
         if (row <= parsedRow)
             s.Fail(("Zeile " + std::to_string(row) + " steht nicht in aufsteigender Reihenfolge").c_str());
         if (row > maxRow)
             s.Fail("mehr als 1048576 Zeilen");
-        parsedRow = row;
         rawCount = 0;
         if (!s.Empty()) {
             int depth = s.Depth();
@@ -583,11 +650,12 @@ bool CQoXlsxReader::Impl::ReadRawRow()
                 if (c != QoXmlScanner::startTag)
                     continue;
                 if (s.Name() == "c")
-                    ReadCell(row, previousColumn);
+                    ReadCell(row, rowKnown, previousColumn);
                 else
                     s.SkipElement();
             }
         }
+        parsedRow = row;
         return true;
     }
     return false;

@@ -192,8 +192,11 @@ std::string QoZipArchive::Read(std::string const &name) const
         Fail(("unbekanntes Komprimierungsverfahren " + std::to_string(m.method) + what).c_str());
     if (m.size > maxMemberSize)
         Fail(("ein Teil ist entpackt gr\366\337er als 1 GB" + what).c_str());
-    if ((m.method == 0 && m.size != m.packed) || m.size > m.packed * maxRatio + 65536)
+    if (m.method == 0 && m.size != m.packed)
         Fail(("die angegebene Gr\366\337e eines Teils ist unm\366glich" + what).c_str());
+    if (m.size > m.packed * maxRatio + (1u << 20))
+        Fail(("ein Teil ist ungew\366hnlich stark komprimiert (mehr als 200:1), die Datei wird "
+              "nicht entpackt" + what).c_str());
 
     unsigned char local[30];
     ReadAt(m.localHeader, local, sizeof local);

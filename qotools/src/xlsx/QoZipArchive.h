@@ -8,10 +8,11 @@
 //
 // Bounds, each checked before it sizes or places anything: at most
 // maxMembers members, at most maxMemberSize bytes per inflated member, an
-// inflated size at most maxRatio times the compressed size (deflate cannot
-// do better than about 1032:1; a larger claim is a crafted file), every
-// offset and size inside the file. ZIP64 archives (members or archives past
-// 4 GiB) are refused.
+// inflated size at most maxRatio times the compressed size plus 1 MiB
+// (workbook XML compresses about 10 to 15 times, even a sheet of nothing but
+// zeros; a member claiming far more is a zip bomb), every offset and size
+// inside the file. A member never inflates past its stated size. ZIP64
+// archives (members or archives past 4 GiB) are refused.
 #pragma once
 
 #include <cstdint>
@@ -24,7 +25,7 @@ class QoZipArchive {
 public:
     static constexpr std::uint32_t maxMembers = 100000;
     static constexpr std::uint64_t maxMemberSize = 1u << 30;
-    static constexpr std::uint64_t maxRatio = 1100;
+    static constexpr std::uint64_t maxRatio = 200;
 
     QoZipArchive() = default;
     ~QoZipArchive();
