@@ -1,0 +1,161 @@
+// The engine's cursor: a statement read forward on a handle of its own, one
+// row held at a time. Text is read as UTF-16 and turned into Windows-1252, the
+// one form every driver here delivers correctly (MDBTools' narrow text is
+// UTF-8, SQLite's stored text is UTF-8 too).
+#include "dao_private.h"
+
+#include <limits.h>
+#include <string.h>
+
+namespace qodao {
+
+Cursor::Cursor(Engine& engine, const CString& strSQL) : m_engine(engine) {
+  m_sql = qodb::ToDriver(engine.db.GetTextForm(), strSQL);
+  if (m_sql.size() > (size_t)INT_MAX) Throw(3000, "Die SQL-Anweisung ist zu lang.");
+  Execute();
+}
+
+Cursor::~Cursor() { CDatabase::FreeStatement(m_hstmt); }
+
+void Cursor::Execute() {
+  Guard([&] {
+    CDatabase::FreeStatement(m_hstmt);
+    m_hstmt = SQL_NULL_HSTMT;
+    // A fresh handle for every run: MDBTools returns garbage on a reused one.
+    m_hstmt = m_engine.db.AllocStatement();
+    m_engine.db.Check(SQLExecDirect(m_hstmt, (SQLCHAR*)m_sql.data(), (SQLINTEGER)m_sql.size()), m_hstmt,
+                      "SQLExecDirect");
+    SQLSMALLINT nCols = 0;
+    m_engine.db.Check(SQLNumResultCols(m_hstmt, &nCols), m_hstmt, "SQLNumResultCols");
+    if (nCols < 0 || nCols > qodb::kMaxColumns) Throw(3000, "Der ODBC-Treiber meldet eine ungültige Spaltenzahl.");
+    if (m_columns.empty()) {
+      for (SQLSMALLINT i = 1; i <= nCols; ++i) {
+        SQLCHAR szName[512] = {0};
+        SQLSMALLINT nName = 0, nType = 0, nScale = 0, nNullable = 0;
+        SQLULEN nSize = 0;
+        m_engine.db.Check(SQLDescribeCol(m_hstmt, (SQLUSMALLINT)i, szName, (SQLSMALLINT)sizeof(szName), &nName, &nType,
+                                         &nSize, &nScale, &nNullable),
+                          m_hstmt, "SQLDescribeCol");
+        if (nName < 0 || nName >= (SQLSMALLINT)sizeof(szName)) nName = (SQLSMALLINT)strnlen((char*)szName, sizeof(szName) - 1);
+        Column column;
+        column.strName = qodb::FromDriver(m_engine.db.GetTextForm(), (const char*)szName, nName);
+        column.nSqlType = nType;
+        column.nPrecision = nSize;
+        column.nScale = nScale;
+        m_columns.push_back(column);
+      }
+    }
+    m_row.assign(m_columns.size(), Value());
+  });
+  m_lRow = -1;
+  m_bAtEnd = false;
+}
+
+void Cursor::Restart() { Execute(); }
+
+bool Cursor::Next() {
+  if (m_bAtEnd) return false;
+  return Guard([&] {
+    SQLRETURN rc = SQLFetch(m_hstmt);
+    if (rc == SQL_NO_DATA) {
+      m_bAtEnd = true;
+      ++m_lRow;   // stands after the last row
+      return false;
+    }
+    m_engine.db.Check(rc, m_hstmt, "SQLFetch");
+    ++m_lRow;
+    for (size_t i = 0; i < m_columns.size(); ++i) ReadValue((SQLUSMALLINT)(i + 1), m_row[i]);
+    return true;
+  });
+}
+
+void Cursor::ReadValue(SQLUSMALLINT nColumn, Value& value) {
+  SWORD nType = m_columns[nColumn - 1].nSqlType;
+  const bool bBinary = nType == SQL_BINARY || nType == SQL_VARBINARY || nType == SQL_LONGVARBINARY;
+  const SQLSMALLINT nCType = bBinary ? SQL_C_BINARY : SQL_C_WCHAR;
+  const SQLLEN nTerm = bBinary ? 0 : (SQLLEN)sizeof(WCHAR);
+  std::vector<char> buffer(4096);
+  std::string bytes;
+  value.bNull = false;
+  for (;;) {
+    SQLLEN nIndicator = 0;
+    SQLRETURN rc = SQLGetData(m_hstmt, nColumn, nCType, buffer.data(), (SQLLEN)buffer.size(), &nIndicator);
+    if (rc == SQL_NO_DATA) break;
+    m_engine.db.Check(rc, m_hstmt, "SQLGetData");
+    if (nIndicator == SQL_NULL_DATA) {
+      value.bNull = true;
+      value.bytes.clear();
+      return;
+    }
+    SQLLEN nRoom = (SQLLEN)buffer.size() - nTerm;
+    SQLLEN nPiece;
+    bool bMore = false;
+    if (nIndicator >= 0 && nIndicator <= nRoom) {
+      nPiece = nIndicator;
+    } else if (nIndicator == SQL_NO_TOTAL || (nIndicator > nRoom && rc == SQL_SUCCESS_WITH_INFO)) {
+      nPiece = nRoom;
+      bMore = rc == SQL_SUCCESS_WITH_INFO;
+      if (!bMore && !bBinary)
+        nPiece = (SQLLEN)(wcsnlen((const WCHAR*)buffer.data(), (size_t)nRoom / sizeof(WCHAR)) * sizeof(WCHAR));
+    } else {
+      Throw(3000, "Der ODBC-Treiber hat eine ungültige Länge eines Werts gemeldet.");
+    }
+    if ((SQLLEN)bytes.size() + nPiece > qodb::kMaxValueBytes) {
+      CString strError;
+      strError.Format("Ein Wert der Spalte %u ist länger als %ld MB und wird nicht gelesen.", (unsigned)nColumn,
+                      (long)(qodb::kMaxValueBytes >> 20));
+      Throw(3000, strError);
+    }
+    bytes.append(buffer.data(), (size_t)nPiece);
+    if (!bMore) break;
+    if (buffer.size() < (1u << 20)) buffer.resize(buffer.size() * 4);
+  }
+  if (bBinary) {
+    value.bytes.swap(bytes);
+  } else {
+    CString strText = qodb::Narrow((const WCHAR*)bytes.data(), (int)(bytes.size() / sizeof(WCHAR)));
+    value.bytes.assign((LPCSTR)strText, (size_t)strText.GetLength());
+  }
+}
+
+Value QueryValue(Engine& engine, const CString& strSQL) {
+  Cursor cursor(engine, strSQL);
+  if (cursor.Columns().empty() || !cursor.Next()) return Value();
+  return cursor.Get(0);
+}
+
+long ExecuteWith(Engine& engine, const CString& strSQL, const std::vector<Value>& params,
+                 const std::vector<bool>& binary) {
+  ASSERT(params.size() == binary.size());
+  return Guard([&] {
+    const int nTextForm = engine.db.GetTextForm();
+    std::string sql = qodb::ToDriver(nTextForm, strSQL);
+    qodb::StatementHandle stmt(engine.db.AllocStatement());
+    engine.db.Check(SQLPrepare(stmt.get(), (SQLCHAR*)sql.data(), (SQLINTEGER)sql.size()), stmt.get(), "SQLPrepare");
+    // The values in the driver's form, kept alive until SQLExecute.
+    std::vector<std::string> data(params.size());
+    std::vector<SQLLEN> lengths(params.size());
+    for (size_t i = 0; i < params.size(); ++i) {
+      if (params[i].bNull) {
+        lengths[i] = SQL_NULL_DATA;
+      } else {
+        data[i] = binary[i] ? params[i].bytes : qodb::ToDriver(nTextForm, params[i].bytes.c_str(), (int)params[i].bytes.size());
+        lengths[i] = (SQLLEN)data[i].size();
+      }
+      SQLSMALLINT nC = binary[i] ? SQL_C_BINARY : SQL_C_CHAR;
+      SQLSMALLINT nSql = binary[i] ? SQL_LONGVARBINARY : SQL_VARCHAR;
+      SQLULEN nSize = data[i].size() > 0 ? data[i].size() : 1;
+      engine.db.Check(SQLBindParameter(stmt.get(), (SQLUSMALLINT)(i + 1), SQL_PARAM_INPUT, nC, nSql, nSize, 0,
+                                       (SQLPOINTER)data[i].data(), (SQLLEN)data[i].size(), &lengths[i]),
+                      stmt.get(), "SQLBindParameter");
+    }
+    SQLRETURN rc = SQLExecute(stmt.get());
+    if (rc == SQL_NO_DATA) return 0L;
+    engine.db.Check(rc, stmt.get(), "SQLExecute");
+    SQLLEN nRows = 0;
+    if (!SQL_SUCCEEDED(SQLRowCount(stmt.get(), &nRows)) || nRows < 0) nRows = 0;
+    return (long)(nRows > LONG_MAX ? LONG_MAX : nRows);
+  });
+}
+
+} // namespace qodao

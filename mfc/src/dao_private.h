@@ -1,0 +1,155 @@
+// What the DAO classes of the MFC subset share (dao_*.cpp): the engine behind
+// an open CDaoDatabase, the conversion of ODBC failures into CDaoException, a
+// forward-reading cursor of its own (it tells NULL from empty text and reads
+// binary values, which CRecordset's text rows cannot), and the field types.
+//
+// An Access-type database is an SQLite file holding, besides the user's
+// tables and views, the engine's own tables (named qo_dao_...): a marker that
+// the file is ours, the password's salted hash, and the field attributes that
+// SQLite's declared types cannot carry. They never appear in the table lists.
+#pragma once
+
+#include "afxdao.h"
+#include "afxdb.h"
+
+#include "db_private.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace qodao {
+
+// Bounds on what a file, a driver or a caller hands the engine.
+const int kMaxFields = 255;            // fields of a table or result (Jet's limit)
+const long kMaxTextSize = 255;         // characters of a dbText field
+const long kMaxBinarySize = 510;       // bytes of a dbBinary field
+const int kMaxObjects = 32767;         // tables or queries listed (the counts are short)
+const int kMaxPasswordLength = 20;     // characters, as Jet allows
+
+enum FileKind { kindSqlite = 1, kindMdb = 2 };
+
+// The state of an open CDaoDatabase (m_pEngine).
+struct Engine {
+  FileKind kind = kindSqlite;
+  CDatabase db;
+  CString strName;          // as given to Open or Create
+  CString strConnect;
+  BOOL bReadOnly = FALSE;
+  long lRecordsAffected = 0;
+  int nJetVersion = 0;      // an Access file's: 0 Jet 3, 1 Jet 4, 2 and more ACE
+};
+
+Engine& EngineOf(CDaoDatabase* pDatabase);   // asserts that it is open
+
+// Errors.
+[[noreturn]] void Throw(long lCode, const CString& strDescription);
+[[noreturn]] void ThrowFromDb(CDBException* e);   // takes over and deletes e
+[[noreturn]] void ThrowReadOnly();
+[[noreturn]] void ThrowNoCurrentRecord();
+
+// Runs f; a CDBException from the ODBC layer leaves as CDaoException.
+template <typename F>
+auto Guard(F&& f) -> decltype(f()) {
+  try {
+    return f();
+  } catch (CDBException* e) {
+    ThrowFromDb(e);
+  }
+}
+
+// A name as the file's SQL quotes it.
+CString Quote(const Engine& engine, const CString& strName);
+CString QuoteLiteral(const CString& strText);   // '...' with doubled quotes
+
+// One value as the engine moves it: text in Windows-1252, numbers as their
+// decimal text, dates as "YYYY-MM-DD HH:MM:SS", binary as its bytes.
+struct Value {
+  bool bNull = true;
+  std::string bytes;
+};
+
+// A field as the engine knows it.
+struct FieldDef {
+  CString strName;
+  short nType = dbText;
+  long lSize = 0;
+  long lAttributes = dbVariableField | dbUpdatableField;
+  BOOL bRequired = FALSE;
+  BOOL bAllowZeroLength = TRUE;
+  CString strDefault;
+};
+
+// The declared type an SQLite column of a DAO type gets, and back.
+CString DeclaredType(short nType, long lSize);
+void FromDeclaredType(const CString& strDeclared, FieldDef& field);
+// A DAO type for an ODBC type of a result column.
+void FromSqlType(SWORD nSqlType, SQLULEN nPrecision, SWORD nScale, FieldDef& field);
+long DefaultSize(short nType);
+void FillFieldInfo(const FieldDef& field, int nOrdinal, CDaoFieldInfo& info, DWORD dwInfoOptions);
+int FindField(const std::vector<FieldDef>& fields, LPCTSTR lpszName);   // -1 when none
+
+// The fields of a table (3011 when there is no such table).
+std::vector<FieldDef> TableFields(Engine& engine, const CString& strTable);
+// Does a user table (or, with bView, a view) of that name exist? Its name as stored.
+BOOL FindTable(Engine& engine, const CString& strName, BOOL bView, CString* pstrStored = NULL);
+// The names of user tables or of views, in the file's order.
+std::vector<CString> ObjectNames(Engine& engine, BOOL bViews);
+
+// Conversions between values and variants by field type.
+void ToVariant(const FieldDef& field, const Value& value, COleVariant& var);
+// Text as the field's type stores it; raises 3421 or 3163.
+Value FromText(const FieldDef& field, LPCTSTR lpszText);
+Value FromVariant(const FieldDef& field, const VARIANT& var);
+
+// A statement read forward on a handle of its own; Restart runs it again.
+class Cursor {
+public:
+  Cursor(Engine& engine, const CString& strSQL);
+  ~Cursor();
+  Cursor(const Cursor&) = delete;
+  Cursor& operator=(const Cursor&) = delete;
+
+  struct Column {
+    CString strName;
+    SWORD nSqlType;
+    SQLULEN nPrecision;
+    SWORD nScale;
+  };
+  const std::vector<Column>& Columns() const { return m_columns; }
+
+  // The next row; false past the last one.
+  bool Next();
+  void Restart();
+  long Row() const { return m_lRow; }           // 0-based; -1 before the first
+  bool AtEnd() const { return m_bAtEnd; }
+  const Value& Get(size_t nColumn) const { return m_row[nColumn]; }
+
+private:
+  void Execute();
+  void ReadValue(SQLUSMALLINT nColumn, Value& value);
+
+  Engine& m_engine;
+  std::string m_sql;
+  HSTMT m_hstmt = SQL_NULL_HSTMT;
+  std::vector<Column> m_columns;
+  std::vector<Value> m_row;
+  long m_lRow = -1;
+  bool m_bAtEnd = false;
+};
+
+// One value of the first row of a query (NULL when none).
+Value QueryValue(Engine& engine, const CString& strSQL);
+// Runs a statement with values for its '?' markers (NULL or text/binary).
+long ExecuteWith(Engine& engine, const CString& strSQL, const std::vector<Value>& params,
+                 const std::vector<bool>& binary);
+
+// Queries.
+BOOL IsSelect(const CString& strSQL);
+[[noreturn]] void ThrowMdbQuery(const CString& strName);
+CString QuerySQL(CDaoQueryDef* pQueryDef);   // what a recordset on it runs
+std::vector<FieldDef> QueryFields(CDaoQueryDef* pQueryDef);
+// The fields of a result, without reading its rows.
+std::vector<FieldDef> ResultFields(Engine& engine, const CString& strSQL);
+
+} // namespace qodao

@@ -1,0 +1,142 @@
+// Making and opening database files: the kinds of file the engine refuses,
+// passwords, read-only files.
+#include "DaoTestSupport.h"
+
+#include "afxdb.h"
+
+#include <fstream>
+
+using DaoDatabaseTest = DaoFileTest;
+
+TEST_F(DaoDatabaseTest, CreateMakesAFileThatOpensAgainAndRefusesToOverwrite) {
+  m_db.Create(m_file.c_str());
+  EXPECT_TRUE(m_db.IsOpen());
+  EXPECT_TRUE(m_db.CanUpdate());
+  EXPECT_EQ(CString(m_file.c_str()), m_db.GetName());
+  EXPECT_EQ(0, m_db.GetTableDefCount());   // the engine's own tables are not listed
+  m_db.Close();
+
+  EXPECT_EQ(3204, DaoError([&] { m_db.Create(m_file.c_str()); }).lCode);
+  m_db.Open(m_file.c_str());
+  EXPECT_EQ(0, m_db.GetTableDefCount());
+}
+
+TEST_F(DaoDatabaseTest, FilesThatAreNoDatabaseOfOursAreRefused) {
+  struct Case {
+    const char* pszName;
+    std::string content;   // written as the file; "-" for no file
+    long lCode;
+  };
+  std::string sqliteHead = std::string("SQLite format 3") + '\0';
+  const Case cases[] = {
+      {"missing", "-", 3024},
+      {"empty", "", 3343},
+      {"text", "Name;Ort\nMüller;Köln\n", 3343},
+      {"truncated SQLite", sqliteHead + std::string(84, '\x01'), 3343},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.pszName);
+    std::string file = TempFile(".mdb");
+    if (c.content != "-") std::ofstream(file, std::ios::binary) << c.content;
+    DaoFailure failure = DaoError([&] { m_db.Open(file.c_str()); });
+    EXPECT_EQ(c.lCode, failure.lCode);
+    EXPECT_FALSE(m_db.IsOpen());
+    if (c.lCode == 3343) EXPECT_EQ("Unrecognized database format '" + CString(file.c_str()) + "'.", failure.strDescription);
+    std::filesystem::remove(file);
+  }
+}
+
+TEST_F(DaoDatabaseTest, AnSqliteFileNotMadeByTheEngineIsRefused) {
+  CDatabase odbc;
+  odbc.OpenEx(("Driver=SQLite3;Database=" + m_file).c_str(), CDatabase::noOdbcDialog);
+  odbc.ExecuteSQL("create table T (A integer)");
+  odbc.Close();
+  EXPECT_EQ(3343, DaoError([&] { m_db.Open(m_file.c_str()); }).lCode);
+}
+
+TEST_F(DaoDatabaseTest, PasswordIsCheckedAtOpenAndCanBeChangedAndRemoved) {
+  m_db.Create(m_file.c_str(), dbLangGeneral + CString(";pwd=Geheim"));
+  m_db.Close();
+  struct Case {
+    const char* pszConnect;
+    long lCode;
+  };
+  const Case before[] = {{"", 3031}, {";PWD=geheim", 3031}, {";PWD=Falsch", 3031}, {";PWD=Geheim", 0}};
+  for (const Case& c : before) {
+    SCOPED_TRACE(c.pszConnect);
+    EXPECT_EQ(c.lCode, DaoError([&] { m_db.Open(m_file.c_str(), FALSE, FALSE, c.pszConnect); }).lCode);
+    m_db.Close();
+  }
+  // The password's text is not in the file.
+  std::ifstream in(m_file, std::ios::binary);
+  std::string all((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+  EXPECT_EQ(std::string::npos, all.find("Geheim"));
+
+  EXPECT_EQ(3031, DaoError([&] { CDaoDatabase::SetPassword(m_file.c_str(), "falsch", "Neu"); }).lCode);
+  CDaoDatabase::SetPassword(m_file.c_str(), "Geheim", "Neu");
+  EXPECT_EQ(3031, DaoError([&] { m_db.Open(m_file.c_str(), FALSE, FALSE, ";PWD=Geheim"); }).lCode);
+  m_db.Open(m_file.c_str(), FALSE, FALSE, ";PWD=Neu");
+  m_db.Close();
+  CDaoDatabase::SetPassword(m_file.c_str(), "Neu", "");
+  m_db.Open(m_file.c_str());
+  EXPECT_TRUE(m_db.IsOpen());
+}
+
+TEST_F(DaoDatabaseTest, AReadOnlyFileIsReadButNotWritten) {
+  m_db.Create(m_file.c_str());
+  MakeTable("T", {{"A", dbLong, 4}});
+  m_db.Execute("insert into T (A) values (7)");
+  m_db.Close();
+  // The read-only attribute counts even for an administrator (the tests run as root).
+  ASSERT_TRUE(SetFileAttributesA(m_file.c_str(), FILE_ATTRIBUTE_READONLY));
+  m_db.Open(m_file.c_str());
+  EXPECT_FALSE(m_db.CanUpdate());
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenTable, "T");
+  EXPECT_EQ(7, rs.GetFieldValue(0).lVal);
+  EXPECT_FALSE(rs.CanUpdate());
+  EXPECT_EQ(3027, DaoError([&] { rs.AddNew(); }).lCode);
+  EXPECT_EQ(3027, DaoError([&] { m_db.Execute("delete from T"); }).lCode);
+  EXPECT_EQ(3027, DaoError([&] { m_db.DeleteTableDef("T"); }).lCode);
+  rs.Close();
+  m_db.Close();
+  SetFileAttributesA(m_file.c_str(), FILE_ATTRIBUTE_NORMAL);
+}
+
+TEST_F(DaoDatabaseTest, ExecuteRunsActionStatementsAndRaisesOnFailure) {
+  m_db.Create(m_file.c_str());
+  MakeTable("T", {{"A", dbLong, 4}});
+  m_db.Execute("insert into T (A) values (1)");
+  m_db.Execute("insert into T (A) select A + 1 from T");
+  m_db.Execute("update T set A = A * 10");
+  EXPECT_EQ(2, m_db.GetRecordsAffected());
+  struct Case {
+    const char* pszSQL;
+    long lCode;
+  };
+  const Case cases[] = {
+      {"insert into Nirgends (A) values (1)", 3146},
+      {"das ist kein SQL", 3146},
+      {"select * from T", 3065},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.pszSQL);
+    DaoFailure failure = DaoError([&] { m_db.Execute(c.pszSQL, dbFailOnError); });
+    EXPECT_EQ(c.lCode, failure.lCode);
+    EXPECT_FALSE(failure.strDescription.IsEmpty());
+  }
+}
+
+TEST(DaoExcelTest, WorkbooksAreRefusedWithAClearError) {
+  std::string xls = TempFile(".xls");
+  std::ofstream(xls, std::ios::binary) << std::string("\xD0\xCF\x11\xE0\xA1\xB1\x1A\xE1", 8) << std::string(504, '\0');
+  std::string xlsx = TempFile(".xlsx");
+  std::ofstream(xlsx, std::ios::binary) << "PK\x03\x04" << std::string(100, '\0');
+  CDaoDatabase db;
+  EXPECT_EQ(3161, DaoError([&] { db.Open(xls.c_str(), FALSE, TRUE, "Excel 8.0;"); }).lCode);
+  DaoFailure failure = DaoError([&] { db.Open(xlsx.c_str(), FALSE, TRUE, "Excel 8.0;"); });
+  EXPECT_EQ(3343, failure.lCode);
+  EXPECT_NE(-1, failure.strDescription.Find("Excel"));
+  std::filesystem::remove(xls);
+  std::filesystem::remove(xlsx);
+}

@@ -1,0 +1,266 @@
+// Recordsets: moving, counting, values as variants of the field's type,
+// appending (in bulk) and editing, and the failures a caller must see.
+#include "DaoTestSupport.h"
+
+#include <cmath>
+
+class DaoRecordsetTest : public DaoFileTest {
+protected:
+  void SetUp() override {
+    DaoFileTest::SetUp();
+    m_db.Create(m_file.c_str());
+    MakeTable("Zahlen", {{"N", dbLong, 0}, {"Text", dbText, 20}});
+    for (int i = 1; i <= 5; ++i) {
+      CString strSQL;
+      strSQL.Format("insert into Zahlen (N, Text) values (%d, 'Nr. %d')", i, i);
+      m_db.Execute(strSQL);
+    }
+  }
+  long Current(CDaoRecordset& rs) { return rs.GetFieldValue("N").lVal; }
+};
+
+TEST_F(DaoRecordsetTest, MovesStandWhereDaoStandsAndRaise3021WithoutARecord) {
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenDynaset, "select * from Zahlen");
+  EXPECT_FALSE(rs.IsBOF());
+  EXPECT_EQ(1, Current(rs));
+  EXPECT_EQ(1, rs.GetRecordCount());   // only what was accessed
+  rs.MoveNext();
+  rs.MoveNext();
+  EXPECT_EQ(3, Current(rs));
+  EXPECT_EQ(3, rs.GetRecordCount());
+  rs.MovePrev();
+  EXPECT_EQ(2, Current(rs));
+  rs.Move(2);
+  EXPECT_EQ(4, Current(rs));
+  rs.MoveLast();
+  EXPECT_EQ(5, Current(rs));
+  EXPECT_EQ(5, rs.GetRecordCount());
+  EXPECT_EQ(4, rs.GetAbsolutePosition());
+  rs.MoveNext();
+  EXPECT_TRUE(rs.IsEOF());
+  EXPECT_EQ(-1, rs.GetAbsolutePosition());
+  EXPECT_EQ(3021, DaoError([&] { rs.MoveNext(); }).lCode);
+  EXPECT_EQ(3021, DaoError([&] { rs.GetFieldValue(0); }).lCode);
+  EXPECT_EQ(3021, DaoError([&] { rs.Move(-1); }).lCode);
+  rs.MovePrev();
+  EXPECT_EQ(5, Current(rs));
+  rs.MoveFirst();
+  rs.MovePrev();
+  EXPECT_TRUE(rs.IsBOF());
+  EXPECT_FALSE(rs.IsEOF());
+  EXPECT_EQ(3021, DaoError([&] { rs.MovePrev(); }).lCode);
+  rs.MoveNext();
+  EXPECT_EQ(1, Current(rs));
+  rs.SetAbsolutePosition(3);
+  EXPECT_EQ(4, Current(rs));
+  EXPECT_EQ(3001, DaoError([&] { rs.SetAbsolutePosition(5); }).lCode);
+  rs.Move(10);
+  EXPECT_TRUE(rs.IsEOF());
+}
+
+TEST_F(DaoRecordsetTest, AnEmptyResultIsBofAndEofAndHasNoRecordToMoveTo) {
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenSnapshot, "select * from Zahlen where N > 100");
+  EXPECT_TRUE(rs.IsBOF());
+  EXPECT_TRUE(rs.IsEOF());
+  EXPECT_EQ(0, rs.GetRecordCount());
+  EXPECT_EQ(3021, DaoError([&] { rs.MoveFirst(); }).lCode);
+  EXPECT_EQ(3021, DaoError([&] { rs.MoveLast(); }).lCode);
+  EXPECT_EQ(3021, DaoError([&] { rs.MoveNext(); }).lCode);
+}
+
+TEST_F(DaoRecordsetTest, ATableTypeRecordsetKnowsItsCountAtOnce) {
+  CDaoTableDef td(&m_db);
+  td.Open("Zahlen");
+  EXPECT_EQ(5, td.GetRecordCount());
+  CDaoRecordset rs(&m_db);
+  rs.Open(&td);
+  EXPECT_EQ(5, rs.GetRecordCount());
+  EXPECT_TRUE(rs.CanAppend());
+  rs.AddNew();
+  rs.SetFieldValue("N", "6");
+  rs.Update();
+  EXPECT_EQ(6, rs.GetRecordCount());
+  rs.MoveLast();
+  EXPECT_EQ(6, Current(rs));
+  CDaoRecordset missing(&m_db);
+  EXPECT_EQ(3078, DaoError([&] { missing.Open(dbOpenTable, "Fehlt"); }).lCode);
+}
+
+TEST_F(DaoRecordsetTest, ValuesComeAsVariantsOfTheFieldsType) {
+  MakeTable("Alles", {{"Lang", dbLong, 0},
+                      {"Text", dbText, 30},
+                      {"Ja", dbBoolean, 0},
+                      {"Byte", dbByte, 0},
+                      {"Kurz", dbInteger, 0},
+                      {"Geld", dbCurrency, 0},
+                      {"Einfach", dbSingle, 0},
+                      {"Doppelt", dbDouble, 0},
+                      {"Wann", dbDate, 0},
+                      {"Memo", dbMemo, 0},
+                      {"Roh", dbLongBinary, 0},
+                      {"Leer", dbLong, 0}});
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenTable, "Alles");
+  rs.AddNew();
+  rs.SetFieldValue("Lang", "-123456");
+  rs.SetFieldValue("Text", "Grüße aus Köln");
+  rs.SetFieldValue("Ja", "wahr");
+  rs.SetFieldValue("Byte", "200");
+  rs.SetFieldValue("Kurz", "-300");
+  rs.SetFieldValue("Geld", "1234,56");
+  rs.SetFieldValue("Einfach", "0.5");
+  rs.SetFieldValue("Doppelt", COleVariant(3.25));
+  rs.SetFieldValue("Wann", "24.12.2026 18:30:00");
+  rs.SetFieldValue("Memo", COleVariant("Straße", VT_BSTRT));
+  COleVariant bytes;
+  const unsigned char raw[] = {0, 1, 0xFF, 'x'};
+  bytes.SetBytes(raw, sizeof(raw));
+  rs.SetFieldValue("Roh", bytes);
+  rs.Update();
+  rs.Close();
+
+  rs.Open(dbOpenDynaset, "select * from Alles");
+  EXPECT_EQ(VT_I4, rs.GetFieldValue("Lang").vt);
+  EXPECT_EQ(-123456, rs.GetFieldValue("Lang").lVal);
+  EXPECT_EQ(CString("Grüße aus Köln"), TextOf(rs.GetFieldValue("Text")));
+  EXPECT_EQ(VT_BOOL, rs.GetFieldValue("Ja").vt);
+  EXPECT_EQ(VARIANT_TRUE, rs.GetFieldValue("Ja").boolVal);
+  EXPECT_EQ(VT_UI1, rs.GetFieldValue("Byte").vt);
+  EXPECT_EQ(200, rs.GetFieldValue("Byte").bVal);
+  EXPECT_EQ(VT_I2, rs.GetFieldValue("Kurz").vt);
+  EXPECT_EQ(-300, rs.GetFieldValue("Kurz").iVal);
+  EXPECT_EQ(VT_CY, rs.GetFieldValue("Geld").vt);
+  EXPECT_EQ(12345600, rs.GetFieldValue("Geld").cyVal.int64);
+  EXPECT_EQ(VT_R4, rs.GetFieldValue("Einfach").vt);
+  EXPECT_EQ(0.5f, rs.GetFieldValue("Einfach").fltVal);
+  EXPECT_EQ(VT_R8, rs.GetFieldValue("Doppelt").vt);
+  EXPECT_EQ(3.25, rs.GetFieldValue("Doppelt").dblVal);
+  COleVariant when = rs.GetFieldValue("Wann");
+  ASSERT_EQ(VT_DATE, when.vt);
+  EXPECT_EQ(CString("24.12.2026 18:30"), COleDateTime(when.date).Format("%d.%m.%Y %H:%M"));
+  EXPECT_EQ(CString("Straße"), TextOf(rs.GetFieldValue("Memo")));
+  COleVariant blob = rs.GetFieldValue("Roh");
+  ASSERT_EQ(VT_ARRAY | VT_UI1, blob.vt);
+  ASSERT_EQ(1, (int)SafeArrayGetDim(blob.parray));
+  EXPECT_EQ(0, memcmp(blob.parray->pvData, raw, sizeof(raw)));
+  EXPECT_EQ(VT_NULL, rs.GetFieldValue("Leer").vt);
+}
+
+TEST_F(DaoRecordsetTest, TextThatDoesNotFitTheFieldIsRefused) {
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenTable, "Zahlen");
+  rs.AddNew();
+  struct Case {
+    LPCTSTR pszField;
+    LPCTSTR pszValue;
+    long lCode;
+  };
+  const Case cases[] = {
+      {"N", "zwölf", 3421},
+      {"N", "12x", 3421},
+      {"N", "99999999999", 3349},
+      {"Text", "einundzwanzig Zeichen", 3163},
+      {"Text", "genau zwanzig Zeiche", 0},
+      {"N", " 42 ", 0},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.pszValue);
+    EXPECT_EQ(c.lCode, DaoError([&] { rs.SetFieldValue(c.pszField, c.pszValue); }).lCode);
+  }
+  rs.Update();
+  rs.MoveLast();
+  EXPECT_EQ(42, Current(rs));
+  EXPECT_EQ(CString("genau zwanzig Zeiche"), TextOf(rs.GetFieldValue("Text")));
+}
+
+TEST_F(DaoRecordsetTest, BulkAppendStoresEveryRowWithItsNulls) {
+  const long kRows = 20001;
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenTable, "Zahlen");
+  for (long i = 0; i < kRows; ++i) {
+    rs.AddNew();
+    CString strN;
+    strN.Format("%ld", 1000 + i);
+    rs.SetFieldValue(0, (LPCTSTR)strN);
+    // Every seventh row leaves the text out: it must read back as NULL, not "".
+    if (i % 7 != 0) rs.SetFieldValue(1, (LPCTSTR)("Zeile " + strN + " ä"));
+    rs.Update();
+  }
+  rs.Close();
+
+  rs.Open(dbOpenDynaset, "select * from Zahlen where N >= 1000 order by N");
+  rs.MoveLast();
+  EXPECT_EQ(kRows, rs.GetRecordCount());
+  EXPECT_EQ(1000 + kRows - 1, Current(rs));
+  EXPECT_EQ(CString("Zeile 21000 ä"), TextOf(rs.GetFieldValue(1)));
+  rs.SetAbsolutePosition(7);
+  EXPECT_EQ(1007, Current(rs));
+  EXPECT_EQ(VT_NULL, rs.GetFieldValue(1).vt);
+  rs.MovePrev();
+  EXPECT_EQ(CString("Zeile 1006 ä"), TextOf(rs.GetFieldValue(1)));
+}
+
+TEST_F(DaoRecordsetTest, ARowTheFileRefusesIsNeverReportedAsStored) {
+  CDaoTableDef td(&m_db);
+  td.Open("Zahlen");
+  CDaoIndexFieldInfo key[] = {{"N", FALSE}};
+  CDaoIndexInfo unique;
+  unique.m_strName = "Eindeutig";
+  unique.m_pFieldInfos = key;
+  unique.m_nFields = 1;
+  unique.m_bUnique = TRUE;
+  td.CreateIndex(unique);
+
+  CDaoRecordset rs(&m_db);
+  rs.Open(&td);
+  // Rows 1 to 3 are new, row 4 repeats N = 2 (already in the table), row 5 is new.
+  DaoFailure failure;
+  const char* values[] = {"10", "11", "12", "2", "13"};
+  for (const char* value : values) {
+    failure = DaoError([&] {
+      rs.AddNew();
+      rs.SetFieldValue(0, value);
+      rs.Update();
+    });
+    if (failure.lCode != 0) break;
+  }
+  if (failure.lCode == 0) failure = DaoError([&] { rs.Close(); });
+  EXPECT_EQ(3146, failure.lCode);
+  // The record named first not stored, and every one before it is in the table.
+  int nAt = failure.strDescription.Find("Datensatz ");
+  ASSERT_NE(-1, nAt) << (LPCSTR)failure.strDescription;
+  long lFirstLost = atol((LPCSTR)failure.strDescription + nAt + 10);
+  EXPECT_GE(lFirstLost, 1);
+  EXPECT_LE(lFirstLost, 4);
+  rs.Close();
+  CDaoRecordset check(&m_db);
+  check.Open(dbOpenSnapshot, "select count(*) as C from Zahlen where N >= 10");
+  COleVariant count = check.GetFieldValue(0);
+  count.ChangeType(VT_I4);
+  EXPECT_EQ(lFirstLost - 1, count.lVal);
+}
+
+TEST_F(DaoRecordsetTest, EditAndDeleteChangeTheCurrentRecord) {
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenDynaset, "select * from Zahlen");
+  rs.Move(1);
+  rs.Edit();
+  rs.SetFieldValue("Text", "zwei");
+  rs.Update();
+  EXPECT_EQ(CString("zwei"), TextOf(rs.GetFieldValue("Text")));
+  rs.MoveNext();
+  rs.Delete();
+  EXPECT_EQ(3167, DaoError([&] { rs.GetFieldValue(0); }).lCode);
+  rs.MoveNext();
+  EXPECT_EQ(4, Current(rs));
+  rs.Close();
+  CDaoTableDef td(&m_db);
+  td.Open("Zahlen");
+  EXPECT_EQ(4, td.GetRecordCount());
+  CDaoRecordset snapshot(&m_db);
+  snapshot.Open(dbOpenSnapshot, "select * from Zahlen");
+  EXPECT_FALSE(snapshot.CanUpdate());
+  EXPECT_EQ(3027, DaoError([&] { snapshot.AddNew(); }).lCode);
+}
