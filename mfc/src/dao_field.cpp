@@ -440,7 +440,13 @@ void ToVariant(const FieldDef& field, const Value& value, COleVariant& var) {
 
 Value FromText(const FieldDef& field, LPCTSTR lpszText) {
   Value value;
-  value.bNull = false;
+  FromText(field, lpszText, value);
+  return value;
+}
+
+// Called for every field of every appended row: the common cases (text, a
+// whole number) fill the value's buffer without building strings on the way.
+void FromText(const FieldDef& field, LPCTSTR lpszText, Value& value) {
   LPCSTR p = lpszText != NULL ? lpszText : "";
   if (field.nType == dbText || field.nType == dbMemo || field.nType == dbBinary || field.nType == dbLongBinary) {
     size_t nLength = strlen(p);
@@ -448,12 +454,44 @@ Value FromText(const FieldDef& field, LPCTSTR lpszText) {
     if (lMax > 0 && nLength > (size_t)lMax)
       Throw(3163, "The field is too small to accept the amount of data you attempted to add. Try inserting or "
                   "pasting less data.");
+    value.bNull = false;
     value.bytes.assign(p, nLength);
-    return value;
+    return;
   }
-  CString str = TrimmedText(p);
+  while (*p == ' ' || *p == '\t') ++p;
+  size_t nLength = strlen(p);
+  while (nLength > 0 && (p[nLength - 1] == ' ' || p[nLength - 1] == '\t')) --nLength;
   // An empty entry in a number or date field means no value.
-  if (str.IsEmpty()) return Value();
+  if (nLength == 0) {
+    value.bNull = true;
+    value.bytes.clear();
+    return;
+  }
+  if (field.nType == dbByte || field.nType == dbInteger || field.nType == dbLong) {
+    // Sign and digits, at most ten of them without leading zeros: then the
+    // value is checked against the field's range in 64 bits.
+    size_t i = 0;
+    bool bNegative = p[0] == '-';
+    if (p[0] == '+' || p[0] == '-') ++i;
+    if (i == nLength) ThrowConversion();
+    for (size_t k = i; k < nLength; ++k)
+      if (p[k] < '0' || p[k] > '9') ThrowConversion();
+    while (i + 1 < nLength && p[i] == '0') ++i;
+    if (nLength - i > 10) Throw(3349, "Numeric field overflow.");
+    long long ll = 0;
+    for (size_t k = i; k < nLength; ++k) ll = ll * 10 + (p[k] - '0');
+    if (bNegative) ll = -ll;
+    long long llMin = field.nType == dbByte ? 0 : field.nType == dbInteger ? SHRT_MIN : LONG_MIN;
+    long long llMax = field.nType == dbByte ? 255 : field.nType == dbInteger ? SHRT_MAX : LONG_MAX;
+    if (ll < llMin || ll > llMax) Throw(3349, "Numeric field overflow.");
+    value.bNull = false;
+    value.bytes.clear();
+    if (ll < 0) value.bytes += '-';
+    value.bytes.append(p + i, nLength - i);
+    if (ll == 0) value.bytes = "0";
+    return;
+  }
+  CString str(p, (int)nLength);
   CString strValue;
   switch (field.nType) {
   case dbBoolean: {
@@ -468,29 +506,14 @@ Value FromText(const FieldDef& field, LPCTSTR lpszText) {
       ThrowConversion();
     break;
   }
-  case dbByte:
-  case dbInteger:
-  case dbLong: {
-    LPCSTR q = str;
-    if (*q == '+' || *q == '-') ++q;
-    if (*q == '\0') ThrowConversion();
-    for (LPCSTR r = q; *r != '\0'; ++r)
-      if (*r < '0' || *r > '9') ThrowConversion();
-    errno = 0;
-    long long ll = strtoll(str, NULL, 10);
-    long long llMin = field.nType == dbByte ? 0 : field.nType == dbInteger ? SHRT_MIN : LONG_MIN;
-    long long llMax = field.nType == dbByte ? 255 : field.nType == dbInteger ? SHRT_MAX : LONG_MAX;
-    if (errno != 0 || ll < llMin || ll > llMax) Throw(3349, "Numeric field overflow.");
-    strValue.Format("%lld", ll);
-    break;
-  }
   case dbSingle:
   case dbDouble: {
     if (!NormalizeNumber(str)) ThrowConversion();
     char* pEnd = NULL;
-    double d = strtod(str, &pEnd);
+    strtod(str, &pEnd);
     if (*pEnd != '\0') ThrowConversion();
-    strValue.Format(field.nType == dbSingle ? "%.9g" : "%.17g", d);
+    // The checked text as it is: SQLite reads it into the field's REAL.
+    strValue = str;
     break;
   }
   case dbCurrency: {
@@ -513,8 +536,8 @@ Value FromText(const FieldDef& field, LPCTSTR lpszText) {
   }
   default: ThrowConversion();
   }
+  value.bNull = false;
   value.bytes.assign((LPCSTR)strValue, (size_t)strValue.GetLength());
-  return value;
 }
 
 Value FromVariant(const FieldDef& field, const VARIANT& var) {

@@ -100,6 +100,7 @@ std::vector<CString> ObjectNames(Engine& engine, BOOL bViews);
 void ToVariant(const FieldDef& field, const Value& value, COleVariant& var);
 // Text as the field's type stores it; raises 3421 or 3163.
 Value FromText(const FieldDef& field, LPCTSTR lpszText);
+void FromText(const FieldDef& field, LPCTSTR lpszText, Value& value);
 Value FromVariant(const FieldDef& field, const VARIANT& var);
 
 // A statement read forward on a handle of its own; Restart runs it again.

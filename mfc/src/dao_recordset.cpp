@@ -62,6 +62,7 @@ struct RecordsetState {
   long lAppenderBase = 0;           // rows handed to earlier appenders
   long lAdded = 0;                  // rows handed to Update since Open
   int nNullTrigger = 0;             // 1 installed, -1 not possible, 0 not tried
+  std::vector<int> given;           // Update's fields with values, kept to spare allocations
 };
 
 RecordsetState& StateOf(void* p) { return *static_cast<RecordsetState*>(p); }
@@ -500,7 +501,12 @@ void CDaoRecordset::AddNew() {
   if (!st.bUpdatable) ThrowReadOnly();
   if (st.nEdit != editNone) CancelUpdate();
   st.nEdit = editAdd;
-  st.buffer.assign(st.fields.size(), Value());
+  // The values' buffers are kept from row to row: appending allocates nothing per field.
+  st.buffer.resize(st.fields.size());
+  for (Value& value : st.buffer) {
+    value.bNull = true;
+    value.bytes.clear();
+  }
   st.assigned.assign(st.fields.size(), false);
 }
 
@@ -517,7 +523,6 @@ void CDaoRecordset::Edit() {
 void CDaoRecordset::CancelUpdate() {
   RecordsetState& st = OpenState(this);
   st.nEdit = editNone;
-  st.buffer.clear();
   st.assigned.clear();
 }
 
@@ -586,7 +591,8 @@ void CDaoRecordset::Update() {
   CheckRules(st, st.nEdit == editAdd);
 
   if (st.nEdit == editAdd && st.nNullTrigger == 0) st.nNullTrigger = InstallNullTrigger(engine, st) ? 1 : -1;
-  std::vector<int> given;
+  std::vector<int>& given = st.given;
+  given.clear();
   bool bBinary = false;
   for (size_t i = 0; i < st.fields.size(); ++i) {
     const bool bNull = !st.assigned[i] || st.buffer[i].bNull;
@@ -735,7 +741,13 @@ void CDaoRecordset::SetFieldValue(int nIndex, LPCTSTR lpszValue) {
   RecordsetState& st = OpenState(this);
   CheckEditing(st);
   if (nIndex < 0 || (size_t)nIndex >= st.fields.size()) Throw(3265, "Item not found in this collection.");
-  st.buffer[(size_t)nIndex] = lpszValue == NULL ? Value() : FromText(st.fields[(size_t)nIndex], lpszValue);
+  Value& value = st.buffer[(size_t)nIndex];
+  if (lpszValue == NULL) {
+    value.bNull = true;
+    value.bytes.clear();
+  } else {
+    FromText(st.fields[(size_t)nIndex], lpszValue, value);
+  }
   st.assigned[(size_t)nIndex] = true;
 }
 
