@@ -266,6 +266,17 @@ void CDaoDatabase::Open(LPCTSTR lpszName, BOOL bExclusive, BOOL bReadOnly, LPCTS
 void CDaoDatabase::Close() {
   if (m_pEngine == NULL) return;
   Engine* pEngine = static_cast<Engine*>(m_pEngine);
+  // Close never raises: a caller who must know whether appended rows were
+  // stored closes the recordset first, where a failure raises.
+  while (!pEngine->recordsets.empty()) {
+    CDaoRecordset* pSet = pEngine->recordsets.back();
+    try {
+      pSet->Close();
+    } catch (CException* e) {
+      e->Delete();
+    }
+    if (!pEngine->recordsets.empty() && pEngine->recordsets.back() == pSet) pEngine->recordsets.pop_back();
+  }
   m_pEngine = NULL;
   delete pEngine;   // CDatabase closes its recordsets and the connection
 }

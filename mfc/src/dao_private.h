@@ -38,6 +38,8 @@ struct Engine {
   BOOL bReadOnly = FALSE;
   long lRecordsAffected = 0;
   int nJetVersion = 0;      // an Access file's: 0 Jet 3, 1 Jet 4, 2 and more ACE
+  // The open recordsets: closed before the connection their handles belong to.
+  std::vector<CDaoRecordset*> recordsets;
 };
 
 Engine& EngineOf(CDaoDatabase* pDatabase);   // asserts that it is open

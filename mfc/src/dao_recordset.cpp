@@ -102,7 +102,18 @@ CString SimpleTable(const CString& strSQL) {
               "nur ganze Tabellen (\"select * from [Tabelle]\").");
 }
 
-void Flush(RecordsetState& st) {
+// A file deleted while it is open takes what SQLite writes with it (the host
+// keeps writing to the unlinked file): appended rows are not stored then.
+void CheckFileStillThere(Engine& engine, const RecordsetState& st) {
+  if (engine.kind != kindSqlite || GetFileAttributesA(engine.strName) != INVALID_FILE_ATTRIBUTES) return;
+  CString strError;
+  strError.Format("Could not find file '%s'. Die Datenbankdatei ist während der Arbeit verschwunden; die %ld "
+                  "angefügten Datensätze sind nicht gespeichert.",
+                  (LPCSTR)engine.strName, st.lAdded);
+  Throw(3024, strError);
+}
+
+void Flush(Engine& engine, RecordsetState& st) {
   if (!st.appender) return;
   std::unique_ptr<CAppendSet> appender(std::move(st.appender));
   long lBase = st.lAppenderBase;
@@ -113,6 +124,7 @@ void Flush(RecordsetState& st) {
     if (e->m_lFirstRowNotStored >= 0) e->m_lFirstRowNotStored += lBase;
     ThrowFromDb(e);
   }
+  CheckFileStillThere(engine, st);
 }
 
 // Steps the cursor onto record nTarget; false when there are fewer records.
@@ -120,7 +132,7 @@ bool Reach(CDaoRecordset* pSet, long lTarget) {
   RecordsetState& st = StateOf(pSet->m_pState);
   if (st.bCountKnown && lTarget >= st.lCount) return false;
   if (st.bDirty) {
-    Flush(st);
+    Flush(EngineOf(pSet->m_pDatabase), st);
     st.bDirty = FALSE;
     st.cursor->Restart();
   } else if (st.cursor->Row() > lTarget || st.cursor->AtEnd()) {
@@ -217,6 +229,7 @@ void OpenOn(CDaoRecordset* pSet, int nType, const CString& strSQL, int nOptions,
     LoadFields(pSet, engine);
   }
   st.bOpen = TRUE;
+  engine.recordsets.push_back(pSet);
   pSet->m_strSQL = strSQL;
   if (bTableType) {
     // A table-type recordset knows its size at once.
@@ -339,7 +352,14 @@ void CDaoRecordset::Close() {
     ~Reset() { st = RecordsetState(); }
   } reset{st};
   st.cursor.reset();
-  Flush(st);
+  Engine& engine = EngineOf(m_pDatabase);
+  std::vector<CDaoRecordset*>& open = engine.recordsets;
+  for (size_t i = 0; i < open.size(); ++i)
+    if (open[i] == this) {
+      open.erase(open.begin() + (long)i);
+      break;
+    }
+  Flush(engine, st);
 }
 
 BOOL CDaoRecordset::IsOpen() const { return StateOf(m_pState).bOpen; }
@@ -386,7 +406,7 @@ void CDaoRecordset::MoveLast() {
   RecordsetState& st = OpenState(this);
   if (st.nEdit != editNone) CancelUpdate();
   Engine& engine = EngineOf(m_pDatabase);
-  if (st.bDirty) Flush(st);
+  if (st.bDirty) Flush(engine, st);
   if (!st.bCountKnown || st.bDirty) {
     if (engine.kind == kindSqlite) {
       CString strBody = st.strSelect;
@@ -611,7 +631,7 @@ void CDaoRecordset::Update() {
 
   if (st.nEdit == editEdit) {
     if (!given.empty()) {
-      Flush(st);
+      Flush(engine, st);
       CString strSQL = "update " + Quote(engine, st.strTable) + " set ";
       std::vector<Value> params;
       std::vector<bool> binary;
@@ -635,7 +655,7 @@ void CDaoRecordset::Update() {
   long lRecord = st.lAdded;   // 0-based among the rows added since Open
   if (bBinary || given.empty()) {
     // Binary values cannot travel as text; a row without values needs "default values".
-    Flush(st);
+    Flush(engine, st);
     CString strSQL = "insert into " + Quote(engine, st.strTable);
     std::vector<Value> params;
     std::vector<bool> binary;
@@ -663,7 +683,7 @@ void CDaoRecordset::Update() {
     }
   } else {
     if (!st.appender || st.appenderFields != given) {
-      Flush(st);
+      Flush(engine, st);
       std::vector<CString> names;
       for (int n : given) names.push_back(st.fields[(size_t)n].strName);
       std::unique_ptr<CAppendSet> appender(new CAppendSet(&engine.db, names));
@@ -722,7 +742,7 @@ void CDaoRecordset::Delete() {
     if (!Reach(this, st.lPos)) ThrowNoCurrentRecord();
   }
   Engine& engine = EngineOf(m_pDatabase);
-  Flush(st);
+  Flush(engine, st);
   ExecuteWith(engine, "delete from " + Quote(engine, st.strTable) + " where rowid = ?", {st.cursor->Get(0)}, {false});
   st.bDirty = TRUE;
   st.bDeleted = TRUE;

@@ -264,3 +264,25 @@ TEST_F(DaoRecordsetTest, EditAndDeleteChangeTheCurrentRecord) {
   EXPECT_FALSE(snapshot.CanUpdate());
   EXPECT_EQ(3027, DaoError([&] { snapshot.AddNew(); }).lCode);
 }
+
+TEST_F(DaoRecordsetTest, RowsAppendedToAFileThatVanishedAreReportedAsNotStored) {
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenTable, "Zahlen");
+  rs.AddNew();
+  rs.SetFieldValue(0, "77");
+  rs.Update();
+  ASSERT_TRUE(DeleteFileA(m_file.c_str()));
+  DaoFailure failure = DaoError([&] { rs.Close(); });
+  // The driver may notice first (3146) or the engine's check after it (3024).
+  EXPECT_TRUE(failure.lCode == 3024 || failure.lCode == 3146) << failure.lCode << " " << (LPCSTR)failure.strDescription;
+  EXPECT_NE(-1, failure.strDescription.Find("nicht gespeichert")) << (LPCSTR)failure.strDescription;
+  EXPECT_FALSE(rs.IsOpen());
+}
+
+TEST_F(DaoRecordsetTest, ClosingTheDatabaseClosesItsRecordsets) {
+  CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenDynaset, "select * from Zahlen");
+  rs.MoveNext();
+  m_db.Close();
+  EXPECT_FALSE(rs.IsOpen());
+}
