@@ -1,11 +1,15 @@
 // Writing a large delimited file into a table through CQoOutputFilterODBC and
 // reading the table back through CQoInputFilterODBC, for SQLite and (when
-// QO_PG_CONNECT names a server) PostgreSQL. bench/odbc/run.sh runs it beside
-// sqlite3's .import and psql's \copy of the same file.
+// QO_PG_CONNECT names a server) PostgreSQL, and the same through the file
+// database filters (CQoOutputFilterDao, CQoInputFilterDao) into an
+// Access-type database. bench/odbc/run.sh runs it beside sqlite3's .import
+// and psql's \copy of the same file.
 //
 //   bench_odbc <delimited file> <folder for the SQLite file>
 #include <CQoException.h>
+#include <CQoInputFilterDao.h>
 #include <CQoInputFilterODBC.h>
+#include <CQoOutputFilterDao.h>
 #include <CQoInputFilterTextVar.h>
 #include <CQoOutputFilterODBC.h>
 
@@ -70,6 +74,73 @@ void Write(const char* what, const std::string& connect, const char* file)
                 rows / t);
 }
 
+void WriteDao(const std::string& database, const char* file)
+{
+    CQoInputFilterTextVar in;
+    in.Delimiter(';');
+    in.SetFirstRowHasNames(true);
+    in.Init(file);
+    int const cols = in.NumCols();
+    CQoOutputFilterDao out;
+    out.SetTableName("bench");
+    out.NumCols(cols);
+    for (int c = 0; c < cols; ++c) {
+        CQoString name;
+        in.ColName(c, name);
+        out.ColumnName(c, name);
+        out.SetLength(c, 60);
+    }
+    Clock::time_point start = Clock::now();
+    out.UseDB(database.c_str());
+    out.Init();
+    long rows = 0;
+    CQoString value;
+    for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
+        out.InitRow();
+        for (int c = 0; c < cols; ++c) {
+            in.Value(c, value);
+            out.Value(c, value);
+        }
+        out.WriteRow();
+        ++rows;
+    }
+    out.ReleaseFile();
+    double t = Seconds(start);
+    std::printf("Access-type: CQoOutputFilterDao wrote %ld rows x %d columns in %.2f s = %.0f rows/s\n", rows, cols,
+                t, rows / t);
+}
+
+template <class Filter> void ReadAll(const char* what, Filter& in)
+{
+    double before = WorkingSetMB();
+    Clock::time_point start = Clock::now();
+    long rows = 0;
+    std::size_t bytes = 0;
+    double at100k = 0;
+    CQoString value;
+    for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
+        for (int c = 0; c < in.NumCols(); ++c) {
+            in.Value(c, value);
+            bytes += static_cast<std::size_t>(value.GetLength());
+        }
+        if (++rows == 100000)
+            at100k = WorkingSetMB();
+    }
+    double t = Seconds(start);
+    std::printf("%s read %ld rows in %.2f s = %.0f rows/s (%zu value bytes); working set "
+                "%.1f MB before, %.1f MB after 100,000 rows, %.1f MB at the end\n",
+                what, rows, t, rows / t, bytes, before, at100k, WorkingSetMB());
+}
+
+void ReadDao(const std::string& database)
+{
+    CQoInputFilterDao in(CQoFile::typeAccess);
+    in.SetTableName("bench");
+    in.SetTableType(CQoInputFilterDB::tableTable);
+    in.Init(database.c_str());
+    ReadAll("Access-type: CQoInputFilterDao", in);
+}
+
 void Read(const char* what, const std::string& connect)
 {
     CQoInputFilterODBC in(connect.c_str());
@@ -111,7 +182,13 @@ int main(int argc, char** argv)
             Write("SQLite", sqlite, argv[1]);
             Read("SQLite", sqlite);
         }
-        if (only && std::string(only) == "sqlite")
+        if (!only || std::string(only) == "dao") {
+            std::string mdb = std::string(argv[2]) + "\\bench_dao.mdb";
+            DeleteFileA(mdb.c_str());
+            WriteDao(mdb, argv[1]);
+            ReadDao(mdb);
+        }
+        if (only && std::string(only) != "postgres")
             return 0;
         if (const char* pg = std::getenv("QO_PG_CONNECT")) {
             Write("PostgreSQL", pg, argv[1]);

@@ -2,7 +2,9 @@
 
 #include <CQoException.h>
 #include <CQoFile.h>
+#include <CQoInputFilterDao.h>
 #include <CQoInputFilterODBC.h>
+#include <CQoOutputFilterDao.h>
 #include <CQoInputFilterTextVar.h>
 #include <CQoOutputFilterODBC.h>
 #include <CQoOutputFilterTextVar.h>
@@ -31,10 +33,12 @@ void CConversion::ReadConfig(CQoConfigFile& config)
     config.GetValue(kInput, "SQL", m_inputSql);
     config.GetValue(kOutput, "ODBC", m_outputConnect);
     config.GetValue(kOutput, "Tabelle", m_outputTable);
+    config.GetValue(kInput, "Datenbank", m_inputDatabase);
+    config.GetValue(kOutput, "Datenbank", m_outputDatabase);
     if (InputIsDatabase() && m_inputTable.IsEmpty() && m_inputSql.IsEmpty())
-        CQoException::Throw("Zur ODBC-Eingabe fehlt die Tabelle (Tabelle=) oder die Abfrage (SQL=).", "Eingabe");
+        CQoException::Throw("Zur Datenbank-Eingabe fehlt die Tabelle (Tabelle=) oder die Abfrage (SQL=).", "Eingabe");
     if (OutputIsDatabase() && m_outputTable.IsEmpty())
-        CQoException::Throw("Zur ODBC-Ausgabe fehlt die Tabelle (Tabelle=).", "Ausgabe");
+        CQoException::Throw("Zur Datenbank-Ausgabe fehlt die Tabelle (Tabelle=).", "Ausgabe");
 }
 
 void CConversion::ReadCharset(CQoConfigFile& config, const char* section, int& charset)
@@ -60,6 +64,10 @@ void CConversion::WriteConfig(CQoConfigFile& config) const
     config.SetValue(kInput, "Zeichensatz", m_inputCharset);
     config.SetValue(kOutput, "Datei", m_outputFile);
     config.SetValue(kOutput, "Zeichensatz", m_outputCharset);
+    config.SetValue(kInput, "Datenbank", m_inputDatabase);
+    config.SetValue(kInput, "Tabelle", m_inputTable);
+    config.SetValue(kOutput, "Datenbank", m_outputDatabase);
+    config.SetValue(kOutput, "Tabelle", m_outputTable);
 }
 
 int CConversion::FileMode(int charset)
@@ -92,9 +100,31 @@ CQoString Quoted(const CQoString& name)
 
 long CConversion::RunRecords()
 {
+    // The output table is replaced before the input is read: the same table
+    // of the same database would be emptied before it is read.
+    if (!m_inputDatabase.IsEmpty() && !m_outputDatabase.IsEmpty()
+        && CQoFile::SameFile(m_inputDatabase, m_outputDatabase) && m_inputSql.IsEmpty()
+        && _stricmp(m_inputTable, m_outputTable) == 0)
+        CQoException::Throw("Die Ausgabetabelle ist die Eingabetabelle; sie w\xFCrde geleert.", m_outputTable);
+
     // The input: a table or query of a data source, or a delimited file.
     std::unique_ptr<CQoInputFilter> input;
-    if (InputIsDatabase()) {
+    if (!m_inputDatabase.IsEmpty()) {
+        CQoString extension = m_inputDatabase.Right(5);
+        bool excel = _stricmp(extension, ".xlsx") == 0;
+        CQoInputFilterDao* dao = new CQoInputFilterDao(excel ? CQoFile::typeExcel : CQoFile::typeAccess);
+        input.reset(dao);
+        if (m_inputSql.IsEmpty()) {
+            dao->SetTableName(m_inputTable);
+            dao->SetTableType(CQoInputFilterDB::tableTable);
+        } else {
+            dao->SetTableName(m_inputSql);
+            dao->SetTableType(CQoInputFilterDB::tableSql);
+        }
+        dao->Init(m_inputDatabase);
+        if (!dao->GetDatabase().IsOpen())
+            CQoException::Throw("Die Datenbank ist nicht ge\xF6" "ffnet.", m_inputDatabase);
+    } else if (InputIsDatabase()) {
         CQoInputFilterODBC* odbc = new CQoInputFilterODBC(m_inputConnect);
         input.reset(odbc);
         odbc->Init("");
@@ -119,7 +149,20 @@ long CConversion::RunRecords()
     std::unique_ptr<CQoOutputFilter> output;
     CQoFile file;
     std::string temp;
-    if (OutputIsDatabase()) {
+    if (!m_outputDatabase.IsEmpty()) {
+        CQoOutputFilterDao* dao = new CQoOutputFilterDao;
+        output.reset(dao);
+        dao->SetTableName(m_outputTable);
+        dao->NumCols(columns);
+        for (int c = 0; c < columns; ++c) {
+            CQoString name;
+            input->ColName(c, name);
+            dao->ColumnName(c, name);
+            dao->SetType(c, CQoOutputFilterDB::dbtypeText);
+            dao->SetLength(c, 255);
+        }
+        dao->UseDB(m_outputDatabase);
+    } else if (OutputIsDatabase()) {
         CQoOutputFilterODBC* odbc = new CQoOutputFilterODBC;
         output.reset(odbc);
         odbc->SetTableName(m_outputTable);
@@ -172,7 +215,9 @@ long CConversion::RunRecords()
                 CQoException::Throw("Ein Satz wurde nicht gespeichert.", "CConversion::Run");
             ++records;
         }
-        if (OutputIsDatabase())
+        if (!m_outputDatabase.IsEmpty())
+            output->ReleaseFile();   // closes the table: stores what is queued
+        else if (OutputIsDatabase())
             static_cast<CQoOutputFilterODBC*>(output.get())->ReleaseDB();
         else
             output->ReleaseFile();

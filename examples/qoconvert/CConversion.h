@@ -12,8 +12,12 @@
 //     Datei=kunden.txt          ODBC=Driver=SQLite3;Database=kunden.db
 //     Zeichensatz=0             Tabelle=Kunden
 //
-// An input reads from ODBC when "ODBC" holds a connect string; "Tabelle"
-// names its table, or "SQL" gives a statement instead.
+// An input reads from ODBC when "ODBC" holds a connect string, or from a file
+// database when "Datenbank" names one (an Access-type database, an .mdb file,
+// an .xlsx workbook whose sheets are tables named "Tabelle1$"); "Tabelle"
+// names its table, or "SQL" gives a statement instead. An output writes into
+// a table of an ODBC source ("ODBC") or of an Access-type database file
+// ("Datenbank"), both with "Tabelle".
 #pragma once
 
 #include <CQoConfigFile.h>
@@ -47,9 +51,12 @@ public:
     CQoString m_inputSql;
     CQoString m_outputConnect;
     CQoString m_outputTable;
+    // File databases (empty: none).
+    CQoString m_inputDatabase;
+    CQoString m_outputDatabase;
 
-    bool InputIsDatabase() const { return !m_inputConnect.IsEmpty(); }
-    bool OutputIsDatabase() const { return !m_outputConnect.IsEmpty(); }
+    bool InputIsDatabase() const { return !m_inputConnect.IsEmpty() || !m_inputDatabase.IsEmpty(); }
+    bool OutputIsDatabase() const { return !m_outputConnect.IsEmpty() || !m_outputDatabase.IsEmpty(); }
 
 private:
     long RunLines();

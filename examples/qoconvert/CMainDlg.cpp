@@ -45,6 +45,10 @@ BOOL CMainDlg::OnInitDialog()
     m_inputCharset = job.m_inputCharset;
     m_outputFile = (const char*)job.m_outputFile;
     m_outputCharset = job.m_outputCharset;
+    m_inputDatabase = (const char*)job.m_inputDatabase;
+    m_inputTable = (const char*)job.m_inputTable;
+    m_outputDatabase = (const char*)job.m_outputDatabase;
+    m_outputTable = (const char*)job.m_outputTable;
 
     CDialog::OnInitDialog();
     SetDlgItemText(IDC_STATUS, problem);
@@ -59,6 +63,10 @@ void CMainDlg::DoDataExchange(CDataExchange* pDX)
     DDX_CBIndex(pDX, IDC_INPUT_CHARSET, m_inputCharset);
     DDX_Text(pDX, IDC_OUTPUT_FILE, m_outputFile);
     DDX_CBIndex(pDX, IDC_OUTPUT_CHARSET, m_outputCharset);
+    DDX_Text(pDX, IDC_INPUT_DATABASE, m_inputDatabase);
+    DDX_Text(pDX, IDC_INPUT_TABLE, m_inputTable);
+    DDX_Text(pDX, IDC_OUTPUT_DATABASE, m_outputDatabase);
+    DDX_Text(pDX, IDC_OUTPUT_TABLE, m_outputTable);
 }
 
 void CMainDlg::OnConvert()
@@ -78,6 +86,10 @@ void CMainDlg::OnConvert()
     job.m_inputCharset = m_inputCharset;
     job.m_outputFile = (const char*)m_outputFile;
     job.m_outputCharset = m_outputCharset;
+    job.m_inputDatabase = (const char*)m_inputDatabase;
+    job.m_inputTable = (const char*)m_inputTable;
+    job.m_outputDatabase = (const char*)m_outputDatabase;
+    job.m_outputTable = (const char*)m_outputTable;
     job.WriteConfig(config);
     if (!config.Write(theApp.m_projectFile)) {
         SetDlgItemText(IDC_STATUS, "Projektdatei nicht gespeichert.");

@@ -1,5 +1,6 @@
-// CMainDlg - the sample program's main window: the project's files and
-// character sets and the button that converts.
+// CMainDlg - the sample program's main window: the project's files, character
+// sets and file databases, and the button that converts. A project's ODBC
+// settings are kept and used, though not shown.
 #pragma once
 
 #include <afxwin.h>
@@ -29,4 +30,10 @@ private:
     int m_inputCharset;
     CString m_outputFile;
     int m_outputCharset;
+    // A file database (Access-type, .mdb, .xlsx) and its table, until the
+    // database pages come.
+    CString m_inputDatabase;
+    CString m_inputTable;
+    CString m_outputDatabase;
+    CString m_outputTable;
 };

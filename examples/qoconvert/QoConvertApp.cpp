@@ -180,6 +180,8 @@ bool CQoConvertApp::Convert()
     // Database files named in a connect string are relative to the project too.
     job.m_inputConnect = ConnectInProject(m_projectFolder, job.m_inputConnect);
     job.m_outputConnect = ConnectInProject(m_projectFolder, job.m_outputConnect);
+    job.m_inputDatabase = InProject(m_projectFolder, job.m_inputDatabase);
+    job.m_outputDatabase = InProject(m_projectFolder, job.m_outputDatabase);
     try {
         CWaitCursor wait;
         long records = job.Run();

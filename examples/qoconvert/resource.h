@@ -12,6 +12,10 @@
 #define IDC_OUTPUT_CHARSET   1004
 #define IDC_CONVERT          1005
 #define IDC_STATUS           1006
+#define IDC_INPUT_DATABASE   1007
+#define IDC_INPUT_TABLE      1008
+#define IDC_OUTPUT_DATABASE  1009
+#define IDC_OUTPUT_TABLE     1010
 
 #define IDS_APP_TITLE        5000
 #define IDS_DONE             5001

@@ -52,8 +52,11 @@
 #define IDI_ERROR_ICON              4036
 
 // Dialog templates
+#define IDD_PASSWORD_DLG            4013
 #define IDD_ERROR_DLG               4037
 
 // Controls
+#define IDC_PASSWORD_EDIT           4028
+#define IDC_PASSWORD_PROMPT         4029
 #define IDC_ERROR_MESSAGE           4130
 #define IDC_ERROR_INFO              4131

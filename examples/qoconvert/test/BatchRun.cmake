@@ -110,3 +110,20 @@ if(NOT rc EQUAL 0 OR NOT rc2 EQUAL 0 OR NOT differs EQUAL 0)
   file(READ ${project}/qoconvert.log log)
   message(FATAL_ERROR "through SQLite: exit ${rc}/${rc2}, differs ${differs}\n${err}${err2}\nlog:\n${log}")
 endif()
+
+# Through an Access-type database file: into a table, and back out.
+file(WRITE ${project}/qoconvert.ini
+     "[Eingabe]\nDatei=kunden.txt\nZeichensatz=0\n[Ausgabe]\nDatenbank=kunden.mdb\nTabelle=Kunden\n")
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+file(REMOVE ${project}/zurueck.txt)
+file(WRITE ${project}/qoconvert.ini
+     "[Eingabe]\nDatenbank=kunden.mdb\nTabelle=Kunden\n[Ausgabe]\nDatei=zurueck.txt\nZeichensatz=0\n")
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                RESULT_VARIABLE rc2 OUTPUT_QUIET ERROR_VARIABLE err2 TIMEOUT 120)
+execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/zurueck.txt ${project}/expected-ansi.txt
+                RESULT_VARIABLE differs)
+if(NOT rc EQUAL 0 OR NOT rc2 EQUAL 0 OR NOT differs EQUAL 0)
+  file(READ ${project}/qoconvert.log log)
+  message(FATAL_ERROR "through an Access-type database: exit ${rc}/${rc2}, differs ${differs}\n${err}${err2}\nlog:\n${log}")
+endif()

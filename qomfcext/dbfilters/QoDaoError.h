@@ -1,0 +1,16 @@
+// How the file-database filters pass on errors of the DAO engine (internal):
+// the engine's exception is ended here and its description goes on as a
+// CQoException text, or, where a filter shows errors, as its message box.
+#pragma once
+
+#include <afxdao.h>
+
+#include <CQoString.h>
+
+// DAO's number of the error (0 when the exception carries none).
+long QoDaoCode(CDaoException* e);
+// The description of the engine's exception, which is deleted.
+CQoString QoDaoTakeMessage(CDaoException* e);
+[[noreturn]] void QoDaoRaise(CDaoException* e);
+// With `show`: the exception's message box, false; otherwise raised.
+bool QoDaoShowOrRaise(CDaoException* e, bool show);
