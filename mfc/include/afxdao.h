@@ -194,6 +194,41 @@ AFX_API void AFXAPI AfxThrowDaoException(int nAfxDaoError = NO_AFX_DAO_ERROR, SC
 // Raises a CDaoException with DAO's error number and description (the engine's own errors).
 AFX_API void AFXAPI AfxThrowDaoError(long lErrorCode, LPCTSTR lpszDescription);
 
+// --- workbooks -------------------------------------------------------------------------
+
+// The MFC subset reads no spreadsheets itself: a program or library that can
+// read .xlsx workbooks registers a factory of readers, and "Excel 8.0;"
+// connections are served through it. At Open the engine copies each worksheet
+// (table "<sheet>$", the first row naming the fields, each field typed by
+// what its cells hold) into a temporary Access-type database that is removed
+// at Close: the workbook is read twice, rows are never held in memory.
+// Without a registered reader, opening a workbook raises 3343.
+class AFX_API CDaoWorkbookReader {
+public:
+  enum CellType { cellEmpty = 0, cellNumber = 1, cellText = 2, cellBoolean = 3, cellDate = 4, cellError = 5 };
+  virtual ~CDaoWorkbookReader() {}
+
+  // Each raises CDaoException when the file fails it (3161: a workbook that
+  // cannot be read, such as a password-protected one).
+  virtual void Open(LPCTSTR lpszPath) = 0;
+  virtual int GetSheetCount() = 0;
+  virtual CString GetSheetName(int nIndex) = 0;
+  // Stands before the sheet's first row.
+  virtual void OpenSheet(int nIndex) = 0;
+  virtual void RewindSheet() = 0;
+  virtual int GetColumnCount() = 0;
+  // The next row; FALSE after the last.
+  virtual BOOL NextRow() = 0;
+  // A cell of the current row: nType a CellType; a number, a boolean (0 or 1)
+  // or a date (an OLE date, which is Excel's serial number) in dValue; text
+  // and error values ("#DIV/0!") in strText, Windows-1252.
+  virtual void GetCell(int nColumn, int& nType, double& dValue, CString& strText) = 0;
+};
+
+typedef CDaoWorkbookReader*(AFXAPI* AFX_DAO_WORKBOOK_FACTORY)();
+// Registers (or with NULL removes) the factory of workbook readers.
+AFX_API void AFXAPI AfxDaoRegisterWorkbookReader(AFX_DAO_WORKBOOK_FACTORY pfnFactory);
+
 // --- CDaoWorkspace ---------------------------------------------------------------------
 
 // Only the default workspace exists; a CDaoDatabase made without one uses it.

@@ -9,6 +9,16 @@
 
 namespace qodao {
 
+void MakeEngineTables(Engine& engine) {
+  Guard([&] {
+    engine.db.ExecuteSQL("create table qo_dao_engine (version integer not null)");
+    engine.db.ExecuteSQL("insert into qo_dao_engine (version) values (1)");
+    engine.db.ExecuteSQL("create table qo_dao_password (salt text not null, hash text not null)");
+    engine.db.ExecuteSQL("create table qo_dao_fields (tbl text not null, fld text not null, attributes integer, "
+                         "required integer, allowzero integer, primary key (tbl, fld))");
+  });
+}
+
 Engine& EngineOf(CDaoDatabase* pDatabase) {
   ASSERT(pDatabase != NULL && pDatabase->m_pEngine != NULL);
   return *static_cast<Engine*>(pDatabase->m_pEngine);
@@ -177,13 +187,15 @@ void OpenEngine(Engine& engine, LPCTSTR lpszName, BOOL bReadOnly, LPCTSTR lpszCo
   if (strConnect.Left(6).CompareNoCase("Excel ") == 0) {
     CString strError;
     if (kind == probeXls) {
-      strError.Format("Die Datei '%s' ist eine Excel-Arbeitsmappe im alten Format (.xls); gelesen werden nur "
-                      ".xlsx-Arbeitsmappen.",
+      // Both an .xls file and a password-protected workbook are compound files.
+      strError.Format("Die Datei '%s' ist eine Excel-Arbeitsmappe im alten Format (.xls) oder mit einem Kennwort "
+                      "geschützt; gelesen werden nur ungeschützte .xlsx-Arbeitsmappen.",
                       lpszName);
       Throw(3161, strError);
     }
-    strError.Format("Excel-Arbeitsmappen werden noch nicht unterstützt ('%s').", lpszName);
-    Throw(3343, strError);
+    if (kind != probeZip) ThrowUnrecognized(lpszName);
+    OpenWorkbook(engine, lpszName);
+    return;
   }
   if (kind == probeSqlite) {
     engine.kind = kindSqlite;
@@ -234,14 +246,8 @@ void CDaoDatabase::Create(LPCTSTR lpszName, LPCTSTR lpszLocale, int dwOptions) {
   engine->kind = kindSqlite;
   engine->strName = lpszName;
   try {
-    Guard([&] {
-      engine->db.OpenEx("Driver=SQLite3;Database=" + CString(lpszName), CDatabase::noOdbcDialog);
-      engine->db.ExecuteSQL("create table qo_dao_engine (version integer not null)");
-      engine->db.ExecuteSQL("insert into qo_dao_engine (version) values (1)");
-      engine->db.ExecuteSQL("create table qo_dao_password (salt text not null, hash text not null)");
-      engine->db.ExecuteSQL("create table qo_dao_fields (tbl text not null, fld text not null, attributes integer, "
-                            "required integer, allowzero integer, primary key (tbl, fld))");
-    });
+    Guard([&] { engine->db.OpenEx("Driver=SQLite3;Database=" + CString(lpszName), CDatabase::noOdbcDialog); });
+    MakeEngineTables(*engine);
     if (!strPassword.IsEmpty()) StorePassword(*engine, strPassword);
   } catch (CException*) {
     // No half-made database is left behind to be mistaken for one.

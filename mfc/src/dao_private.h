@@ -31,6 +31,11 @@ enum FileKind { kindSqlite = 1, kindMdb = 2 };
 
 // The state of an open CDaoDatabase (m_pEngine).
 struct Engine {
+  Engine() = default;
+  ~Engine();   // closes; removes the temporary copy of a workbook
+  Engine(const Engine&) = delete;
+  Engine& operator=(const Engine&) = delete;
+
   FileKind kind = kindSqlite;
   CDatabase db;
   CString strName;          // as given to Open or Create
@@ -40,7 +45,13 @@ struct Engine {
   int nJetVersion = 0;      // an Access file's: 0 Jet 3, 1 Jet 4, 2 and more ACE
   // The open recordsets: closed before the connection their handles belong to.
   std::vector<CDaoRecordset*> recordsets;
+  CString strTempFile;      // a workbook's copy
 };
+
+// The engine's own tables in a new file.
+void MakeEngineTables(Engine& engine);
+// Copies a workbook into a temporary database (dao_workbook.cpp).
+void OpenWorkbook(Engine& engine, LPCTSTR lpszName);
 
 Engine& EngineOf(CDaoDatabase* pDatabase);   // asserts that it is open
 

@@ -1,0 +1,130 @@
+// Workbooks: served through a reader the program registers, here the base
+// library's .xlsx reader; the workbook is written by openpyxl (the host's
+// Python) so that what the engine reads is checked against an independent
+// writer.
+#include "DaoTestSupport.h"
+
+#include "CQoException.h"
+#include "CQoXlsxReader.h"
+#include "PythonPeer.h"
+
+namespace {
+
+// What a program does to let the engine read workbooks: CQoException becomes
+// the DAO error the engine's callers expect.
+class CXlsxSource : public CDaoWorkbookReader {
+public:
+  void Open(LPCTSTR lpszPath) override { Guard([&] { m_reader.Open(lpszPath); }); }
+  int GetSheetCount() override { return m_reader.SheetCount(); }
+  CString GetSheetName(int nIndex) override { return CString((const char*)m_reader.SheetName(nIndex)); }
+  void OpenSheet(int nIndex) override { Guard([&] { m_reader.OpenSheet(nIndex); }); }
+  void RewindSheet() override { Guard([&] { m_reader.RewindSheet(); }); }
+  int GetColumnCount() override { return m_reader.ColumnCount(); }
+  BOOL NextRow() override {
+    BOOL bRow = FALSE;
+    Guard([&] { bRow = m_reader.NextRow(m_row); });
+    return bRow;
+  }
+  void GetCell(int nColumn, int& nType, double& dValue, CString& strText) override {
+    const CQoXlsxReader::Cell& cell = m_row[(size_t)nColumn];
+    nType = cell.type;
+    dValue = cell.number;
+    strText = (const char*)cell.text;
+  }
+
+private:
+  template <typename F>
+  static void Guard(F&& f) {
+    try {
+      f();
+    } catch (const CQoException& e) {
+      AfxThrowDaoError(3161, e.what());
+    }
+  }
+  CQoXlsxReader m_reader;
+  std::vector<CQoXlsxReader::Cell> m_row;
+};
+
+CDaoWorkbookReader* AFXAPI MakeXlsxSource() { return new CXlsxSource; }
+
+const char kWriteWorkbook[] = R"PY(
+import datetime, openpyxl
+wb = openpyxl.Workbook()
+ws = wb.active
+ws.title = 'Kunden'
+ws.append(['Name', 'Betrag', 'Seit', 'Aktiv', 'Gemischt'])
+ws.append(['M\u00fcller', 12.5, datetime.datetime(2024, 3, 1), True, 1])
+ws.append(['Stra\u00dfe & Co', None, datetime.datetime(1999, 12, 31), False, 'zwei'])
+ws.append([None, -3, None, True, None])
+wb.create_sheet('Leer')
+wb.save(os.path.join(folder, 'kunden.xlsx'))
+)PY";
+
+} // namespace
+
+TEST(DaoWorkbookTest, SheetsAreTablesWithTypedFieldsAndTheCopyGoesAtClose) {
+  PeerFolder folder;
+  if (!folder.Usable() || !RunPython(folder, "write", kWriteWorkbook)) PEER_UNAVAILABLE();
+  std::string path = folder.Path("kunden.xlsx");
+  CDaoDatabase db;
+  EXPECT_EQ(3343, DaoError([&] { db.Open(path.c_str(), FALSE, TRUE, "Excel 8.0;"); }).lCode);
+  struct Registration {
+    Registration() { AfxDaoRegisterWorkbookReader(MakeXlsxSource); }
+    ~Registration() { AfxDaoRegisterWorkbookReader(NULL); }
+  } registration;
+  db.Open(path.c_str(), FALSE, TRUE, "Excel 8.0;");
+  EXPECT_FALSE(db.CanUpdate());
+  ASSERT_EQ(2, db.GetTableDefCount());
+  CDaoTableDefInfo table;
+  db.GetTableDefInfo(0, table);
+  EXPECT_EQ(CString("Kunden$"), table.m_strName);
+
+  CDaoRecordset rs(&db);
+  rs.Open(dbOpenDynaset, "select * from [Kunden$]");
+  struct Field {
+    LPCTSTR pszName;
+    short nType;
+  };
+  const Field fields[] = {{"Name", dbText}, {"Betrag", dbDouble}, {"Seit", dbDate}, {"Aktiv", dbBoolean},
+                          {"Gemischt", dbText}};
+  ASSERT_EQ(5, rs.GetFieldCount());
+  for (int i = 0; i < 5; ++i) {
+    CDaoFieldInfo info;
+    rs.GetFieldInfo(i, info);
+    EXPECT_EQ(CString(fields[i].pszName), info.m_strName);
+    EXPECT_EQ(fields[i].nType, info.m_nType) << fields[i].pszName;
+  }
+  EXPECT_EQ(CString("Müller"), TextOf(rs.GetFieldValue("Name")));
+  EXPECT_EQ(12.5, rs.GetFieldValue("Betrag").dblVal);
+  EXPECT_EQ(CString("01.03.2024"), COleDateTime(rs.GetFieldValue("Seit").date).Format("%d.%m.%Y"));
+  EXPECT_EQ(VARIANT_TRUE, rs.GetFieldValue("Aktiv").boolVal);
+  EXPECT_EQ(CString("1"), TextOf(rs.GetFieldValue("Gemischt")));
+  rs.MoveNext();
+  EXPECT_EQ(CString("Straße & Co"), TextOf(rs.GetFieldValue("Name")));
+  EXPECT_EQ(VT_NULL, rs.GetFieldValue("Betrag").vt);
+  EXPECT_EQ(CString("zwei"), TextOf(rs.GetFieldValue("Gemischt")));
+  rs.MoveLast();
+  EXPECT_EQ(3, rs.GetRecordCount());
+  EXPECT_EQ(VT_NULL, rs.GetFieldValue("Name").vt);
+  EXPECT_EQ(-3.0, rs.GetFieldValue("Betrag").dblVal);
+  EXPECT_EQ(3027, DaoError([&] { rs.AddNew(); }).lCode);
+  rs.Close();
+  // The copy lives in the temporary folder while the workbook is open, and not after.
+  WIN32_FIND_DATAA found;
+  char szPattern[MAX_PATH];
+  GetTempPathA(MAX_PATH, szPattern);
+  lstrcatA(szPattern, "qox*.tmp");
+  auto countCopies = [&] {
+    int n = 0;
+    HANDLE hFind = FindFirstFileA(szPattern, &found);
+    if (hFind == INVALID_HANDLE_VALUE) return 0;
+    do ++n;
+    while (FindNextFileA(hFind, &found));
+    FindClose(hFind);
+    return n;
+  };
+  int nOpen = countCopies();
+  EXPECT_GE(nOpen, 1);
+  db.Close();
+  EXPECT_EQ(nOpen - 1, countCopies());
+}
