@@ -49,6 +49,7 @@ void Cursor::Execute() {
   });
   m_lRow = -1;
   m_bAtEnd = false;
+  m_bRowRead = false;
 }
 
 void Cursor::Restart() { Execute(); }
@@ -64,9 +65,21 @@ bool Cursor::Next() {
     }
     m_engine.db.Check(rc, m_hstmt, "SQLFetch");
     ++m_lRow;
-    for (size_t i = 0; i < m_columns.size(); ++i) ReadValue((SQLUSMALLINT)(i + 1), m_row[i]);
+    m_bRowRead = false;
     return true;
   });
+}
+
+const Value& Cursor::Get(size_t nColumn) {
+  ASSERT(nColumn < m_columns.size() && m_lRow >= 0 && !m_bAtEnd);
+  if (!m_bRowRead) {
+    // Every column in order: drivers hand out values by SQLGetData only so.
+    Guard([&] {
+      for (size_t i = 0; i < m_columns.size(); ++i) ReadValue((SQLUSMALLINT)(i + 1), m_row[i]);
+    });
+    m_bRowRead = true;
+  }
+  return m_row[nColumn];
 }
 
 void Cursor::ReadValue(SQLUSMALLINT nColumn, Value& value) {

@@ -100,7 +100,11 @@ CString TextOfBstr(BSTR bstr) {
 } // namespace
 
 CString Quote(const Engine& engine, const CString& strName) {
-  if (engine.kind == kindMdb) return "[" + strName + "]";
+  if (engine.kind == kindMdb) {
+    // The driver knows no escape for ']' inside a bracketed name.
+    if (strName.Find(']') >= 0) Throw(3125, "'" + strName + "' ist kein gültiger Name für diese Access-Datei.");
+    return "[" + strName + "]";
+  }
   CString str = strName;
   str.Replace("\"", "\"\"");
   return "\"" + str + "\"";

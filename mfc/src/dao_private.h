@@ -137,11 +137,14 @@ public:
   void Restart();
   long Row() const { return m_lRow; }           // 0-based; -1 before the first
   bool AtEnd() const { return m_bAtEnd; }
-  const Value& Get(size_t nColumn) const { return m_row[nColumn]; }
+  // A value of the current row; the row's values are read on first use, so
+  // that stepping over rows to reach one costs no reading of values.
+  const Value& Get(size_t nColumn);
 
 private:
   void Execute();
   void ReadValue(SQLUSMALLINT nColumn, Value& value);
+  bool m_bRowRead = false;
 
   Engine& m_engine;
   std::string m_sql;

@@ -632,6 +632,12 @@ void CDaoRecordset::Update() {
   if (st.nEdit == editEdit) {
     if (!given.empty()) {
       Flush(engine, st);
+      // The row id of the record being edited, read again if the cursor moved on.
+      if (st.bDirty || st.cursor->Row() != st.lPos || st.cursor->AtEnd()) {
+        int nEdit = st.nEdit;
+        if (!Reach(this, st.lPos)) ThrowNoCurrentRecord();
+        st.nEdit = nEdit;
+      }
       CString strSQL = "update " + Quote(engine, st.strTable) + " set ";
       std::vector<Value> params;
       std::vector<bool> binary;
