@@ -6,6 +6,8 @@
 #include "afxdao.h"
 #include "afxdb.h"
 
+#include <psapi.h>
+
 #include <stdio.h>
 #include <stdlib.h>
 
@@ -108,6 +110,23 @@ int main(int argc, char** argv) {
              std::chrono::duration<double>(std::chrono::steady_clock::now() - startOdbc).count());
     }
     printf("dao_append rows=%ld seconds=%.2f stored=%ld\n", lRows, dSeconds, check.GetRecordCount());
+
+    // Reading every row forward, then jumping back to the first and to the
+    // middle: the peak memory shows whether rows are held.
+    auto startRead = std::chrono::steady_clock::now();
+    CDaoRecordset reader(&db);
+    reader.Open(dbOpenDynaset, "select * from T");
+    double dSum = 0;
+    for (; !reader.IsEOF(); reader.MoveNext()) dSum += reader.GetFieldValue(9).dblVal;
+    reader.MoveFirst();
+    reader.SetAbsolutePosition(lRows / 2);
+    long lMiddle = reader.GetFieldValue(0).lVal;
+    double dRead = std::chrono::duration<double>(std::chrono::steady_clock::now() - startRead).count();
+    PROCESS_MEMORY_COUNTERS counters = {};
+    counters.cb = sizeof(counters);
+    GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof(counters));
+    printf("dao_read rows=%ld seconds=%.2f middle=%ld sum=%.0f peak_working_set_mb=%.1f\n", reader.GetRecordCount(),
+           dRead, lMiddle, dSum, counters.PeakWorkingSetSize / 1048576.0);
   } catch (CDaoException* e) {
     fprintf(stderr, "failed: %s\n", e->m_pErrorInfo != NULL ? (LPCSTR)e->m_pErrorInfo->m_strDescription : "?");
     e->Delete();
