@@ -10,9 +10,10 @@
 //   - A real Access file (.mdb, Jet 3 and 4) is read only, through the
 //     MDBTools ODBC driver: whole tables and the catalogue; its stored queries
 //     are listed but cannot be run (a clear error says so).
-//   - An Excel workbook (.xlsx, connect string "Excel 8.0;...") is read only:
-//     each worksheet is a table named by the sheet followed by '$', the first
-//     row holds the field names.
+//   - An Excel workbook (.xlsx, connect string "Excel 8.0;...") is read only,
+//     through a workbook reader the program registers (see
+//     AfxDaoRegisterWorkbookReader): each worksheet is a table named by the
+//     sheet followed by '$', the first row holds the field names.
 //
 //     CDaoDatabase db;
 //     db.Open("C:\\daten\\kunden.mdb");
