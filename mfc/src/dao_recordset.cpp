@@ -176,10 +176,6 @@ void CheckEditing(RecordsetState& st) {
 
 void LoadFields(CDaoRecordset* pSet, Engine& engine) {
   RecordsetState& st = StateOf(pSet->m_pState);
-  if (!st.strTable.IsEmpty() && engine.kind == kindSqlite) {
-    st.fields = TableFields(engine, st.strTable);
-    return;
-  }
   if (!st.strTable.IsEmpty()) {
     st.fields = TableFields(engine, st.strTable);
     return;
