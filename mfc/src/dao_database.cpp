@@ -240,6 +240,23 @@ void CDaoDatabase::Create(LPCTSTR lpszName, LPCTSTR lpszLocale, int dwOptions) {
     strError.Format("Database '%s' already exists.", lpszName);
     Throw(3204, strError);
   }
+  // The driver, given a path it cannot map to the host, makes a file of that
+  // literal name in the current folder: the folder is checked first.
+  char szFull[MAX_PATH * 2] = {0};
+  LPSTR pszLeaf = NULL;
+  DWORD nFull = GetFullPathNameA(lpszName, (DWORD)sizeof(szFull), szFull, &pszLeaf);
+  if (nFull == 0 || nFull >= sizeof(szFull) || pszLeaf == NULL || pszLeaf <= szFull) {
+    CString strError;
+    strError.Format("'%s' is not a valid path.", lpszName);
+    Throw(3044, strError);
+  }
+  CString strFolder(szFull, (int)(pszLeaf - szFull));
+  DWORD dwFolder = GetFileAttributesA(strFolder);
+  if (dwFolder == INVALID_FILE_ATTRIBUTES || !(dwFolder & FILE_ATTRIBUTE_DIRECTORY)) {
+    CString strError;
+    strError.Format("'%s' is not a valid path: den Ordner gibt es nicht.", (LPCSTR)strFolder);
+    Throw(3044, strError);
+  }
   CString strPassword = KeyValue(lpszLocale, "pwd");
   CheckPasswordLength(strPassword);
   std::unique_ptr<Engine> engine(new Engine);

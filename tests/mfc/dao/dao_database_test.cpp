@@ -19,6 +19,13 @@ TEST_F(DaoDatabaseTest, CreateMakesAFileThatOpensAgainAndRefusesToOverwrite) {
   EXPECT_EQ(3204, DaoError([&] { m_db.Create(m_file.c_str()); }).lCode);
   m_db.Open(m_file.c_str());
   EXPECT_EQ(0, m_db.GetTableDefCount());
+  m_db.Close();
+
+  // A folder that does not exist: an error, and no file anywhere else either.
+  std::string nowhere = (std::filesystem::path(m_file).parent_path() / "fehlt" / "neu.db").string();
+  EXPECT_EQ(3044, DaoError([&] { m_db.Create(nowhere.c_str()); }).lCode);
+  EXPECT_FALSE(m_db.IsOpen());
+  EXPECT_FALSE(std::filesystem::exists(nowhere));
 }
 
 TEST_F(DaoDatabaseTest, FilesThatAreNoDatabaseOfOursAreRefused) {
