@@ -323,6 +323,7 @@ void CDaoDatabase::Execute(LPCTSTR lpszSQL, int nOptions) {
   if (strSQL.Left(6).CompareNoCase("select") == 0 && strSQL.Find(" into ") < 0)
     Throw(3065, "Cannot execute a select query.");
   if (engine.bReadOnly) ThrowReadOnly();
+  CheckSingleStatement(lpszSQL);
   engine.lRecordsAffected = ExecuteWith(engine, lpszSQL, {}, {});
 }
 

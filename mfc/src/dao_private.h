@@ -163,6 +163,7 @@ long ExecuteWith(Engine& engine, const CString& strSQL, const std::vector<Value>
 
 // Queries.
 BOOL IsSelect(const CString& strSQL);
+void CheckSingleStatement(const CString& strSQL);   // 3142 for a second statement
 [[noreturn]] void ThrowMdbQuery(const CString& strName);
 CString QuerySQL(CDaoQueryDef* pQueryDef);   // what a recordset on it runs
 std::vector<FieldDef> QueryFields(CDaoQueryDef* pQueryDef);

@@ -33,6 +33,25 @@ BOOL IsSelect(const CString& strSQL) {
   return strHead == "select" || strHead.Left(4) == "with";
 }
 
+void CheckSingleStatement(const CString& strSQL) {
+  // The driver runs the first statement and drops the rest without a word.
+  LPCSTR p = strSQL;
+  char chQuote = 0;
+  for (; *p != '\0'; ++p) {
+    if (chQuote != 0) {
+      if (*p == chQuote) chQuote = 0;   // a doubled quote closes and opens again
+      continue;
+    }
+    if (*p == '\'' || *p == '"' || *p == '`') chQuote = *p;
+    else if (*p == '[') chQuote = ']';
+    else if (*p == ';') break;
+  }
+  if (*p != ';') return;
+  for (++p; *p != '\0'; ++p)
+    if (*p != ';' && *p != ' ' && *p != '\t' && *p != '\r' && *p != '\n')
+      Throw(3142, "Characters found after end of SQL statement.");
+}
+
 [[noreturn]] void ThrowMdbQuery(const CString& strName) {
   CString strError;
   strError.Format("Item not found in this collection: die gespeicherte Abfrage '%s' einer Access-Datei kann diese "

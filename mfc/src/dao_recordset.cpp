@@ -192,6 +192,7 @@ void OpenOn(CDaoRecordset* pSet, int nType, const CString& strSQL, int nOptions,
   Engine& engine = EngineOf(pSet->m_pDatabase);
   RecordsetState& st = StateOf(pSet->m_pState);
   ASSERT(!st.bOpen);
+  CheckSingleStatement(strSQL);
   CString strTable = SimpleTable(strSQL);
   CString strStored;
   if (!strTable.IsEmpty()) {

@@ -117,6 +117,7 @@ TEST_F(DaoDatabaseTest, ExecuteRunsActionStatementsAndRaisesOnFailure) {
   m_db.Execute("insert into T (A) select A + 1 from T");
   m_db.Execute("update T set A = A * 10");
   EXPECT_EQ(2, m_db.GetRecordsAffected());
+  m_db.Execute("update T set A = A + 1 where A = 'x;y';  ");
   struct Case {
     const char* pszSQL;
     long lCode;
@@ -125,6 +126,7 @@ TEST_F(DaoDatabaseTest, ExecuteRunsActionStatementsAndRaisesOnFailure) {
       {"insert into Nirgends (A) values (1)", 3146},
       {"das ist kein SQL", 3146},
       {"select * from T", 3065},
+      {"update T set A = 0; delete from T", 3142},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.pszSQL);
