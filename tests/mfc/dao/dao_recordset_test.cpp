@@ -113,7 +113,8 @@ TEST_F(DaoRecordsetTest, ValuesComeAsVariantsOfTheFieldsType) {
   rs.SetFieldValue("Einfach", "0.5");
   rs.SetFieldValue("Doppelt", COleVariant(3.25));
   rs.SetFieldValue("Wann", "24.12.2026 18:30:00");
-  rs.SetFieldValue("Memo", COleVariant("Straße", VT_BSTRT));
+  CString strLong = "Straße " + CString('ü', 70000);
+  rs.SetFieldValue("Memo", COleVariant(strLong, VT_BSTRT));
   COleVariant bytes;
   const unsigned char raw[] = {0, 1, 0xFF, 'x'};
   bytes.SetBytes(raw, sizeof(raw));
@@ -140,7 +141,7 @@ TEST_F(DaoRecordsetTest, ValuesComeAsVariantsOfTheFieldsType) {
   COleVariant when = rs.GetFieldValue("Wann");
   ASSERT_EQ(VT_DATE, when.vt);
   EXPECT_EQ(CString("24.12.2026 18:30"), COleDateTime(when.date).Format("%d.%m.%Y %H:%M"));
-  EXPECT_EQ(CString("Straße"), TextOf(rs.GetFieldValue("Memo")));
+  EXPECT_EQ(strLong, TextOf(rs.GetFieldValue("Memo")));
   COleVariant blob = rs.GetFieldValue("Roh");
   ASSERT_EQ(VT_ARRAY | VT_UI1, blob.vt);
   ASSERT_EQ(1, (int)SafeArrayGetDim(blob.parray));
