@@ -567,6 +567,9 @@ Value FromVariant(const FieldDef& field, const VARIANT& var) {
       value.bytes.assign((const char*)pData, (size_t)llCount);
       SafeArrayUnaccessData(psa);
     }
+    // Text holds no NUL: bytes with one are no text and would be cut there.
+    if ((field.nType == dbText || field.nType == dbMemo) && value.bytes.find('\0') != std::string::npos)
+      ThrowConversion();
     return value;
   }
   COleVariant converted;

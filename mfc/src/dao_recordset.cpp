@@ -25,6 +25,9 @@ public:
       : CRecordset(pDatabase), m_names(names), m_values(names.size()) {}
 
   void DoFieldExchange(CFieldExchange* pFX) override {
+    // Every value is set for every row: not emptying them first lets each
+    // keep its buffer from row to row.
+    if (pFX->m_nOperation == CFieldExchange::MarkForAddNew) return;
     pFX->SetFieldType(CFieldExchange::outputColumn);
     for (size_t i = 0; i < m_names.size(); ++i) RFX_Text(pFX, m_names[i], m_values[i], 255);
   }
@@ -702,7 +705,8 @@ void CDaoRecordset::Update() {
       st.appender->AddNew();
         for (size_t n = 0; n < given.size(); ++n) {
         const Value& value = st.buffer[(size_t)given[n]];
-        st.appender->m_values[n] = value.bNull ? CString() : CString(value.bytes.data(), (int)value.bytes.size());
+        // Text here holds no NUL (binary values take the other way).
+        st.appender->m_values[n] = value.bNull ? "" : value.bytes.c_str();
       }
       st.appender->Update();
     } catch (CDBException* e) {
