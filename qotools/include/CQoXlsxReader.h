@@ -19,9 +19,10 @@
 //
 // Memory: the shared strings of the workbook (in Windows-1252) and the
 // inflated XML of the open sheet are held, nothing else of the file. Bounds,
-// each checked before it sizes anything: at most 100,000 zip members; a
-// member inflates to at most 1 GiB and to at most 200 times its compressed
-// size plus 1 MiB (real sheets compress 10 to 15 times; more is a zip bomb);
+// each checked before it sizes anything: zip archives without ZIP64 (at most
+// 4 GiB and 65,534 members; the reader takes at most 100,000); a member
+// inflates to at most 1 GiB and to at most 200 times its compressed size
+// plus 1 MiB (real sheets compress 10 to 15 times; more is a zip bomb);
 // at most 16,777,216 shared strings and 65,536 cell or number formats;
 // rows 1..1,048,576 and columns A..XFD as in Excel. OpenSheet reads the sheet
 // once to find its range, so ColumnCount and RowCount are known before the

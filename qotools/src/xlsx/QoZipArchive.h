@@ -7,7 +7,7 @@
 // into memory and its CRC is checked.
 //
 // Bounds, each checked before it sizes or places anything: at most
-// maxMembers members, at most maxMemberSize bytes per inflated member, an
+// maxMembers members (without ZIP64 an archive lists at most 65,534), at most maxMemberSize bytes per inflated member, an
 // inflated size at most maxRatio times the compressed size plus 1 MiB
 // (workbook XML compresses about 10 to 15 times, even a sheet of nothing but
 // zeros; a member claiming far more is a zip bomb), every offset and size
