@@ -6,6 +6,7 @@
 
 #include "CQoPasswortDlg.h"
 #include "QoDaoError.h"
+#include "QoWorkbookReader.h"
 #include "resource.h"
 
 #include <cmath>
@@ -143,6 +144,8 @@ void CQoInputFilterDao::ConvertOleVariant(const COleVariant& value, CQoString& o
 CQoInputFilterDao::CQoInputFilterDao(CQoFile::fileType type)
     : m_pQueryDef(NULL), m_pRecordset(NULL), m_pTableDef(NULL), m_bShowError(true), m_nFileType(type)
 {
+    // Workbooks are read by the library's own reader.
+    QoRegisterWorkbookReader();
     if (type == CQoFile::typeExcel)
         m_strConnectPrefix = "Excel 8.0;";
     m_fileType = type == CQoFile::typeExcel ? filterExcel : filterAccess;

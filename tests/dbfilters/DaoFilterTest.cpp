@@ -12,6 +12,8 @@
 
 #include <DialogDriver.h>
 
+#include "../qotools/PythonPeer.h"
+
 #include <fstream>
 #include <functional>
 #include <vector>
@@ -318,4 +320,45 @@ TEST(DaoFilters, AccessFilesAreReadAsTheyAre)
     out.NumCols(1);
     out.UseDB(path.c_str());
     EXPECT_FALSE(ErrorOf([&] { out.Init(); }).empty()) << "an .mdb file is read only";
+}
+
+TEST(DaoFilters, ExcelSheetsAreTablesNamedWithADollar)
+{
+    PeerFolder folder;
+    if (!folder.Usable() || !RunPython(folder, "write", R"PY(
+import datetime, openpyxl
+wb = openpyxl.Workbook()
+ws = wb.active
+ws.title = 'Kunden'
+ws.append(['Name', 'Betrag', 'Aktiv'])
+ws.append(['M\u00fcller', 12.5, True])
+ws.append(['Gr\u00f6\u00dfer', 3, False])
+wb.save(os.path.join(folder, 'kunden.xlsx'))
+open(os.path.join(folder, 'alt.xls'), 'wb').write(b'\xd0\xcf\x11\xe0\xa1\xb1\x1a\xe1' + b'\0' * 504)
+)PY"))
+        PEER_UNAVAILABLE();
+    CQoInputFilterDao in(CQoFile::typeExcel);
+    in.SetTableName("Kunden$");
+    in.SetTableType(CQoInputFilterDB::tableTable);
+    in.Init(folder.Path("kunden.xlsx").c_str());
+    ASSERT_EQ(3, in.NumCols());
+    CQoString name;
+    in.ColName(1, name);
+    EXPECT_EQ("Betrag", std::string(name.GetString()));
+    EXPECT_EQ((std::vector<Row>{{"M\xFCller", "1.250000e+001", "true"}, {"Gr\xF6\xDF" "er", "3", "false"}}), Walk(in));
+
+    // A workbook that cannot be read (the old binary format, or protected by
+    // a password): the user is told so, the filter stays closed.
+    qotest::DialogDriver driver;
+    driver.Expect([](qotest::Dialog& d) {
+        EXPECT_NE(std::string::npos, d.MessageText().find("Excel-Datei kann nicht gelesen werden")) << d.MessageText();
+        d.Press(IDOK);
+    });
+    CQoInputFilterDao old(CQoFile::typeExcel);
+    old.SetTableName("Kunden$");
+    old.SetTableType(CQoInputFilterDB::tableTable);
+    EXPECT_EQ("", ErrorOf([&] { old.Init(folder.Path("alt.xls").c_str()); }));
+    EXPECT_TRUE(driver.Done());
+    EXPECT_FALSE(old.GetDatabase().IsOpen());
+    EXPECT_FALSE(old.FirstRow());
 }

@@ -127,3 +127,30 @@ if(NOT rc EQUAL 0 OR NOT rc2 EQUAL 0 OR NOT differs EQUAL 0)
   file(READ ${project}/qoconvert.log log)
   message(FATAL_ERROR "through an Access-type database: exit ${rc}/${rc2}, differs ${differs}\n${err}${err2}\nlog:\n${log}")
 endif()
+
+# From a sheet of an Excel workbook (written by openpyxl: numbers stay numbers).
+execute_process(COMMAND /usr/bin/python3 -c "
+import openpyxl, sys
+rows = [l.rstrip('\\n').split(';') for l in open(sys.argv[1], encoding='utf-8')]
+wb = openpyxl.Workbook()
+ws = wb.active
+ws.title = 'Kunden'
+ws.append(rows[0])
+for r in rows[1:]:
+    ws.append([int(r[0])] + r[1:])
+wb.save(sys.argv[2])
+" ${SOURCE_DIR}/sample/kunden.txt.utf8 ${project}/kunden.xlsx RESULT_VARIABLE rc)
+if(NOT rc EQUAL 0)
+  message(FATAL_ERROR "openpyxl could not write the workbook")
+endif()
+file(REMOVE ${project}/zurueck.txt)
+file(WRITE ${project}/qoconvert.ini
+     "[Eingabe]\nDatenbank=kunden.xlsx\nTabelle=Kunden$\n[Ausgabe]\nDatei=zurueck.txt\nZeichensatz=0\n")
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/zurueck.txt ${project}/expected-ansi.txt
+                RESULT_VARIABLE differs)
+if(NOT rc EQUAL 0 OR NOT differs EQUAL 0)
+  file(READ ${project}/qoconvert.log log)
+  message(FATAL_ERROR "from a workbook: exit ${rc}, differs ${differs}\n${err}\nlog:\n${log}")
+endif()
