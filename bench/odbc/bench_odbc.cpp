@@ -38,14 +38,16 @@ double WorkingSetMB()
     return static_cast<double>(counters.WorkingSetSize) / 1e6;
 }
 
-void Write(const char* what, const std::string& connect, const char* file)
+// Copies the delimited file into table "bench" of `out` (text columns of 60),
+// opened by `open`, closed by `close`; prints the time from the open on.
+template <class Output, class Open, class Close>
+void Write(const char* what, Output& out, const char* file, Open open, Close close)
 {
     CQoInputFilterTextVar in;
     in.Delimiter(';');
     in.SetFirstRowHasNames(true);
     in.Init(file);
     int const cols = in.NumCols();
-    CQoOutputFilterODBC out;
     out.SetTableName("bench");
     out.NumCols(cols);
     for (int c = 0; c < cols; ++c) {
@@ -54,8 +56,8 @@ void Write(const char* what, const std::string& connect, const char* file)
         out.ColumnName(c, name);
         out.SetLength(c, 60);
     }
-    out.UseDB(connect.c_str());
     Clock::time_point start = Clock::now();
+    open();
     out.Init();
     long rows = 0;
     CQoString value;
@@ -68,49 +70,14 @@ void Write(const char* what, const std::string& connect, const char* file)
         out.WriteRow();
         ++rows;
     }
-    out.ReleaseDB();
+    close();
     double t = Seconds(start);
-    std::printf("%s: CQoOutputFilterODBC wrote %ld rows x %d columns in %.2f s = %.0f rows/s\n", what, rows, cols, t,
-                rows / t);
+    std::printf("%s wrote %ld rows x %d columns in %.2f s = %.0f rows/s\n", what, rows, cols, t, rows / t);
 }
 
-void WriteDao(const std::string& database, const char* file)
-{
-    CQoInputFilterTextVar in;
-    in.Delimiter(';');
-    in.SetFirstRowHasNames(true);
-    in.Init(file);
-    int const cols = in.NumCols();
-    CQoOutputFilterDao out;
-    out.SetTableName("bench");
-    out.NumCols(cols);
-    for (int c = 0; c < cols; ++c) {
-        CQoString name;
-        in.ColName(c, name);
-        out.ColumnName(c, name);
-        out.SetLength(c, 60);
-    }
-    Clock::time_point start = Clock::now();
-    out.UseDB(database.c_str());
-    out.Init();
-    long rows = 0;
-    CQoString value;
-    for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
-        out.InitRow();
-        for (int c = 0; c < cols; ++c) {
-            in.Value(c, value);
-            out.Value(c, value);
-        }
-        out.WriteRow();
-        ++rows;
-    }
-    out.ReleaseFile();
-    double t = Seconds(start);
-    std::printf("Access-type: CQoOutputFilterDao wrote %ld rows x %d columns in %.2f s = %.0f rows/s\n", rows, cols,
-                t, rows / t);
-}
-
-template <class Filter> void ReadAll(const char* what, Filter& in)
+// Reads every value of the table `in` stands on; prints the rate and the
+// working set, which must not grow with the rows.
+void ReadAll(const char* what, CQoInputFilter& in)
 {
     double before = WorkingSetMB();
     Clock::time_point start = Clock::now();
@@ -132,38 +99,28 @@ template <class Filter> void ReadAll(const char* what, Filter& in)
                 what, rows, t, rows / t, bytes, before, at100k, WorkingSetMB());
 }
 
-void ReadDao(const std::string& database)
+void Odbc(const char* what, const std::string& connect, const char* file)
 {
+    std::string label = std::string(what) + ": CQoOutputFilterODBC";
+    CQoOutputFilterODBC out;
+    Write(label.c_str(), out, file, [&] { out.UseDB(connect.c_str()); }, [&] { out.ReleaseDB(); });
+    CQoInputFilterODBC in(connect.c_str());
+    in.Init("");
+    in.InitTable("bench", CQoInputFilterDB::tableTable, false);
+    label = std::string(what) + ": CQoInputFilterODBC";
+    ReadAll(label.c_str(), in);
+}
+
+void Dao(const std::string& database, const char* file)
+{
+    CQoOutputFilterDao out;
+    Write("Access-type: CQoOutputFilterDao", out, file, [&] { out.UseDB(database.c_str()); },
+          [&] { out.ReleaseFile(); });
     CQoInputFilterDao in(CQoFile::typeAccess);
     in.SetTableName("bench");
     in.SetTableType(CQoInputFilterDB::tableTable);
     in.Init(database.c_str());
     ReadAll("Access-type: CQoInputFilterDao", in);
-}
-
-void Read(const char* what, const std::string& connect)
-{
-    CQoInputFilterODBC in(connect.c_str());
-    in.Init("");
-    double before = WorkingSetMB();
-    Clock::time_point start = Clock::now();
-    in.InitTable("bench", CQoInputFilterDB::tableTable, false);
-    long rows = 0;
-    std::size_t bytes = 0;
-    double at100k = 0;
-    CQoString value;
-    for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
-        for (int c = 0; c < in.NumCols(); ++c) {
-            in.Value(c, value);
-            bytes += static_cast<std::size_t>(value.GetLength());
-        }
-        if (++rows == 100000)
-            at100k = WorkingSetMB();
-    }
-    double t = Seconds(start);
-    std::printf("%s: CQoInputFilterODBC read %ld rows in %.2f s = %.0f rows/s (%zu value bytes); working set "
-                "%.1f MB before, %.1f MB after 100,000 rows, %.1f MB at the end\n",
-                what, rows, t, rows / t, bytes, before, at100k, WorkingSetMB());
 }
 } // namespace
 
@@ -177,22 +134,19 @@ int main(int argc, char** argv)
         std::string db = std::string(argv[2]) + "\\bench_odbc.db";
         DeleteFileA(db.c_str());
         std::string sqlite = "Driver=SQLite3;Database=" + db;
-        const char* only = std::getenv("QO_BENCH_ONLY");   // "sqlite" or "postgres", for profiling one
+        const char* only = std::getenv("QO_BENCH_ONLY");   // "sqlite", "dao" or "postgres", for profiling one
         if (!only || std::string(only) == "sqlite") {
-            Write("SQLite", sqlite, argv[1]);
-            Read("SQLite", sqlite);
+            Odbc("SQLite", sqlite, argv[1]);
         }
         if (!only || std::string(only) == "dao") {
             std::string mdb = std::string(argv[2]) + "\\bench_dao.mdb";
             DeleteFileA(mdb.c_str());
-            WriteDao(mdb, argv[1]);
-            ReadDao(mdb);
+            Dao(mdb, argv[1]);
         }
         if (only && std::string(only) != "postgres")
             return 0;
         if (const char* pg = std::getenv("QO_PG_CONNECT")) {
-            Write("PostgreSQL", pg, argv[1]);
-            Read("PostgreSQL", pg);
+            Odbc("PostgreSQL", pg, argv[1]);
         } else {
             std::printf("PostgreSQL: QO_PG_CONNECT is not set\n");
         }

@@ -1,6 +1,7 @@
 #include "CQoFile.h"
 
 #include "CQoException.h"
+#include "QoPathParts.h"
 
 #include <cerrno>
 #include <cstring>
@@ -705,24 +706,8 @@ std::string FullPath(char const *path)
         if (getcwd(cwd, sizeof cwd))
             text = std::string(cwd) + "/" + text;
     }
-    // Drop "." and empty parts, let ".." take away the part before it.
-    std::vector<std::string> parts;
-    std::size_t start = 0;
-    while (start <= text.size()) {
-        std::size_t slash = text.find('/', start);
-        if (slash == std::string::npos)
-            slash = text.size();
-        std::string part = text.substr(start, slash - start);
-        if (part == "..") {
-            if (!parts.empty())
-                parts.pop_back();
-        } else if (!part.empty() && part != ".") {
-            parts.push_back(part);
-        }
-        start = slash + 1;
-    }
     std::string out;
-    for (std::string const &part : parts)
+    for (std::string const &part : QoPathParts(text))
         out += "/" + part;
     return out.empty() ? "/" : out;
 #endif

@@ -1,6 +1,7 @@
 // The file-database filters on real files: Access-type databases made by the
 // tests (password prompt answered as a user would), the value-to-text rule,
 // and the .mdb files the set-up fetches.
+#include "FilterTestSupport.h"
 #include "OdbcTestTargets.h"
 
 #include <CQoConfigFile.h>
@@ -21,37 +22,6 @@
 using odbctest::Folder;
 
 namespace {
-
-typedef std::vector<std::string> Row;
-
-Row Current(CQoInputFilter& f)
-{
-    Row row;
-    CQoString value;
-    for (int c = 0; c < f.NumCols(); ++c) {
-        f.Value(c, value);
-        row.push_back(value.GetString());
-    }
-    return row;
-}
-
-std::vector<Row> Walk(CQoInputFilter& f)
-{
-    std::vector<Row> rows;
-    for (bool ok = f.FirstRow(); ok; ok = f.NextRow())
-        rows.push_back(Current(f));
-    return rows;
-}
-
-std::string ErrorOf(const std::function<void()>& action)
-{
-    try {
-        action();
-    } catch (const CQoException& e) {
-        return e.Message();
-    }
-    return std::string();
-}
 
 std::string Text(const COleVariant& v)
 {

@@ -1,6 +1,7 @@
 // The ODBC database, input and output filters on real data sources: what a
 // host reads and writes, the SQL the server receives, and what happens when
 // the source fails.
+#include "FilterTestSupport.h"
 #include "OdbcTestTargets.h"
 
 #include <CQoException.h>
@@ -18,37 +19,6 @@
 using namespace odbctest;
 
 namespace {
-
-typedef std::vector<std::string> Row;
-
-Row Current(CQoInputFilter& f)
-{
-    Row row;
-    CQoString value;
-    for (int c = 0; c < f.NumCols(); ++c) {
-        f.Value(c, value);
-        row.push_back(value.GetString());
-    }
-    return row;
-}
-
-std::vector<Row> Walk(CQoInputFilter& f)
-{
-    std::vector<Row> rows;
-    for (bool ok = f.FirstRow(); ok; ok = f.NextRow())
-        rows.push_back(Current(f));
-    return rows;
-}
-
-std::string ErrorOf(const std::function<void()>& action)
-{
-    try {
-        action();
-    } catch (const CQoException& e) {
-        return e.Message();
-    }
-    return std::string();
-}
 
 // Values that must arrive exactly: quotes, semicolons, umlauts, a long text.
 const std::vector<Row> kRows = {

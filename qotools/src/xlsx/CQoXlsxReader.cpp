@@ -1,6 +1,7 @@
 #include "CQoXlsxReader.h"
 
 #include "CQoException.h"
+#include "../QoPathParts.h"
 #include "QoXmlScanner.h"
 #include "QoZipArchive.h"
 
@@ -54,23 +55,8 @@ std::string Folder(std::string const &part)
 std::string ResolveTarget(std::string const &base, std::string const &target)
 {
     std::string joined = !target.empty() && target[0] == '/' ? target.substr(1) : base + target;
-    std::vector<std::string> parts;
-    std::size_t start = 0;
-    while (start <= joined.size()) {
-        std::size_t slash = joined.find('/', start);
-        if (slash == std::string::npos)
-            slash = joined.size();
-        std::string piece = joined.substr(start, slash - start);
-        if (piece == "..") {
-            if (!parts.empty())
-                parts.pop_back();
-        } else if (!piece.empty() && piece != ".") {
-            parts.push_back(piece);
-        }
-        start = slash + 1;
-    }
     std::string out;
-    for (std::string const &p : parts)
+    for (std::string const &p : QoPathParts(joined))
         out += (out.empty() ? "" : "/") + p;
     return out;
 }
