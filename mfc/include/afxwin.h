@@ -1099,6 +1099,26 @@ private:
   void CommonConstruct();
 };
 
+// ---------------------------------------------------------------------------
+// CFrameWnd: the application's main window. The subset holds what is read of
+// it from outside: its accelerator table. Frames live on the heap and delete
+// themselves when their window is gone.
+// ---------------------------------------------------------------------------
+
+class AFX_API CFrameWnd : public CWnd {
+  DECLARE_DYNCREATE(CFrameWnd)
+public:
+  CFrameWnd();
+  virtual ~CFrameWnd();
+
+  // The accelerators of the frame; NULL when it has none. Not destroyed with
+  // the frame: a table loaded from resources is freed by the system.
+  HACCEL m_hAccelTable;
+
+protected:
+  virtual void PostNcDestroy();
+};
+
 AFX_API INT_PTR CALLBACK AfxDlgProc(HWND hWnd, UINT message, WPARAM wParam, LPARAM lParam);
 
 // ---------------------------------------------------------------------------
