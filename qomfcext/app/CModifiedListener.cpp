@@ -1,0 +1,4 @@
+#include "CModifiedListener.h"
+
+// Out of line so that the class's virtual table lives in the library.
+CModifiedListener::~CModifiedListener() {}

@@ -1,0 +1,209 @@
+// A page embedded in a real main frame: the frame's shortcuts while the focus
+// is in the page, ordinary dialog keys, and Enter and Escape leaving the page
+// where it is. Keys are real keyboard input, read by a loop that gives the
+// windows' PreTranslateMessage its turn as the application's own loop does.
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "AppTestRes.h"
+#include "CModelessDialog.h"
+#include "DialogDriver.h"
+#include "Input.h"
+
+namespace {
+
+const UINT ID_CMD_CTRL_K = 32801;
+const UINT ID_CMD_F5 = 32802;
+
+class CTestFrame : public CFrameWnd {
+public:
+    int m_nCtrlK = 0;
+    int m_nF5 = 0;
+
+protected:
+    afx_msg void OnCtrlK() { ++m_nCtrlK; }
+    afx_msg void OnF5() { ++m_nF5; }
+    DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CTestFrame, CFrameWnd)
+    ON_COMMAND(ID_CMD_CTRL_K, OnCtrlK)
+    ON_COMMAND(ID_CMD_F5, OnF5)
+END_MESSAGE_MAP()
+
+// A page that counts Enter and Escape and then leaves them to the base.
+class CTestPage : public CModelessDialog {
+public:
+    explicit CTestPage(CWnd* pParent) : CModelessDialog(IDD_TEST_PAGE, pParent) {}
+    int m_nOk = 0;
+    int m_nCancel = 0;
+
+protected:
+    void OnOK() override
+    {
+        ++m_nOk;
+        CModelessDialog::OnOK();
+    }
+    void OnCancel() override
+    {
+        ++m_nCancel;
+        CModelessDialog::OnCancel();
+    }
+};
+
+// The application's message loop in small: PreTranslateMessage first.
+void PumpApp(DWORD ms)
+{
+    const DWORD start = GetTickCount();
+    for (;;) {
+        MSG msg;
+        while (PeekMessageA(&msg, NULL, 0, 0, PM_REMOVE)) {
+            if (msg.message == WM_QUIT) {
+                PostQuitMessage(static_cast<int>(msg.wParam));
+                return;
+            }
+            if (!AfxPreTranslateMessage(&msg)) {
+                TranslateMessage(&msg);
+                DispatchMessageA(&msg);
+            }
+        }
+        const DWORD elapsed = GetTickCount() - start;
+        if (elapsed >= ms) return;
+        MsgWaitForMultipleObjects(0, NULL, FALSE, ms - elapsed, QS_ALLINPUT);
+    }
+}
+
+void Press(WORD vk, bool ctrl = false)
+{
+    if (ctrl) qotest::InjectKey(VK_CONTROL, true);
+    qotest::InjectKey(vk, true);
+    qotest::InjectKey(vk, false);
+    if (ctrl) qotest::InjectKey(VK_CONTROL, false);
+    PumpApp(250);
+}
+
+std::string Text(HWND hwnd)
+{
+    char buf[256] = "";
+    GetWindowTextA(hwnd, buf, sizeof(buf));
+    return buf;
+}
+
+class ModelessDialogTest : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        m_pFrame = new CTestFrame;
+        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW),
+                                                              (HBRUSH)(COLOR_WINDOW + 1)),
+                                       "Hauptfenster", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 40, 40, 480, 300,
+                                       NULL, NULL));
+        ACCEL keys[] = {{FVIRTKEY | FCONTROL, 'K', (WORD)ID_CMD_CTRL_K}, {FVIRTKEY, VK_F5, (WORD)ID_CMD_F5}};
+        m_hAccel = CreateAcceleratorTableA(keys, 2);
+        m_pFrame->m_hAccelTable = m_hAccel;
+        AfxGetApp()->m_pMainWnd = m_pFrame;
+
+        m_pPage = new CTestPage(m_pFrame);
+        ASSERT_TRUE(m_pPage->Create(IDD_TEST_PAGE, m_pFrame));
+        ASSERT_FALSE(m_pPage->IsWindowVisible());  // the application shows it
+        m_pPage->SetWindowPos(NULL, 10, 10, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
+        m_pPage->ShowWindow(SW_SHOW);
+        m_hFirst = ::GetDlgItem(m_pPage->m_hWnd, IDC_PAGE_FIRST);
+        m_hSecond = ::GetDlgItem(m_pPage->m_hWnd, IDC_PAGE_SECOND);
+        qotest::BringToFront(m_pFrame->m_hWnd);
+        qotest::Focus(m_hFirst);
+        ASSERT_EQ(m_hFirst, GetFocus());
+    }
+
+    void TearDown() override
+    {
+        if (m_pPage != NULL) {
+            if (m_pPage->m_hWnd != NULL) m_pPage->DestroyWindow();
+            delete m_pPage;
+        }
+        AfxGetApp()->m_pMainWnd = NULL;  // else its end would end the program's loop
+        if (m_pFrame != NULL && ::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();  // deletes it
+        if (m_hAccel != NULL) DestroyAcceleratorTable(m_hAccel);
+        qotest::PumpFor(50);
+    }
+
+    CTestFrame* m_pFrame = nullptr;
+    CTestPage* m_pPage = nullptr;
+    HACCEL m_hAccel = NULL;
+    HWND m_hFirst = NULL, m_hSecond = NULL;
+};
+
+TEST_F(ModelessDialogTest, IsADialogOfItsOwnClass)
+{
+    CRuntimeClass* rc = m_pPage->GetRuntimeClass();
+    ASSERT_NE(nullptr, rc);
+    EXPECT_STREQ("CModelessDialog", RUNTIME_CLASS(CModelessDialog)->m_lpszClassName);
+    EXPECT_TRUE(m_pPage->IsKindOf(RUNTIME_CLASS(CDialog)));
+    EXPECT_EQ(nullptr, RUNTIME_CLASS(CModelessDialog)->CreateObject());
+    EXPECT_TRUE(m_pPage->GetStyle() & WS_CHILD);
+    EXPECT_EQ(m_pFrame->m_hWnd, ::GetParent(m_pPage->m_hWnd));
+}
+
+TEST_F(ModelessDialogTest, FrameShortcutsRunTheFramesCommandAndTheEditDoesNotSeeThem)
+{
+    Press('K', true);
+    EXPECT_EQ(1, m_pFrame->m_nCtrlK);
+    Press(VK_F5);
+    EXPECT_EQ(1, m_pFrame->m_nF5);
+    EXPECT_EQ("", Text(m_hFirst));
+    EXPECT_EQ(m_hFirst, GetFocus());
+
+    // Keys that are no shortcut are the page's as in any dialog.
+    Press('A');
+    EXPECT_EQ("a", Text(m_hFirst));
+    Press(VK_TAB);
+    EXPECT_EQ(m_hSecond, GetFocus());
+    Press('B');
+    EXPECT_EQ("b", Text(m_hSecond));
+    EXPECT_EQ(1, m_pFrame->m_nCtrlK);
+    EXPECT_EQ(1, m_pFrame->m_nF5);
+}
+
+TEST_F(ModelessDialogTest, WithoutAFrameAsMainWindowTheKeysStayWithThePage)
+{
+    // Main windows that are no frame, or a frame without accelerators.
+    CWnd plain;
+    ASSERT_TRUE(plain.CreateEx(0, AfxRegisterWndClass(0), "kein Rahmen", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
+    CWnd* const mains[] = {NULL, &plain, m_pFrame};
+    for (CWnd* pMain : mains) {
+        SCOPED_TRACE(pMain == NULL ? "none" : pMain == &plain ? "plain window" : "frame without table");
+        AfxGetApp()->m_pMainWnd = pMain;
+        if (pMain == m_pFrame) m_pFrame->m_hAccelTable = NULL;
+        ::SetWindowTextA(m_hFirst, "");
+        qotest::Focus(m_hFirst);
+        Press('K', true);  // Ctrl+K in an edit types nothing either
+        Press(VK_F5);
+        Press('C');
+        EXPECT_EQ(0, m_pFrame->m_nCtrlK);
+        EXPECT_EQ(0, m_pFrame->m_nF5);
+        EXPECT_EQ("c", Text(m_hFirst));
+    }
+    AfxGetApp()->m_pMainWnd = m_pFrame;
+    plain.DestroyWindow();
+}
+
+TEST_F(ModelessDialogTest, EnterAndEscapeReachThePageAndLeaveItOpen)
+{
+    Press('X');
+    Press(VK_RETURN);
+    EXPECT_EQ(1, m_pPage->m_nOk);
+    Press(VK_ESCAPE);
+    EXPECT_EQ(1, m_pPage->m_nCancel);
+    // The user closing the page's window (no caption: only by message) is Cancel too.
+    m_pPage->SendMessage(WM_CLOSE);
+    PumpApp(100);
+    EXPECT_EQ(2, m_pPage->m_nCancel);
+
+    EXPECT_TRUE(::IsWindow(m_pPage->m_hWnd));
+    EXPECT_TRUE(m_pPage->IsWindowVisible());
+    EXPECT_EQ("x", Text(m_hFirst));
+    EXPECT_EQ(0, m_pFrame->m_nCtrlK + m_pFrame->m_nF5);
+}
+
+}  // namespace
