@@ -1,0 +1,92 @@
+// The report list and its header: one common-control message per operation.
+#include "afxpriv.h"
+#include "afxcmn.h"
+
+IMPLEMENT_DYNAMIC(CHeaderCtrl, CWnd)
+IMPLEMENT_DYNAMIC(CListCtrl, CWnd)
+
+static inline LRESULT SendCtrl(HWND hWnd, UINT message, WPARAM wParam, LPARAM lParam) {
+  ASSERT(::IsWindow(hWnd));
+  return ::SendMessageA(hWnd, message, wParam, lParam);
+}
+#define SEND(msg, w, l) SendCtrl(m_hWnd, (msg), (WPARAM)(w), (LPARAM)(l))
+
+// ---------------------------------------------------------------------------
+// CHeaderCtrl
+// ---------------------------------------------------------------------------
+
+int CHeaderCtrl::GetItemCount() const { return (int)SEND(HDM_GETITEMCOUNT, 0, 0); }
+BOOL CHeaderCtrl::SetItem(int nPos, HDITEM* pHeaderItem) { return (BOOL)SEND(HDM_SETITEMA, nPos, pHeaderItem); }
+BOOL CHeaderCtrl::GetItemRect(int nIndex, LPRECT lpRect) const { return (BOOL)SEND(HDM_GETITEMRECT, nIndex, lpRect); }
+
+// ---------------------------------------------------------------------------
+// CListCtrl
+// ---------------------------------------------------------------------------
+
+BOOL CListCtrl::Create(DWORD dwStyle, const RECT& rect, CWnd* pParentWnd, UINT nID) {
+  return CWnd::Create(WC_LISTVIEWA, NULL, dwStyle, rect, pParentWnd, nID);
+}
+CHeaderCtrl* CListCtrl::GetHeaderCtrl() const {
+  HWND hHeader = (HWND)SEND(LVM_GETHEADER, 0, 0);
+  return hHeader == NULL ? NULL : (CHeaderCtrl*)CWnd::FromHandle(hHeader);
+}
+int CListCtrl::InsertColumn(int nCol, LPCTSTR lpszColumnHeading, int nFormat, int nWidth, int nSubItem) {
+  LVCOLUMNA column;
+  memset(&column, 0, sizeof(column));
+  column.mask = LVCF_TEXT | LVCF_FMT;
+  column.pszText = (LPSTR)lpszColumnHeading;
+  column.fmt = nFormat;
+  if (nWidth != -1) {
+    column.mask |= LVCF_WIDTH;
+    column.cx = nWidth;
+  }
+  if (nSubItem != -1) {
+    column.mask |= LVCF_SUBITEM;
+    column.iSubItem = nSubItem;
+  }
+  return (int)SEND(LVM_INSERTCOLUMNA, nCol, &column);
+}
+BOOL CListCtrl::GetColumn(int nCol, LVCOLUMN* pColumn) const { return (BOOL)SEND(LVM_GETCOLUMNA, nCol, pColumn); }
+int CListCtrl::GetColumnWidth(int nCol) const { return (int)SEND(LVM_GETCOLUMNWIDTH, nCol, 0); }
+BOOL CListCtrl::SetColumnWidth(int nCol, int cx) { return (BOOL)SEND(LVM_SETCOLUMNWIDTH, nCol, MAKELPARAM(cx, 0)); }
+BOOL CListCtrl::GetColumnOrderArray(LPINT piArray, int iCount) const {
+  if (iCount < 0) {
+    CHeaderCtrl* pHeader = GetHeaderCtrl();
+    if (pHeader == NULL) return FALSE;
+    iCount = pHeader->GetItemCount();
+  }
+  return (BOOL)SEND(LVM_GETCOLUMNORDERARRAY, iCount, piArray);
+}
+BOOL CListCtrl::SetColumnOrderArray(int iCount, LPINT piArray) {
+  return (BOOL)SEND(LVM_SETCOLUMNORDERARRAY, iCount, piArray);
+}
+int CListCtrl::GetItemCount() const { return (int)SEND(LVM_GETITEMCOUNT, 0, 0); }
+void CListCtrl::SetItemCountEx(int iCount, DWORD dwFlags) {
+  ASSERT((GetStyle() & LVS_OWNERDATA) != 0 || dwFlags == 0);
+  SEND(LVM_SETITEMCOUNT, iCount, dwFlags);
+}
+BOOL CListCtrl::GetItemRect(int nItem, LPRECT lpRect, UINT nCode) const {
+  ASSERT(lpRect != NULL);
+  lpRect->left = (LONG)nCode;
+  return (BOOL)SEND(LVM_GETITEMRECT, nItem, lpRect);
+}
+UINT CListCtrl::GetItemState(int nItem, UINT nMask) const { return (UINT)SEND(LVM_GETITEMSTATE, nItem, nMask); }
+BOOL CListCtrl::SetItemState(int nItem, UINT nState, UINT nMask) {
+  LVITEMA item;
+  memset(&item, 0, sizeof(item));
+  item.stateMask = nMask;
+  item.state = nState;
+  return (BOOL)SEND(LVM_SETITEMSTATE, nItem, &item);
+}
+COLORREF CListCtrl::GetBkColor() const { return (COLORREF)SEND(LVM_GETBKCOLOR, 0, 0); }
+
+void CListCtrl::DrawItem(LPDRAWITEMSTRUCT) {
+  ASSERT(FALSE); // an owner-drawn list must override DrawItem
+}
+
+BOOL CListCtrl::OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* pResult) {
+  if (message != WM_DRAWITEM) return CWnd::OnChildNotify(message, wParam, lParam, pResult);
+  DrawItem((LPDRAWITEMSTRUCT)lParam);
+  if (pResult != NULL) *pResult = TRUE;
+  return TRUE;
+}
