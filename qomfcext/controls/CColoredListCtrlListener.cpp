@@ -1,0 +1,7 @@
+#include <afxwin.h>
+
+#include "CColoredListCtrlListener.h"
+
+void CColoredListCtrlListener::ColoredListCtrlOrderChanged()
+{
+}

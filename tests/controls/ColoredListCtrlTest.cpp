@@ -1,0 +1,345 @@
+// The coloured list on a real window: a virtual list of a million rows whose
+// cells a subclass answers, checked by the pixels a user would see, and its
+// header driven with the real mouse.
+#include <gtest/gtest.h>
+
+#include <afxcmn.h>
+
+#include <string>
+
+#include "CColoredListCtrl.h"
+#include "Capture.h"
+#include "DialogDriver.h"
+#include "Input.h"
+
+namespace {
+
+const int kRows = 1000000;
+const int kEmptyRow = 5;  // answers "no data": painted as a line
+const int kColumns = 5;
+const COLORREF kColumnColour[kColumns] = {RGB(200, 0, 0), RGB(0, 140, 0), RGB(0, 0, 220), RGB(120, 0, 120),
+                                          RGB(0, 120, 120)};
+const COLORREF kSelectedColour = RGB(255, 255, 0);
+
+class CTestList : public CColoredListCtrl {
+public:
+    bool m_bAllowChange = true;
+    int m_nChanged = 0;
+
+    int GetColoredItem(int row, int col, CString& text, DWORD& clr, DWORD& clrSelected, bool& bold) override
+    {
+        clr = kColumnColour[col];
+        clrSelected = kSelectedColour;
+        bold = col == 0 && row % 2 == 0;
+        if (row == kEmptyRow) return 0;
+        if (col == 0)
+            text = "Kopfzeile";  // the same in every row, so that only the weight differs
+        else if (col == 2)
+            text.Format("WWWWWWWWWWWWWWWWWWWWWWWW %d", row);  // wider than its column
+        else if (col == 4)
+            text = "i";
+        else
+            text.Format("%c%d", 'A' + col, row);
+        return 1;
+    }
+    bool ItemChanging() override { return m_bAllowChange; }
+    void ItemChanged() override { ++m_nChanged; }
+};
+
+class CountingListener : public CColoredListCtrlListener {
+public:
+    int m_nCalls = 0;
+    void ColoredListCtrlOrderChanged() override { ++m_nCalls; }
+};
+
+class ColoredListCtrlTest : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        m_pFrame = new CFrameWnd;
+        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW),
+                                                              (HBRUSH)(COLOR_WINDOW + 1)),
+                                       "Liste", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 30, 30, 640, 360, NULL, NULL));
+        ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | WS_BORDER | LVS_REPORT | LVS_OWNERDRAWFIXED |
+                                      LVS_OWNERDATA | LVS_SHOWSELALWAYS,
+                                  CRect(5, 5, 605, 305), m_pFrame, 100));
+        m_list.SendMessage(LVM_SETEXTENDEDLISTVIEWSTYLE, LVS_EX_HEADERDRAGDROP, LVS_EX_HEADERDRAGDROP);
+        const char* captions[kColumns] = {"Name", "Ort", "Lang", "Rechts", "Mitte"};
+        const int formats[kColumns] = {LVCFMT_LEFT, LVCFMT_LEFT, LVCFMT_LEFT, LVCFMT_RIGHT, LVCFMT_CENTER};
+        for (int c = 0; c < kColumns; ++c) m_list.InsertColumn(c, captions[c], formats[c], 110);
+        m_list.SetItemCountEx(kRows, 0);
+        m_list.Init();
+        m_list.AddListener(&m_listener);
+        qotest::BringToFront(m_pFrame->m_hWnd);
+    }
+
+    void TearDown() override
+    {
+        m_list.RemoveListener(&m_listener);
+        if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();  // deletes it
+        qotest::PumpFor(50);
+    }
+
+    void Repaint()
+    {
+        m_list.Invalidate();
+        m_list.UpdateWindow();
+        qotest::PumpFor(100);
+    }
+
+    qotest::Image Capture()
+    {
+        Repaint();
+        qotest::Image img;
+        EXPECT_TRUE(qotest::CaptureImage(m_list.m_hWnd, img, true));
+        return img;
+    }
+
+    CRect Cell(int row, int col)
+    {
+        CRect rc;
+        m_list.GetItemRect(row, &rc, LVIR_BOUNDS);
+        CRect head;
+        m_list.GetHeaderCtrl()->GetItemRect(col, &head);
+        return CRect(head.left, rc.top, head.right, rc.bottom);
+    }
+
+    static bool Contains(const qotest::Image& img, const CRect& rc, COLORREF colour)
+    {
+        for (int y = rc.top; y < rc.bottom; ++y)
+            for (int x = rc.left; x < rc.right; ++x)
+                if (img.Pixel(x, y) == colour) return true;
+        return false;
+    }
+
+    static int Ink(const qotest::Image& img, const CRect& rc, COLORREF background)
+    {
+        int n = 0;
+        for (int y = rc.top; y < rc.bottom; ++y)
+            for (int x = rc.left; x < rc.right; ++x)
+                if (img.Pixel(x, y) != background) ++n;
+        return n;
+    }
+
+    // The leftmost / rightmost x in rc holding the colour, or -1.
+    static int Edge(const qotest::Image& img, const CRect& rc, COLORREF colour, bool fromRight)
+    {
+        for (int i = 0; i < rc.Width(); ++i) {
+            const int x = fromRight ? rc.right - 1 - i : rc.left + i;
+            for (int y = rc.top; y < rc.bottom; ++y)
+                if (img.Pixel(x, y) == colour) return x;
+        }
+        return -1;
+    }
+
+    int HeaderMiddleY()
+    {
+        CRect rc;
+        m_list.GetHeaderCtrl()->GetItemRect(0, &rc);
+        return rc.CenterPoint().y;
+    }
+
+    CFrameWnd* m_pFrame = nullptr;
+    CTestList m_list;
+    CountingListener m_listener;
+};
+
+TEST_F(ColoredListCtrlTest, PaintsEachCellInItsOwnColoursOnTheRowsBackground)
+{
+    m_list.SetHeaderLines(1);
+    m_list.SetItemState(0, LVIS_SELECTED, LVIS_SELECTED);
+    m_list.SetItemState(2, LVIS_SELECTED, LVIS_SELECTED);
+    qotest::Image img = Capture();
+    qotest::CaptureWindow(m_pFrame->m_hWnd, qotest::CapturePath("coloured-list.png").c_str());
+    const COLORREF face = ::GetSysColor(COLOR_BTNFACE);
+    const COLORREF highlight = ::GetSysColor(COLOR_HIGHLIGHT);
+    const COLORREF window = m_list.GetBkColor();
+
+    struct Case {
+        const char* what;
+        int row;
+        COLORREF background;
+        COLORREF text;  // of column 1
+    } cases[] = {
+        {"caption row, selected", 0, face, kSelectedColour},
+        {"plain row", 1, window, kColumnColour[1]},
+        {"selected row", 2, highlight, kSelectedColour},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        const CRect cell = Cell(c.row, 1);
+        EXPECT_EQ(c.background, img.Pixel(cell.right - 3, cell.top + 1));
+        EXPECT_TRUE(Contains(img, cell, c.text));
+    }
+    EXPECT_TRUE(Contains(img, Cell(1, 0), kColumnColour[0]));
+    EXPECT_GT(Ink(img, Cell(4, 0), window), Ink(img, Cell(3, 0), window) + 5) << "row 4 is bold";
+
+    // The row without data: a 2-pixel line centred across the whole row, no texts.
+    CRect row;
+    m_list.GetItemRect(kEmptyRow, &row, LVIR_BOUNDS);
+    const int top = row.top + (row.Height() - 2) / 2;
+    for (int col : {0, 2, 4}) {
+        const int x = Cell(kEmptyRow, col).CenterPoint().x;
+        EXPECT_EQ(kColumnColour[0], img.Pixel(x, top));
+        EXPECT_EQ(kColumnColour[0], img.Pixel(x, top + 1));
+        EXPECT_EQ(window, img.Pixel(x, top - 1));
+        EXPECT_EQ(window, img.Pixel(x, top + 2));
+    }
+}
+
+TEST_F(ColoredListCtrlTest, AlignsByColumnFormatAndEndsLongTextsInAnEllipsis)
+{
+    qotest::Image img = Capture();
+    // The cells are laid out from the left edge of column 0's label.
+    CRect label;
+    m_list.GetItemRect(1, &label, LVIR_LABEL);
+    const CRect right = Cell(1, 3);
+    const int lastInk = Edge(img, right + CPoint(label.left, 0), kColumnColour[3], true);
+    EXPECT_GE(lastInk, right.right + label.left - 4 - 3);  // the text ends 4 pixels short of the edge
+    EXPECT_LT(lastInk, right.right + label.left - 4);
+
+    const CRect centred = Cell(1, 4);  // painted left-aligned
+    const int firstInk = Edge(img, centred, kColumnColour[4], false);
+    EXPECT_GE(firstInk, centred.left);
+    EXPECT_LT(firstInk, centred.left + 10);
+
+    // The long text is cut with "..." instead of running into the next column.
+    const CRect long_ = Cell(1, 2);
+    EXPECT_LT(Edge(img, long_, kColumnColour[2], true), long_.right + label.left - 4);
+    EXPECT_FALSE(Contains(img, Cell(1, 3), kColumnColour[2]));
+}
+
+TEST_F(ColoredListCtrlTest, HidesSelectionAndFocusWhenAskedTo)
+{
+    m_list.SetItemState(2, LVIS_SELECTED | LVIS_FOCUSED, LVIS_SELECTED | LVIS_FOCUSED);
+    qotest::Image shown = Capture();
+    EXPECT_EQ(::GetSysColor(COLOR_HIGHLIGHT), shown.Pixel(Cell(2, 1).right - 3, Cell(2, 1).top + 1));
+
+    m_list.SetDontShowSelected(true);
+    qotest::Image hidden = Capture();
+    // Row 2 now looks like row 3 apart from the row numbers in its texts: compare the
+    // pixels of the last column, whose text is the same in every row.
+    const CRect a = Cell(2, 4), b = Cell(3, 4);
+    for (int y = 0; y < a.Height(); ++y)
+        for (int x = a.left; x < a.right; ++x)
+            ASSERT_EQ(hidden.Pixel(x, b.top + y), hidden.Pixel(x, a.top + y)) << x << "," << y;
+}
+
+TEST_F(ColoredListCtrlTest, AUserDraggingAColumnTellsEachListenerOnce)
+{
+    CountingListener second;
+    m_list.AddListener(&second);
+    m_list.AddListener(&second);  // held once
+    Repaint();
+    ASSERT_EQ(0, m_listener.m_nCalls);  // the first paint only learns the order
+
+    CRect first, third;
+    m_list.GetHeaderCtrl()->GetItemRect(0, &first);
+    m_list.GetHeaderCtrl()->GetItemRect(2, &third);
+    const int y = HeaderMiddleY();
+    qotest::Drag(m_list.GetHeaderCtrl()->m_hWnd, {first.CenterPoint().x, y}, {third.right - 10, y});
+    Repaint();
+    int order[kColumns] = {};
+    m_list.GetColumnOrderArray(order, kColumns);
+    ASSERT_NE(0, order[0]) << "the drag did not move column 0";
+    EXPECT_EQ(1, m_listener.m_nCalls);
+    EXPECT_EQ(1, second.m_nCalls);
+
+    // Resizing or adding a column is no new order; a removed listener hears nothing.
+    m_list.RemoveListener(&second);
+    m_list.SetColumnWidth(1, 60);
+    Repaint();
+    m_list.InsertColumn(kColumns, "Neu", LVCFMT_LEFT, 40);
+    Repaint();
+    EXPECT_EQ(1, m_listener.m_nCalls);
+    EXPECT_EQ(1, second.m_nCalls);
+
+    // Column 0's cells follow it to its new place.
+    qotest::Image img = Capture();
+    EXPECT_TRUE(Contains(img, Cell(1, 0), kColumnColour[0]));
+}
+
+TEST_F(ColoredListCtrlTest, DoubleClickNearADividerSizesTheColumnToItsWidestText)
+{
+    const int wide = m_list.GetMaxColumnWidth(2);
+    EXPECT_GT(wide, 110);
+    struct Case {
+        const char* what;
+        int item;      // header item clicked
+        int offset;    // from its left edge (>= 0) or right edge (< 0)
+        int sized;     // column expected to change, -1: none
+    } cases[] = {
+        {"5 px right of the divider 2|3", 3, 5, 2},
+        {"5 px left of the divider 2|3", 2, -5, 2},
+        {"middle of column 2", 2, 55, -1},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        for (int col = 0; col < kColumns; ++col) m_list.SetColumnWidth(col, 110);
+        qotest::PumpFor(50);
+        CRect rc;
+        m_list.GetHeaderCtrl()->GetItemRect(c.item, &rc);
+        const int x = c.offset >= 0 ? rc.left + c.offset : rc.right + c.offset;
+        qotest::DoubleClick(m_list.GetHeaderCtrl()->m_hWnd, x, HeaderMiddleY());
+        for (int col = 0; col < kColumns; ++col)
+            EXPECT_EQ(col == c.sized ? wide : 110, m_list.GetColumnWidth(col)) << "column " << col;
+    }
+}
+
+TEST_F(ColoredListCtrlTest, WidestTextIsAtLeastFiftyPixels)
+{
+    CDC* pDC = m_list.GetDC();
+    CFont* pOld = pDC->SelectObject(m_list.GetFont());
+    CRect rc(0, 0, 0, 0);
+    pDC->DrawText(CString("WWWWWWWWWWWWWWWWWWWWWWWW 299"), &rc, DT_CALCRECT | DT_SINGLELINE);
+    if (pOld != NULL) pDC->SelectObject(pOld);
+    m_list.ReleaseDC(pDC);
+
+    EXPECT_EQ(rc.Width(), m_list.GetMaxColumnWidth(2));  // the widest of the first 300 rows
+    struct Case {
+        const char* what;
+        int column;
+    } cases[] = {{"short texts", 4}, {"negative index", -1}, {"index past the columns", kColumns}};
+    for (const Case& c : cases) EXPECT_EQ(50, m_list.GetMaxColumnWidth(c.column)) << c.what;
+    m_list.SetItemCountEx(0, 0);
+    EXPECT_EQ(50, m_list.GetMaxColumnWidth(2)) << "empty list";
+}
+
+TEST_F(ColoredListCtrlTest, ClickingARowAsksBeforeTheSelectionChanges)
+{
+    // A virtual list is never asked (the platform sends no LVN_ITEMCHANGING for it),
+    // only told; a list that holds its items is asked first.
+    CRect row;
+    m_list.GetItemRect(3, &row, LVIR_BOUNDS);
+    qotest::Click(m_list.m_hWnd, row.left + 20, row.CenterPoint().y);
+    EXPECT_EQ((UINT)LVIS_SELECTED, m_list.GetItemState(3, LVIS_SELECTED));
+    EXPECT_GT(m_list.m_nChanged, 0);
+
+    m_list.DestroyWindow();
+    ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | LVS_REPORT | LVS_OWNERDRAWFIXED, CRect(5, 5, 605, 305),
+                              m_pFrame, 101));
+    m_list.InsertColumn(0, "Name", LVCFMT_LEFT, 110);
+    for (int i = 0; i < 5; ++i) {
+        LVITEMA item = {};
+        item.mask = LVIF_TEXT;
+        item.pszText = (LPSTR) "Zeile";
+        item.iItem = i;
+        m_list.SendMessage(LVM_INSERTITEMA, 0, (LPARAM)&item);
+    }
+    qotest::PumpFor(50);
+    struct Case {
+        bool allow;
+        int clicked;
+        int selectedAfter;
+    } cases[] = {{true, 3, 3}, {false, 1, 3}};
+    for (const Case& c : cases) {
+        m_list.m_bAllowChange = c.allow;
+        m_list.GetItemRect(c.clicked, &row, LVIR_LABEL);
+        qotest::Click(m_list.m_hWnd, row.left + 4, row.CenterPoint().y);
+        qotest::PumpFor(300);  // two clicks are not one double click
+        EXPECT_EQ(c.selectedAfter, (int)m_list.SendMessage(LVM_GETNEXTITEM, (WPARAM)-1, LVNI_SELECTED))
+            << "allowed: " << c.allow;
+    }
+}
+
+}  // namespace
