@@ -176,16 +176,7 @@ long CConversion::RunRecords()
         }
         odbc->UseDB(m_outputConnect);
     } else {
-        if (CQoFile::SameFile(m_inputFile, m_outputFile))
-            CQoException::Throw("Die Ausgabedatei ist die Eingabedatei.", "CConversion::Run");
-        temp = CQoFile::NewTempFileBeside(m_outputFile);
-        if (temp.empty() || !file.Open(temp.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary)) {
-            if (!temp.empty())
-                CQoFile::Remove(temp.c_str());
-            CQoString text;
-            text.Format("Die Ausgabedatei '%s' kann nicht angelegt werden.", (const char*)m_outputFile);
-            CQoException::Throw(text, "CConversion::Run");
-        }
+        temp = OpenOutputBeside(file, CQoFile::binary);
         CQoOutputFilterTextVar* text = new CQoOutputFilterTextVar;
         output.reset(text);
         text->NumCols(columns);
@@ -231,16 +222,12 @@ long CConversion::RunRecords()
         }
         throw;
     }
-    if (!temp.empty() && !CQoFile::MoveOver(temp.c_str(), m_outputFile)) {
-        CQoFile::Remove(temp.c_str());
-        CQoString text;
-        text.Format("Die Ausgabedatei '%s' kann nicht ersetzt werden.", (const char*)m_outputFile);
-        CQoException::Throw(text, "CConversion::Run");
-    }
+    if (!temp.empty())
+        PutOutputInPlace(temp);
     return records;
 }
 
-long CConversion::RunLines()
+std::string CConversion::OpenOutputBeside(CQoFile& file, int mode)
 {
     // Writing over the input would destroy it before it is read: the same
     // file under another spelling (case, "..", "./") counts as the same.
@@ -250,24 +237,42 @@ long CConversion::RunLines()
                     (const char*)m_outputFile, (const char*)m_inputFile);
         CQoException::Throw(text, "CConversion::Run");
     }
-    CQoFile input;
-    if (!input.Open(m_inputFile, CQoFile::read | FileMode(m_inputCharset))) {
-        CQoString text;
-        text.Format("Die Eingabedatei '%s' kann nicht ge\xF6" "ffnet werden.", (const char*)m_inputFile);
-        CQoException::Throw(text, "CConversion::Run");
-    }
-
     // The output is written beside the target and takes its place only when
     // complete: a stopped run or a full disk leaves the previous output.
     std::string temp = CQoFile::NewTempFileBeside(m_outputFile);
-    CQoFile output;
-    if (temp.empty() || !output.Open(temp.c_str(), CQoFile::write | CQoFile::create | FileMode(m_outputCharset))) {
+    if (temp.empty() || !file.Open(temp.c_str(), CQoFile::write | CQoFile::create | mode)) {
         if (!temp.empty())
             CQoFile::Remove(temp.c_str());
         CQoString text;
         text.Format("Die Ausgabedatei '%s' kann nicht angelegt werden.", (const char*)m_outputFile);
         CQoException::Throw(text, "CConversion::Run");
     }
+    return temp;
+}
+
+void CConversion::PutOutputInPlace(const std::string& temp)
+{
+    if (!CQoFile::MoveOver(temp.c_str(), m_outputFile)) {
+        CQoFile::Remove(temp.c_str());
+        CQoString text;
+        text.Format("Die Ausgabedatei '%s' kann nicht ersetzt werden.", (const char*)m_outputFile);
+        CQoException::Throw(text, "CConversion::Run");
+    }
+}
+
+long CConversion::RunLines()
+{
+    CQoFile output;
+    std::string temp = OpenOutputBeside(output, FileMode(m_outputCharset));
+    CQoFile input;
+    if (!input.Open(m_inputFile, CQoFile::read | FileMode(m_inputCharset))) {
+        output.Close();
+        CQoFile::Remove(temp.c_str());
+        CQoString text;
+        text.Format("Die Eingabedatei '%s' kann nicht ge\xF6" "ffnet werden.", (const char*)m_inputFile);
+        CQoException::Throw(text, "CConversion::Run");
+    }
+
 
     long records = 0;
     try {
@@ -289,11 +294,6 @@ long CConversion::RunLines()
         throw;
     }
     input.Close();
-    if (!CQoFile::MoveOver(temp.c_str(), m_outputFile)) {
-        CQoFile::Remove(temp.c_str());
-        CQoString text;
-        text.Format("Die Ausgabedatei '%s' kann nicht ersetzt werden.", (const char*)m_outputFile);
-        CQoException::Throw(text, "CConversion::Run");
-    }
+    PutOutputInPlace(temp);
     return records;
 }

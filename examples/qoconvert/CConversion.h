@@ -21,7 +21,10 @@
 #pragma once
 
 #include <CQoConfigFile.h>
+#include <CQoFile.h>
 #include <CQoString.h>
+
+#include <string>
 
 class CConversion
 {
@@ -61,6 +64,10 @@ public:
 private:
     long RunLines();
     long RunRecords();
+    // Opens a new file beside the output (refusing an output that is the
+    // input) and answers its name; PutOutputInPlace makes it the output.
+    std::string OpenOutputBeside(CQoFile& file, int mode);
+    void PutOutputInPlace(const std::string& temp);
     static int FileMode(int charset);
     static void ReadCharset(CQoConfigFile& config, const char* section, int& charset);
 };

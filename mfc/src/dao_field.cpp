@@ -272,6 +272,21 @@ int FindField(const std::vector<FieldDef>& fields, LPCTSTR lpszName) {
   return -1;
 }
 
+int FieldIndex(const std::vector<FieldDef>& fields, LPCTSTR lpszName) {
+  int n = FindField(fields, lpszName);
+  if (n < 0) {
+    CString strError;
+    strError.Format("Item not found in this collection ('%s').", lpszName);
+    Throw(3265, strError);
+  }
+  return n;
+}
+
+void FieldInfoAt(const std::vector<FieldDef>& fields, int nIndex, CDaoFieldInfo& info, DWORD dwInfoOptions) {
+  if (nIndex < 0 || (size_t)nIndex >= fields.size()) Throw(3265, "Item not found in this collection.");
+  FillFieldInfo(fields[(size_t)nIndex], nIndex, info, dwInfoOptions);
+}
+
 std::vector<CString> ObjectNames(Engine& engine, BOOL bViews) {
   std::vector<CString> names;
   if (engine.kind == kindMdb) {

@@ -101,6 +101,10 @@ void FromSqlType(SWORD nSqlType, SQLULEN nPrecision, SWORD nScale, FieldDef& fie
 long DefaultSize(short nType);
 void FillFieldInfo(const FieldDef& field, int nOrdinal, CDaoFieldInfo& info, DWORD dwInfoOptions);
 int FindField(const std::vector<FieldDef>& fields, LPCTSTR lpszName);   // -1 when none
+// As FindField, but a missing field raises 3265.
+int FieldIndex(const std::vector<FieldDef>& fields, LPCTSTR lpszName);
+// FillFieldInfo of field nIndex; an index outside the fields raises 3265.
+void FieldInfoAt(const std::vector<FieldDef>& fields, int nIndex, CDaoFieldInfo& info, DWORD dwInfoOptions);
 
 // The fields of a table (3011 when there is no such table).
 std::vector<FieldDef> TableFields(Engine& engine, const CString& strTable);

@@ -181,18 +181,12 @@ short CDaoQueryDef::GetFieldCount() { return (short)QueryFields(this).size(); }
 
 void CDaoQueryDef::GetFieldInfo(int nIndex, CDaoFieldInfo& fieldinfo, DWORD dwInfoOptions) {
   std::vector<FieldDef> fields = QueryFields(this);
-  if (nIndex < 0 || (size_t)nIndex >= fields.size()) Throw(3265, "Item not found in this collection.");
-  FillFieldInfo(fields[(size_t)nIndex], nIndex, fieldinfo, dwInfoOptions);
+  FieldInfoAt(fields, nIndex, fieldinfo, dwInfoOptions);
 }
 
 void CDaoQueryDef::GetFieldInfo(LPCTSTR lpszName, CDaoFieldInfo& fieldinfo, DWORD dwInfoOptions) {
   std::vector<FieldDef> fields = QueryFields(this);
-  int n = FindField(fields, lpszName);
-  if (n < 0) {
-    CString strError;
-    strError.Format("Item not found in this collection ('%s').", lpszName);
-    Throw(3265, strError);
-  }
+  int n = FieldIndex(fields, lpszName);
   FillFieldInfo(fields[(size_t)n], n, fieldinfo, dwInfoOptions);
 }
 

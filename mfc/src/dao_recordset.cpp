@@ -460,18 +460,12 @@ short CDaoRecordset::GetFieldCount() { return (short)OpenState(this).fields.size
 
 void CDaoRecordset::GetFieldInfo(int nIndex, CDaoFieldInfo& fieldinfo, DWORD dwInfoOptions) {
   RecordsetState& st = OpenState(this);
-  if (nIndex < 0 || (size_t)nIndex >= st.fields.size()) Throw(3265, "Item not found in this collection.");
-  FillFieldInfo(st.fields[(size_t)nIndex], nIndex, fieldinfo, dwInfoOptions);
+  FieldInfoAt(st.fields, nIndex, fieldinfo, dwInfoOptions);
   if (dwInfoOptions & AFX_DAO_SECONDARY_INFO) fieldinfo.m_strSourceTable = st.strTable;
 }
 
 void CDaoRecordset::GetFieldInfo(LPCTSTR lpszName, CDaoFieldInfo& fieldinfo, DWORD dwInfoOptions) {
-  int n = FindField(OpenState(this).fields, lpszName);
-  if (n < 0) {
-    CString strError;
-    strError.Format("Item not found in this collection ('%s').", lpszName);
-    Throw(3265, strError);
-  }
+  int n = FieldIndex(OpenState(this).fields, lpszName);
   GetFieldInfo(n, fieldinfo, dwInfoOptions);
 }
 
@@ -495,12 +489,7 @@ void CDaoRecordset::GetFieldValue(int nIndex, COleVariant& varValue) {
 }
 
 void CDaoRecordset::GetFieldValue(LPCTSTR lpszName, COleVariant& varValue) {
-  int n = FindField(OpenState(this).fields, lpszName);
-  if (n < 0) {
-    CString strError;
-    strError.Format("Item not found in this collection ('%s').", lpszName);
-    Throw(3265, strError);
-  }
+  int n = FieldIndex(OpenState(this).fields, lpszName);
   GetFieldValue(n, varValue);
 }
 
@@ -779,14 +768,12 @@ void CDaoRecordset::SetFieldValue(int nIndex, LPCTSTR lpszValue) {
 }
 
 void CDaoRecordset::SetFieldValue(LPCTSTR lpszName, const COleVariant& varValue) {
-  int n = FindField(OpenState(this).fields, lpszName);
-  if (n < 0) Throw(3265, CString("Item not found in this collection ('") + lpszName + "').");
+  int n = FieldIndex(OpenState(this).fields, lpszName);
   SetFieldValue(n, varValue);
 }
 
 void CDaoRecordset::SetFieldValue(LPCTSTR lpszName, LPCTSTR lpszValue) {
-  int n = FindField(OpenState(this).fields, lpszName);
-  if (n < 0) Throw(3265, CString("Item not found in this collection ('") + lpszName + "').");
+  int n = FieldIndex(OpenState(this).fields, lpszName);
   SetFieldValue(n, lpszValue);
 }
 

@@ -275,18 +275,12 @@ short CDaoTableDef::GetFieldCount() { return (short)OpenState(this).fields.size(
 
 void CDaoTableDef::GetFieldInfo(int nIndex, CDaoFieldInfo& fieldinfo, DWORD dwInfoOptions) {
   TableDefState& st = OpenState(this);
-  if (nIndex < 0 || (size_t)nIndex >= st.fields.size()) Throw(3265, "Item not found in this collection.");
-  FillFieldInfo(st.fields[(size_t)nIndex], nIndex, fieldinfo, dwInfoOptions);
+  FieldInfoAt(st.fields, nIndex, fieldinfo, dwInfoOptions);
   if (dwInfoOptions & AFX_DAO_SECONDARY_INFO) fieldinfo.m_strSourceTable = st.strName;
 }
 
 void CDaoTableDef::GetFieldInfo(LPCTSTR lpszName, CDaoFieldInfo& fieldinfo, DWORD dwInfoOptions) {
-  int n = FindField(OpenState(this).fields, lpszName);
-  if (n < 0) {
-    CString strError;
-    strError.Format("Item not found in this collection ('%s').", lpszName);
-    Throw(3265, strError);
-  }
+  int n = FieldIndex(OpenState(this).fields, lpszName);
   GetFieldInfo(n, fieldinfo, dwInfoOptions);
 }
 

@@ -152,18 +152,18 @@ TEST(DaoFilters, WhatTheOutputWritesTheInputReadsBack)
     EXPECT_EQ(7, in.NumRows());
     std::vector<Row> expected = kRows;
     expected[0][2] = "abcde";
-    EXPECT_EQ(expected, Walk(in));
+    EXPECT_EQ(expected, AllRows(in));
     ASSERT_TRUE(in.AbsoluteRow(5));
     ASSERT_TRUE(in.NextRow());
-    EXPECT_EQ(expected[6], Current(in));
+    EXPECT_EQ(expected[6], CurrentRow(in));
     EXPECT_FALSE(in.AbsoluteRow(7));
     ASSERT_TRUE(in.AbsoluteRow(0));
-    EXPECT_EQ(expected[0], Current(in));
+    EXPECT_EQ(expected[0], CurrentRow(in));
 
     // A statement, counted only when asked; a missing table raises.
     in.InitTable("select A from T where B > 4", CQoInputFilterDB::tableSql, false);
     EXPECT_EQ(0, in.NumRows());
-    EXPECT_EQ(4u, Walk(in).size()) << "7, 5, 6 and 7";
+    EXPECT_EQ(4u, AllRows(in).size()) << "7, 5, 6 and 7";
     EXPECT_FALSE(ErrorOf([&] { in.InitTable("Fehlt", CQoInputFilterDB::tableTable, true); }).empty());
     in.InitTable("", CQoInputFilterDB::tableNone, true);
     EXPECT_FALSE(in.GetDatabase().IsOpen()) << "type 0 closes the database";
@@ -283,7 +283,7 @@ TEST(DaoFilters, AccessFilesAreReadAsTheyAre)
     in.InitTable(table.c_str(), CQoInputFilterDB::tableTable, true);
     EXPECT_GT(in.NumCols(), 0);
     EXPECT_GT(in.NumRows(), 0);
-    EXPECT_FALSE(Walk(in).empty());
+    EXPECT_FALSE(AllRows(in).empty());
 
     CQoOutputFilterDao out;
     out.SetTableName("Neu");
@@ -315,7 +315,7 @@ open(os.path.join(folder, 'alt.xls'), 'wb').write(b'\xd0\xcf\x11\xe0\xa1\xb1\x1a
     CQoString name;
     in.ColName(1, name);
     EXPECT_EQ("Betrag", std::string(name.GetString()));
-    EXPECT_EQ((std::vector<Row>{{"M\xFCller", "1.250000e+001", "true"}, {"Gr\xF6\xDF" "er", "3", "false"}}), Walk(in));
+    EXPECT_EQ((std::vector<Row>{{"M\xFCller", "1.250000e+001", "true"}, {"Gr\xF6\xDF" "er", "3", "false"}}), AllRows(in));
 
     // A workbook that cannot be read (the old binary format, or protected by
     // a password): the user is told so, the filter stays closed.

@@ -104,7 +104,7 @@ TEST_P(OdbcFilters, WhatTheOutputWritesTheInputReadsBackExactly)
     in.ColName(2, name);
     EXPECT_EQ("", std::string(name.GetString()));
     EXPECT_EQ(5, in.NumRows());
-    EXPECT_EQ(kRows, Walk(in));
+    EXPECT_EQ(kRows, AllRows(in));
 
     // Moves as a filter makes them: by number, back and forth, and the end.
     struct Move {
@@ -115,12 +115,12 @@ TEST_P(OdbcFilters, WhatTheOutputWritesTheInputReadsBackExactly)
         SCOPED_TRACE(m.row);
         EXPECT_EQ(m.found, in.AbsoluteRow(m.row));
         if (m.found) {
-            EXPECT_EQ(kRows[m.row], Current(in));
+            EXPECT_EQ(kRows[m.row], CurrentRow(in));
         }
     }
     ASSERT_TRUE(in.AbsoluteRow(4));
     EXPECT_FALSE(in.NextRow());
-    EXPECT_EQ(kRows[4], Current(in)) << "the last row stays current";
+    EXPECT_EQ(kRows[4], CurrentRow(in)) << "the last row stays current";
 
     // Counting in the middle of a walk does not end the walk.
     CQoInputFilterODBC counting(m_connect.c_str());
@@ -130,13 +130,13 @@ TEST_P(OdbcFilters, WhatTheOutputWritesTheInputReadsBackExactly)
     ASSERT_TRUE(counting.NextRow());
     EXPECT_EQ(5, counting.NumRows());
     ASSERT_TRUE(counting.NextRow());
-    EXPECT_EQ(kRows[0], Current(counting)) << "the third by number: -42, 0, 1";
+    EXPECT_EQ(kRows[0], CurrentRow(counting)) << "the third by number: -42, 0, 1";
 
     // Without counting, rows are walked but not reached by number.
     counting.InitTable("select num from kunden where num > 0", CQoInputFilterDB::tableSql, false);
     EXPECT_EQ(0, counting.NumRows());
     EXPECT_FALSE(counting.AbsoluteRow(1));
-    EXPECT_EQ(3u, Walk(counting).size());
+    EXPECT_EQ(3u, AllRows(counting).size());
 
     // A table type this filter does not serve changes nothing.
     counting.InitTable("kunden", CQoInputFilterDB::tableQuery, true);
@@ -147,7 +147,7 @@ TEST_P(OdbcFilters, WhatTheOutputWritesTheInputReadsBackExactly)
     EXPECT_EQ(0, counting.NumRows());
     EXPECT_FALSE(counting.FirstRow());
     EXPECT_FALSE(counting.NextRow());
-    EXPECT_TRUE(Walk(counting).empty());
+    EXPECT_TRUE(AllRows(counting).empty());
 }
 
 TEST_P(OdbcFilters, EveryInitRecreatesTheTableAndUnusableSettingsLoseNothing)
@@ -182,7 +182,7 @@ TEST_P(OdbcFilters, EveryInitRecreatesTheTableAndUnusableSettingsLoseNothing)
     CQoInputFilterODBC named(m_connect.c_str());
     named.Init("");
     named.InitTable(odd, CQoInputFilterDB::tableTable, true);
-    EXPECT_EQ(kRows, Walk(named));
+    EXPECT_EQ(kRows, AllRows(named));
 
     // With errors shown, the data source's message is a message box, not an exception.
     qotest::DialogDriver driver;
@@ -289,7 +289,7 @@ TEST(OdbcFiltersPostgres, ALostConnectionStopsTheWriteAndNamesWhatWasNotStored)
     in.Init("");
     in.InitTable("select count(*) from abbruch", CQoInputFilterDB::tableSql, true);
     ASSERT_TRUE(in.FirstRow());
-    std::string stored = Current(in)[0];
+    std::string stored = CurrentRow(in)[0];
     // The message names the first row that is not in the table.
     EXPECT_NE(std::string::npos, error.find(std::to_string(std::stol(stored) + 1))) << error << " / stored " << stored;
 }
