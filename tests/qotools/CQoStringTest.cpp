@@ -125,24 +125,6 @@ TEST(CQoString, ReplacesAndCounts)
     EXPECT_STREQ("z", self);
 }
 
-TEST(CQoString, TrimsNewlinesAndBlanks)
-{
-    CQoString line("text \r\n\n\r");
-    line.TrimNewline();
-    EXPECT_STREQ("text ", line);
-    CQoString inner("a\r\nb");
-    inner.TrimNewline();
-    EXPECT_STREQ("a\r\nb", inner);
-
-    CQoString s(" \t x y \r\n");
-    EXPECT_STREQ("x y \r\n", CQoString(s).TrimLeft());
-    EXPECT_STREQ(" \t x y", CQoString(s).TrimRight());
-    EXPECT_STREQ("x y", CQoString(s).Trim());
-    EXPECT_STREQ("", CQoString("   ").Trim());
-    EXPECT_STREQ("12", CQoString("0012").TrimLeft("0"));
-    EXPECT_STREQ("1.5", CQoString("1.5000").TrimRight("0"));
-}
-
 TEST(CQoString, ChangesCaseOfWindows1252Letters)
 {
     CQoString s("abc " AE_L OE_L UE_L SZ " \351\340\377\232 1+");

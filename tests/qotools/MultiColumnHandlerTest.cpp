@@ -124,20 +124,6 @@ TEST(MultiColumnSplit, CutsEachInputColumnIntoItsPartsRowByRow)
     EXPECT_EQ("", Val(*split, -1));
 }
 
-TEST(MultiColumnSplit, ReadsEachInputFieldOncePerRow)
-{
-    MemoryInputFilter file = AddressFile();
-    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
-    h.SetReadFilter(&file);
-    FillSplit(h);
-    FilterPtr split(h.CreateMultiColumnInputFilter());
-    ASSERT_TRUE(split->FirstRow());
-    for (int round = 0; round < 3; ++round)
-        for (int c = 0; c < 4; ++c)
-            Val(*split, c);
-    EXPECT_EQ(2, file.reads);
-}
-
 TEST(MultiColumnSplit, AlwaysSeparatorsAndLeadingSeparatorsAreTakenOff)
 {
     MemoryInputFilter file({"Nummer"}, {{"<12>-<>-<7>"}, {"<1>--<3>"}});
@@ -248,21 +234,6 @@ TEST(MultiColumnSplit, FilterFollowsLaterChangesAndOutlivesTheHandler)
     EXPECT_EQ("Eva", Val(*split, 1));
     EXPECT_STREQ("memory", split->FileName());
     EXPECT_EQ(CQoInputFilter::filterUnknown, split->InputFilterType());
-}
-
-TEST(MultiColumnSplit, WithoutReadFilterThereAreNoRows)
-{
-    CMultiColumnHandler h(CMultiColumnHandler::splitInput);
-    h.AddInnerColumn(0, 1, "a");
-    EXPECT_TRUE(h.AddAssignment(3, 0, "", false)); // columns not known yet
-    FilterPtr split(h.CreateMultiColumnInputFilter());
-    EXPECT_EQ(0, split->NumRows());
-    EXPECT_FALSE(split->FirstRow());
-    EXPECT_FALSE(split->NextRow());
-    EXPECT_FALSE(split->AbsoluteRow(0));
-    EXPECT_EQ("", Val(*split, 0));
-    EXPECT_EQ(0, h.NumOuterColumns());
-    EXPECT_EQ(nullptr, h.CreateMultiColumnOutputSource());
 }
 
 TEST(MultiColumnSplit, SplitsTheColumnsOfADelimitedFile)
@@ -682,22 +653,4 @@ TEST(MultiColumnConfig, DamagedSettingsAreLeftOutNotFollowed)
     EXPECT_EQ(1, h.NumInnerColumns());
     EXPECT_EQ(1, h.NumOuterColumns());
     EXPECT_EQ(1, h.NumAssignments());
-}
-
-TEST(MultiColumnConfig, CopiesAreIndependent)
-{
-    CMultiColumnHandler a(CMultiColumnHandler::composeOutput);
-    FillCompose(a);
-    CMultiColumnHandler b(a);
-    b.DeleteColumns(true);
-    EXPECT_EQ(5, a.NumInnerColumns());
-    EXPECT_EQ(0, b.NumInnerColumns());
-
-    // Assigning into a handler keeps the sources it made following it.
-    MemoryOutputSource values = PersonSource();
-    b.SetWriteOutputSource(&values);
-    SourcePtr out(b.CreateMultiColumnOutputSource());
-    a.SetWriteOutputSource(&values);
-    b = a;
-    EXPECT_EQ("Meier, Hans Dr.", Val(*out, 0, 0));
 }

@@ -234,50 +234,6 @@ TEST_F(XlsxPeer, EveryCellReadsAsOpenpyxlReadsIt)
     }
 }
 
-TEST_F(XlsxPeer, SheetsAreFoundAsTheDatabaseEngineNamesThem)
-{
-    if (!s_ready)
-        PEER_UNAVAILABLE();
-    CQoXlsxReader reader;
-    reader.Open(s_folder->Path("xlsxwriter1900.xlsx").c_str());
-    struct {
-        char const *name;
-        int index;
-    } const cases[] = {
-        {"Tabelle1", 0}, {"Tabelle1$", 0}, {"TABELLE1$", 0}, {"gr\374\337e$", 1}, {"GR\334\337E", 1},
-        {"Tabelle1$$", -1}, {"Tabelle", -1}, {"", -1},
-    };
-    for (auto const &c : cases)
-        EXPECT_EQ(c.index, reader.FindSheet(c.name)) << c.name;
-}
-
-TEST_F(XlsxPeer, RewindReadsTheSameRowsAgain)
-{
-    if (!s_ready)
-        PEER_UNAVAILABLE();
-    CQoXlsxReader reader;
-    reader.Open(s_folder->Path("openpyxl1900.xlsx").c_str());
-    reader.OpenSheet(0);
-    std::vector<std::vector<std::string>> first, second;
-    std::vector<Cell> row;
-    auto text = [](std::vector<Cell> const &cells) {
-        std::vector<std::string> out;
-        for (Cell const &c : cells)
-            out.push_back(std::to_string(c.type) + ":" + std::to_string(c.number) + ":" + c.text.Str());
-        return out;
-    };
-    for (int i = 0; i < 3 && reader.NextRow(row); ++i)
-        first.push_back(text(row));
-    EXPECT_EQ(6, reader.RowCount());   // does not move the reading
-    while (reader.NextRow(row))
-        first.push_back(text(row));
-    reader.RewindSheet();
-    while (reader.NextRow(row))
-        second.push_back(text(row));
-    EXPECT_EQ(6u, first.size());
-    EXPECT_EQ(first, second);
-}
-
 TEST_F(XlsxPeer, EscapedCharactersReadAsWritten)
 {
     if (!s_ready)

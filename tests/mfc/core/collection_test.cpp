@@ -123,31 +123,6 @@ TEST(CArrayTest, SizeConstructsAndDestroysEveryElement) {
   EXPECT_EQ(0, n[4]); // regrown elements start at zero again
 }
 
-TEST(CArrayTest, CopyAppendInsertArray) {
-  CUIntArray a, b;
-  a.Add(1);
-  a.Add(2);
-  b.Add(8);
-  b.Add(9);
-  EXPECT_EQ(2, a.Append(b));
-  ASSERT_EQ(4, a.GetSize());
-  EXPECT_EQ(9u, a[3]);
-  a.InsertAt(1, &b);
-  ASSERT_EQ(6, a.GetSize());
-  EXPECT_EQ(8u, a[1]);
-  EXPECT_EQ(9u, a[2]);
-  EXPECT_EQ(2u, a[3]);
-  b.Copy(a);
-  EXPECT_EQ(6, b.GetSize());
-  EXPECT_EQ(9u, b.GetData()[5]);
-
-  CStringArray sa;
-  sa.Add("eins");
-  sa.Add(CString("zwei"));
-  EXPECT_EQ(2, sa.GetCount());
-  EXPECT_TRUE(sa[1] == "zwei");
-}
-
 TEST(CArrayDeathTest, IndexOutsideTheArrayIsAnAssertion) {
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   CArray<int, int> a;
@@ -232,71 +207,6 @@ TEST(CMapTest, StringToPtrLookupRemoveIterate) {
   m.RemoveAll();
   EXPECT_TRUE(m.IsEmpty());
   EXPECT_EQ(nullptr, m.GetStartPosition());
-}
-
-TEST(CMapTest, OtherKeyAndValueTypes) {
-  CMapStringToString ss;
-  ss.SetAt("Land", "Deutschland");
-  ss["Stadt"] = "K\xf6ln";
-  CString v;
-  ASSERT_TRUE(ss.Lookup("Stadt", v));
-  EXPECT_TRUE(v == "K\xf6ln");
-
-  CMapPtrToPtr pp;
-  int a = 0, b = 0;
-  pp[&a] = &b;
-  void* out = NULL;
-  EXPECT_TRUE(pp.Lookup(&a, out));
-  EXPECT_EQ(&b, out);
-  EXPECT_FALSE(pp.Lookup(&b, out));
-
-  CMap<int, int, CString, const CString&> ic;
-  for (int i = 0; i < 100; ++i) ic[i * 16] = "x";
-  EXPECT_EQ(100, ic.GetCount());
-  EXPECT_TRUE(ic.Lookup(160, v));
-  EXPECT_FALSE(ic.Lookup(161, v));
-
-  CTypedPtrMap<CMapStringToPtr, CString, int*> tm;
-  tm.SetAt("a", &a);
-  int* pa = NULL;
-  EXPECT_TRUE(tm.Lookup("a", pa));
-  EXPECT_EQ(&a, pa);
-}
-
-TEST(CRectTest, Arithmetic) {
-  CRect r(10, 20, 110, 70);
-  EXPECT_EQ(100, r.Width());
-  EXPECT_EQ(50, r.Height());
-  EXPECT_EQ(CPoint(60, 45), r.CenterPoint());
-  EXPECT_TRUE(r.PtInRect(CPoint(10, 20)));
-  EXPECT_FALSE(r.PtInRect(CPoint(110, 70))); // right and bottom are outside
-  r.DeflateRect(5, 10);
-  EXPECT_EQ(CRect(15, 30, 105, 60), r);
-  r.InflateRect(5, 10);
-  r.OffsetRect(-10, -20);
-  EXPECT_EQ(CRect(0, 0, 100, 50), r);
-  EXPECT_EQ(CPoint(100, 50), r.BottomRight());
-  r.TopLeft() = CPoint(1, 2);
-  EXPECT_EQ(CRect(1, 2, 100, 50), r);
-
-  CRect n(50, 40, 10, 5);
-  n.NormalizeRect();
-  EXPECT_EQ(CRect(10, 5, 50, 40), n);
-
-  CRect i;
-  EXPECT_TRUE(i.IntersectRect(CRect(0, 0, 10, 10), CRect(5, 5, 20, 20)));
-  EXPECT_EQ(CRect(5, 5, 10, 10), i);
-  EXPECT_FALSE(i.IntersectRect(CRect(0, 0, 10, 10), CRect(20, 20, 30, 30)));
-  EXPECT_TRUE(i.IsRectEmpty());
-  CRect u;
-  u.UnionRect(CRect(0, 0, 10, 10), CRect(5, 5, 20, 20));
-  EXPECT_EQ(CRect(0, 0, 20, 20), u);
-  EXPECT_NE(CRect(0, 0, 20, 21), u);
-
-  LPRECT pr = u;
-  pr->right = 30;
-  EXPECT_EQ(30, u.Width());
-  EXPECT_EQ(CSize(30, 20), u.Size());
 }
 
 } // namespace

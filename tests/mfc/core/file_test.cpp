@@ -112,22 +112,6 @@ TEST_F(FileTest, MissingFileGivesCauseCodes) {
   }
 }
 
-TEST_F(FileTest, CreateTruncatesUnlessNoTruncate) {
-  WriteAll("a.txt", "alter Inhalt");
-  {
-    CFile f(Path("a.txt"), CFile::modeCreate | CFile::modeNoTruncate | CFile::modeWrite);
-    EXPECT_EQ(12u, f.GetLength());
-    f.SeekToEnd();
-    f.Write("!", 1);
-  }
-  EXPECT_EQ("alter Inhalt!", ReadAll("a.txt"));
-  {
-    CFile f(Path("a.txt"), CFile::modeCreate | CFile::modeWrite);
-    EXPECT_EQ(0u, f.GetLength());
-  }
-  EXPECT_EQ("", ReadAll("a.txt"));
-}
-
 TEST_F(FileTest, SharingAndAccess) {
   WriteAll("s.txt", "x");
   CFile first;
@@ -150,15 +134,6 @@ TEST_F(FileTest, SharingAndAccess) {
     EXPECT_TRUE(pe->m_strFileName == Path("s.txt"));
     pe->Delete();
   }
-}
-
-TEST_F(FileTest, DestructorClosesTheFile) {
-  {
-    CFile f(Path("d.txt"), CFile::modeCreate | CFile::modeWrite | CFile::shareExclusive);
-    f.Write("abc", 3);
-  }
-  CFile again;
-  EXPECT_TRUE(again.Open(Path("d.txt"), CFile::modeReadWrite | CFile::shareExclusive));
 }
 
 TEST_F(FileTest, NamesStatusRenameRemove) {

@@ -11,35 +11,6 @@ namespace {
 
 std::string Bytes(const CString& s) { return std::string((LPCSTR)s, (size_t)s.GetLength()); }
 
-TEST(CStringBasics, ConstructionForms) {
-  EXPECT_TRUE(CString().IsEmpty());
-  EXPECT_STREQ("", (LPCSTR)CString());
-  EXPECT_TRUE(CString((LPCSTR)NULL).IsEmpty());
-  EXPECT_EQ("xxx", Bytes(CString('x', 3)));
-  EXPECT_TRUE(CString('x', 0).IsEmpty());
-  EXPECT_EQ("abc", Bytes(CString("abcdef", 3)));
-
-  CString withNul("a\0b", 3); // explicit length keeps the NUL
-  EXPECT_EQ(3, withNul.GetLength());
-  EXPECT_EQ(std::string("a\0b", 3), Bytes(withNul));
-  CString copy(withNul);
-  EXPECT_EQ(3, copy.GetLength());
-
-  CString wide(L"Gr\u00f6\u00dfe");
-  EXPECT_EQ("Gr\xf6\xdf" "e", Bytes(wide));
-}
-
-TEST(CStringBasics, CopiesAreIndependent) {
-  CString a("Hallo");
-  CString b = a;
-  b.SetAt(0, 'h');
-  b += " Welt";
-  EXPECT_EQ("Hallo", Bytes(a));
-  EXPECT_EQ("hallo Welt", Bytes(b));
-  a.Empty();
-  EXPECT_EQ("hallo Welt", Bytes(b));
-}
-
 TEST(CStringBasics, ConcatenationIncludingSelfReference) {
   CString s("ab");
   s += s;
@@ -106,16 +77,6 @@ TEST(CStringCompare, CollationSortsUmlautsWithTheirLetter) {
   EXPECT_LT(apfel.CollateNoCase("birne"), 0);
 }
 
-TEST(CStringCase, UpperLowerReverse) {
-  CString s("Gr\xf6\xdf" "e \xe4\xfc\xe9 abc");
-  s.MakeUpper();
-  EXPECT_EQ("GR\xd6\xdf" "E \xc4\xdc\xc9 ABC", Bytes(s)); // ß has no capital in Windows-1252
-  s.MakeLower();
-  EXPECT_EQ("gr\xf6\xdf" "e \xe4\xfc\xe9 abc", Bytes(s));
-  EXPECT_EQ("\xd7", Bytes(CString("\xd7").MakeLower())); // the multiplication sign is no letter
-  EXPECT_EQ("cba", Bytes(CString("abc").MakeReverse()));
-}
-
 TEST(CStringExtract, MidLeftRightClampToTheString) {
   CString s("Hallo");
   EXPECT_EQ("all", Bytes(s.Mid(1, 3)));
@@ -136,32 +97,6 @@ TEST(CStringExtract, MidLeftRightClampToTheString) {
   EXPECT_EQ("", Bytes(CString("abc").SpanIncluding("0123456789")));
   EXPECT_EQ("Name", Bytes(CString("Name=Wert").SpanExcluding("=;")));
   EXPECT_EQ("Name", Bytes(CString("Name").SpanExcluding("=;")));
-}
-
-TEST(CStringExtract, Tokenize) {
-  CString s(";a;;bc;d;");
-  int pos = 0;
-  std::string joined;
-  for (CString tok = s.Tokenize(";", pos); pos != -1; tok = s.Tokenize(";", pos)) joined += Bytes(tok) + "|";
-  EXPECT_EQ("a|bc|d|", joined);
-}
-
-TEST(CStringSearch, FindReverseFindFindOneOf) {
-  CString s("abcabc");
-  EXPECT_EQ(1, s.Find('b'));
-  EXPECT_EQ(4, s.Find('b', 2));
-  EXPECT_EQ(-1, s.Find('x'));
-  EXPECT_EQ(-1, s.Find('a', 6));
-  EXPECT_EQ(-1, s.Find('a', 100));
-  EXPECT_EQ(2, s.Find("ca"));
-  EXPECT_EQ(3, s.Find("abc", 1));
-  EXPECT_EQ(-1, s.Find("abcd"));
-  EXPECT_EQ(-1, s.Find("bc", 5));
-  EXPECT_EQ(4, s.ReverseFind('b'));
-  EXPECT_EQ(-1, s.ReverseFind('z'));
-  EXPECT_EQ(2, s.FindOneOf("xyc"));
-  EXPECT_EQ(-1, s.FindOneOf("xyz"));
-  EXPECT_EQ(3, CString("Gr\xf6\xdf" "e").Find('\xdf'));
 }
 
 TEST(CStringEdit, ReplaceReturnsTheCount) {
@@ -186,37 +121,6 @@ TEST(CStringEdit, ReplaceReturnsTheCount) {
   CString w("aXa");
   EXPECT_EQ(2, w.Replace("a", "aa")); // the replacement is not searched again
   EXPECT_EQ("aaXaa", Bytes(w));
-}
-
-TEST(CStringEdit, RemoveInsertDelete) {
-  CString s("a-b--c");
-  EXPECT_EQ(3, s.Remove('-'));
-  EXPECT_EQ("abc", Bytes(s));
-  EXPECT_EQ(4, s.Insert(1, 'X'));
-  EXPECT_EQ("aXbc", Bytes(s));
-  EXPECT_EQ(6, s.Insert(100, "yz"));
-  EXPECT_EQ("aXbcyz", Bytes(s));
-  EXPECT_EQ(7, s.Insert(-3, "_"));
-  EXPECT_EQ("_aXbcyz", Bytes(s));
-  EXPECT_EQ(5, s.Delete(1, 2));
-  EXPECT_EQ("_bcyz", Bytes(s));
-  EXPECT_EQ(2, s.Delete(2, 100));
-  EXPECT_EQ("_b", Bytes(s));
-  EXPECT_EQ(2, s.Delete(5));
-  EXPECT_EQ(1, s.Delete(-1));
-  EXPECT_EQ("b", Bytes(s));
-}
-
-TEST(CStringEdit, TrimForms) {
-  EXPECT_EQ("a b", Bytes(CString(" \t\r\na b \n\v\f").Trim()));
-  EXPECT_EQ("a b \n", Bytes(CString("  a b \n").TrimLeft()));
-  EXPECT_EQ("  a b", Bytes(CString("  a b \n").TrimRight()));
-  EXPECT_EQ("", Bytes(CString(" \t ").Trim()));
-  EXPECT_EQ("a**b", Bytes(CString("**a**b**").Trim('*')));
-  EXPECT_EQ("a**b**", Bytes(CString("**a**b**").TrimLeft('*')));
-  EXPECT_EQ("x", Bytes(CString("\"'x'\"").Trim("\"'")));
-  EXPECT_EQ("0012", Bytes(CString("0012  ").TrimRight(" ")));
-  EXPECT_EQ("\xa0x", Bytes(CString("\xa0x").Trim())); // no-break space is kept
 }
 
 TEST(CStringFormat, LongTextAndNumbers) {
@@ -306,19 +210,6 @@ TEST(CStringResource, LoadStringFromTheResourceChain) {
   CString fmt;
   fmt.Format(102, 12);
   EXPECT_EQ("Zeile mit Format: 12 Datens\xe4tze", Bytes(fmt));
-}
-
-TEST(CStringConvert, AllocSysString) {
-  CString s("Gr\xf6\xdf" "e");
-  BSTR b = s.AllocSysString();
-  ASSERT_NE(nullptr, b);
-  EXPECT_EQ(5u, SysStringLen(b));
-  EXPECT_EQ(std::wstring(L"Gr\u00f6\u00dfe"), std::wstring(b, SysStringLen(b)));
-  SysFreeString(b);
-  BSTR empty = CString().AllocSysString();
-  ASSERT_NE(nullptr, empty);
-  EXPECT_EQ(0u, SysStringLen(empty));
-  SysFreeString(empty);
 }
 
 } // namespace
