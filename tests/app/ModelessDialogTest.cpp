@@ -134,17 +134,6 @@ protected:
     HWND m_hFirst = NULL, m_hSecond = NULL;
 };
 
-TEST_F(ModelessDialogTest, IsADialogOfItsOwnClass)
-{
-    CRuntimeClass* rc = m_pPage->GetRuntimeClass();
-    ASSERT_NE(nullptr, rc);
-    EXPECT_STREQ("CModelessDialog", RUNTIME_CLASS(CModelessDialog)->m_lpszClassName);
-    EXPECT_TRUE(m_pPage->IsKindOf(RUNTIME_CLASS(CDialog)));
-    EXPECT_EQ(nullptr, RUNTIME_CLASS(CModelessDialog)->CreateObject());
-    EXPECT_TRUE(m_pPage->GetStyle() & WS_CHILD);
-    EXPECT_EQ(m_pFrame->m_hWnd, ::GetParent(m_pPage->m_hWnd));
-}
-
 TEST_F(ModelessDialogTest, FrameShortcutsRunTheFramesCommandAndTheEditDoesNotSeeThem)
 {
     Press('K', true);

@@ -286,25 +286,6 @@ TEST_F(ColoredListCtrlTest, DoubleClickNearADividerSizesTheColumnToItsWidestText
     }
 }
 
-TEST_F(ColoredListCtrlTest, WidestTextIsAtLeastFiftyPixels)
-{
-    CDC* pDC = m_list.GetDC();
-    CFont* pOld = pDC->SelectObject(m_list.GetFont());
-    CRect rc(0, 0, 0, 0);
-    pDC->DrawText(CString("WWWWWWWWWWWWWWWWWWWWWWWW 299"), &rc, DT_CALCRECT | DT_SINGLELINE);
-    if (pOld != NULL) pDC->SelectObject(pOld);
-    m_list.ReleaseDC(pDC);
-
-    EXPECT_EQ(rc.Width(), m_list.GetMaxColumnWidth(2));  // the widest of the first 300 rows
-    struct Case {
-        const char* what;
-        int column;
-    } cases[] = {{"short texts", 4}, {"negative index", -1}, {"index past the columns", kColumns}};
-    for (const Case& c : cases) EXPECT_EQ(50, m_list.GetMaxColumnWidth(c.column)) << c.what;
-    m_list.SetItemCountEx(0, 0);
-    EXPECT_EQ(50, m_list.GetMaxColumnWidth(2)) << "empty list";
-}
-
 TEST_F(ColoredListCtrlTest, ClickingARowAsksBeforeTheSelectionChanges)
 {
     // A virtual list is never asked (the platform sends no LVN_ITEMCHANGING for it),

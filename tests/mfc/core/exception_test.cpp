@@ -154,25 +154,4 @@ TEST(ExceptionMessages, OsErrorsMapToCauses) {
   }
 }
 
-TEST(ExceptionThrowers, EachThrowsItsClass) {
-  struct Case {
-    void (*pfn)();
-    CRuntimeClass* pClass;
-  } cases[] = {
-      {AfxThrowNotSupportedException, RUNTIME_CLASS(CNotSupportedException)},
-      {AfxThrowInvalidArgException, RUNTIME_CLASS(CInvalidArgException)},
-      {AfxThrowResourceException, RUNTIME_CLASS(CResourceException)},
-      {AfxThrowUserException, RUNTIME_CLASS(CUserException)},
-  };
-  for (const Case& c : cases) {
-    try {
-      c.pfn();
-      ADD_FAILURE() << "nothing thrown";
-    } catch (CException* e) {
-      EXPECT_EQ(c.pClass, e->GetRuntimeClass());
-      e->Delete();
-    }
-  }
-}
-
 } // namespace

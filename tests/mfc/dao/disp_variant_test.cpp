@@ -62,14 +62,3 @@ TEST(DispVariantTest, DatesAreCheckedFormattedAndParsed) {
   EXPECT_FALSE(parsed.ParseDateTime("kein Datum"));
   EXPECT_EQ(COleDateTime::invalid, parsed.GetStatus());
 }
-
-TEST(DispVariantTest, CurrencyKeepsFourDecimalsAndParses) {
-  COleCurrency cy(1234, 5678);
-  EXPECT_EQ(12345678, cy.m_cur.int64);
-  COleCurrency parsed;
-  EXPECT_TRUE(parsed.ParseCurrency("99.5", 0, LOCALE_INVARIANT));
-  EXPECT_EQ(995000, parsed.m_cur.int64);
-  EXPECT_EQ(CString("99.5"), parsed.Format(0, LOCALE_INVARIANT));
-  EXPECT_FALSE(parsed.ParseCurrency("zu viel"));
-  EXPECT_EQ(COleCurrency::invalid, parsed.m_status);
-}

@@ -200,11 +200,6 @@ TEST_F(DialogTest, EndDialogInOnInitDialogReturnsItsResultWithoutShowing) {
   EXPECT_EQ(NULL, dlg.m_hWnd);
 }
 
-TEST_F(DialogTest, MissingTemplateFails) {
-  CDialog dlg(4711);
-  EXPECT_EQ(-1, dlg.DoModal());
-}
-
 // A modeless child page: keyboard navigation works through PreTranslateMessage.
 class CChildPage : public CDialog {
 public:
