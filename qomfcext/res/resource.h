@@ -52,7 +52,15 @@
 #define IDI_ERROR_ICON              4036
 
 // Dialog templates
+#define IDD_FILE_OPEN_WITH          189
+#define IDD_INPUT_TEXTVAR           4007
+#define IDD_INFO_VIEW               4008
 #define IDD_PASSWORD_DLG            4013
+#define IDD_COLUMN_CONFIG           4017
+#define IDD_OUTPUT_TEXTVAR          4023
+#define IDD_OUTPUT_TEXTFIX          4024
+#define IDD_INPUT_DIALOG            4029
+#define IDD_HINT                    4034
 #define IDD_ERROR_DLG               4037
 
 // Controls
@@ -60,3 +68,67 @@
 #define IDC_PASSWORD_PROMPT         4029
 #define IDC_ERROR_MESSAGE           4130
 #define IDC_ERROR_INFO              4131
+
+// Variable-length text input page (4007)
+#define IDC_TEXTVAR_APPLY           4005
+#define IDC_TEXTVAR_PREVIEW         4009
+#define IDC_TEXTVAR_INFO            4010
+#define IDC_TEXTVAR_DELIMITER       4015
+#define IDC_TEXTVAR_ENCLOSER        4016
+#define IDC_TEXTVAR_ESCAPE          4017
+#define IDC_TEXTVAR_SKIP            4018
+#define IDC_TEXTVAR_CHARSET         4019
+#define IDC_TEXTVAR_LBL_DELIMITER   4084
+#define IDC_TEXTVAR_LBL_ESCAPE      4085
+#define IDC_TEXTVAR_LBL_CHARSET     4086
+#define IDC_TEXTVAR_LBL_ENCLOSER    4087
+#define IDC_TEXTVAR_LBL_SKIP        4088
+#define IDC_TEXTVAR_FIRST_NAMES     4128
+
+// Column configuration page (4017)
+#define IDC_COLUMN_PREVIEW          4033
+#define IDC_COLUMN_FIELDS           4034
+#define IDC_COLUMN_VALUES           4035
+#define IDC_COLUMN_LBL_FIELD        4091
+#define IDC_COLUMN_LBL_VALUE        4092
+#define IDC_COLUMN_INSTRUCTION      4093
+
+// Delimited text output page (4023)
+#define IDC_OUTVAR_PREVIEW          4048
+#define IDC_OUTVAR_REFRESH          4049
+#define IDC_OUTVAR_DELIMITER        4050
+#define IDC_OUTVAR_ESCAPE           4051
+#define IDC_OUTVAR_CHARSET          4052
+#define IDC_OUTVAR_ENCLOSER         4053
+#define IDC_OUTVAR_ALWAYS_ENCLOSE   4054
+#define IDC_OUTVAR_NAMES_FIRST      4055
+#define IDC_OUTVAR_LBL_DELIMITER    4108
+#define IDC_OUTVAR_LBL_ENCLOSER     4109
+#define IDC_OUTVAR_LBL_ESCAPE       4110
+#define IDC_OUTVAR_LBL_CHARSET      4111
+
+// Fixed-length text output page (4024)
+#define IDC_OUTFIX_LIST             4056
+#define IDC_OUTFIX_RECLEN           4057
+#define IDC_OUTFIX_FIELDLEN         4059
+#define IDC_OUTFIX_APPLY            4061
+#define IDC_OUTFIX_CRLF             4062
+#define IDC_OUTFIX_CHARSET          4064
+#define IDC_OUTFIX_INSTRUCTION      4104
+#define IDC_OUTFIX_LBL_CHARSET      4105
+#define IDC_OUTFIX_LBL_RECLEN       4106
+#define IDC_OUTFIX_LBL_FIELDLEN     4107
+
+// Small dialogs: information view (4008), input dialog (4029), hint (4034),
+// "open with" (189)
+#define IDC_INFO_TEXT               4011
+#define IDC_INPUT_VALUE             4077
+#define IDC_INPUT_PROMPT            4078
+#define IDC_HINT_DONT_SHOW          4114
+#define IDC_HINT_TEXT               4115
+#define IDC_OPEN_FILE               4112
+#define IDC_OPEN_DEFAULT            4113
+#define IDC_OPEN_NOTEPAD            1074
+#define IDC_OPEN_OTHER              1011
+#define IDC_OPEN_PROGRAM            1145
+#define IDC_OPEN_BROWSE             1146
