@@ -7,7 +7,10 @@
 #include <CQoOutputFilterDao.h>
 #include <CQoInputFilterTextVar.h>
 #include <CQoOutputFilterODBC.h>
+#include <CQoOutputFilterTextFix.h>
 #include <CQoOutputFilterTextVar.h>
+
+#include "CInputRecords.h"
 
 #include <memory>
 #include <vector>
@@ -15,10 +18,13 @@
 namespace {
 const char kInput[] = "Eingabe";
 const char kOutput[] = "Ausgabe";
+const char kInputFilter[] = "Eingabefilter";
+const char kOutputFilter[] = "Ausgabefilter";
 }
 
 CConversion::CConversion()
-    : m_inputCharset(charsetAnsi), m_outputCharset(charsetAnsi)
+    : m_inputCharset(charsetAnsi), m_outputCharset(charsetAnsi), m_outputFormat(formatDelimited),
+      m_bTextFilters(false)
 {
 }
 
@@ -35,6 +41,23 @@ void CConversion::ReadConfig(CQoConfigFile& config)
     config.GetValue(kOutput, "Tabelle", m_outputTable);
     config.GetValue(kInput, "Datenbank", m_inputDatabase);
     config.GetValue(kOutput, "Datenbank", m_outputDatabase);
+    if (config.HasKey(kOutput, "Format")) {
+        CQoString text;
+        config.GetValue(kOutput, "Format", text);
+        int format = -1;
+        if (!config.GetValue(kOutput, "Format", format) || (format != formatDelimited && format != formatFixed)) {
+            CQoString message;
+            message.Format("Unbekanntes Ausgabeformat '%s' in [Ausgabe] (erlaubt: 0 Trennzeichen, 1 feste L\xE4nge).",
+                           (const char*)text);
+            CQoException::Throw(message, "Format");
+        }
+        m_outputFormat = format;
+    }
+    m_filterSettings.Clear();
+    m_filterSettings.CopySection(config, kInputFilter);
+    m_filterSettings.CopySection(config, kOutputFilter);
+    m_bTextFilters = config.HasSection(kInputFilter) || config.HasSection(kOutputFilter)
+                     || config.HasKey(kOutput, "Format");
     if (InputIsDatabase() && m_inputTable.IsEmpty() && m_inputSql.IsEmpty())
         CQoException::Throw("Zur Datenbank-Eingabe fehlt die Tabelle (Tabelle=) oder die Abfrage (SQL=).", "Eingabe");
     if (OutputIsDatabase() && m_outputTable.IsEmpty())
@@ -68,6 +91,11 @@ void CConversion::WriteConfig(CQoConfigFile& config) const
     config.SetValue(kInput, "Tabelle", m_inputTable);
     config.SetValue(kOutput, "Datenbank", m_outputDatabase);
     config.SetValue(kOutput, "Tabelle", m_outputTable);
+    if (m_bTextFilters) {
+        config.SetValue(kOutput, "Format", m_outputFormat);
+        config.CopySection(m_filterSettings, kInputFilter);
+        config.CopySection(m_filterSettings, kOutputFilter);
+    }
 }
 
 int CConversion::FileMode(int charset)
@@ -81,7 +109,7 @@ int CConversion::FileMode(int charset)
 
 long CConversion::Run()
 {
-    return InputIsDatabase() || OutputIsDatabase() ? RunRecords() : RunLines();
+    return InputIsDatabase() || OutputIsDatabase() || m_bTextFilters ? RunRecords() : RunLines();
 }
 
 namespace {
@@ -98,22 +126,12 @@ CQoString Quoted(const CQoString& name)
 }
 }
 
-long CConversion::RunRecords()
+CQoInputFilter* CConversion::NewInput() const
 {
-    // The output table is replaced before the input is read: the same table
-    // of the same database would be emptied before it is read.
-    if (!m_inputDatabase.IsEmpty() && !m_outputDatabase.IsEmpty()
-        && CQoFile::SameFile(m_inputDatabase, m_outputDatabase) && m_inputSql.IsEmpty()
-        && _stricmp(m_inputTable, m_outputTable) == 0)
-        CQoException::Throw("Die Ausgabetabelle ist die Eingabetabelle; sie w\xFCrde geleert.", m_outputTable);
-
-    // The input: a table or query of a data source, or a delimited file.
-    std::unique_ptr<CQoInputFilter> input;
     if (!m_inputDatabase.IsEmpty()) {
         CQoString extension = m_inputDatabase.Right(5);
         bool excel = _stricmp(extension, ".xlsx") == 0;
-        CQoInputFilterDao* dao = new CQoInputFilterDao(excel ? CQoFile::typeExcel : CQoFile::typeAccess);
-        input.reset(dao);
+        std::unique_ptr<CQoInputFilterDao> dao(new CQoInputFilterDao(excel ? CQoFile::typeExcel : CQoFile::typeAccess));
         if (m_inputSql.IsEmpty()) {
             dao->SetTableName(m_inputTable);
             dao->SetTableType(CQoInputFilterDB::tableTable);
@@ -124,94 +142,145 @@ long CConversion::RunRecords()
         dao->Init(m_inputDatabase);
         if (!dao->GetDatabase().IsOpen())
             CQoException::Throw("Die Datenbank ist nicht ge\xF6" "ffnet.", m_inputDatabase);
-    } else if (InputIsDatabase()) {
-        CQoInputFilterODBC* odbc = new CQoInputFilterODBC(m_inputConnect);
-        input.reset(odbc);
+        return dao.release();
+    }
+    if (InputIsDatabase()) {
+        std::unique_ptr<CQoInputFilterODBC> odbc(new CQoInputFilterODBC(m_inputConnect));
         odbc->Init("");
         if (m_inputSql.IsEmpty())
             odbc->InitTable(m_inputTable, CQoInputFilterDB::tableTable, false);
         else
             odbc->InitTable(m_inputSql, CQoInputFilterDB::tableSql, false);
-    } else {
-        CQoInputFilterTextVar* text = new CQoInputFilterTextVar;
-        input.reset(text);
-        text->Delimiter(';');
-        text->SetFirstRowHasNames(true);
-        text->CharSet(FileMode(m_inputCharset));
-        text->Init(m_inputFile);
+        return odbc.release();
     }
-    int const columns = input->NumCols();
-    if (columns == 0)
-        CQoException::Throw("Die Eingabe hat keine Spalten.", "CConversion::Run");
+    std::unique_ptr<CQoInputFilterTextVar> text(new CQoInputFilterTextVar);
+    ConfigureInput(*text);
+    text->Init(m_inputFile);
+    return text.release();
+}
 
+void CConversion::ConfigureInput(CQoInputFilterTextVar& filter) const
+{
+    filter.Delimiter(';');
+    filter.SetFirstRowHasNames(true);
+    filter.CharSet(FileMode(m_inputCharset));
+    if (m_filterSettings.HasSection(kInputFilter)) {
+        CQoConfigFile settings(m_filterSettings);   // the filters read from a file they may change
+        filter.ReadConfig(settings, kInputFilter);
+    }
+}
+
+CQoOutputFilter* CConversion::NewTextOutput() const
+{
+    std::unique_ptr<CQoOutputFilter> text;
+    if (m_outputFormat == formatFixed) {
+        text.reset(new CQoOutputFilterTextFix);
+    } else {
+        CQoOutputFilterTextVar* delimited = new CQoOutputFilterTextVar;
+        text.reset(delimited);
+        delimited->WriteHeaderFlag(true);
+    }
+    text->FileCharSet(FileMode(m_outputCharset));
+    if (m_filterSettings.HasSection(kOutputFilter)) {
+        CQoConfigFile settings(m_filterSettings);
+        text->ReadConfig(settings, kOutputFilter);
+    }
+    return text.release();
+}
+
+void CConversion::TakeFilterSettings(CQoInputFilter& input, CQoOutputFilter& output)
+{
+    m_filterSettings.Clear();
+    input.WriteConfig(m_filterSettings, kInputFilter);
+    output.WriteConfig(m_filterSettings, kOutputFilter);
+    m_bTextFilters = true;
+}
+
+CQoOutputFilter* CConversion::NewOutput(CQoOutputSource& source, CQoFile& file, std::string& temp)
+{
     // The output: a table (text columns wide enough for any value read), or
-    // a delimited file written beside its target and put in place at the end.
-    std::unique_ptr<CQoOutputFilter> output;
-    CQoFile file;
-    std::string temp;
+    // a text file written beside its target and put in place at the end.
+    int const columns = source.GetNumColumns();
+    CQoString name;
     if (!m_outputDatabase.IsEmpty()) {
-        CQoOutputFilterDao* dao = new CQoOutputFilterDao;
-        output.reset(dao);
+        std::unique_ptr<CQoOutputFilterDao> dao(new CQoOutputFilterDao);
         dao->SetTableName(m_outputTable);
         dao->NumCols(columns);
         for (int c = 0; c < columns; ++c) {
-            CQoString name;
-            input->ColName(c, name);
+            source.GetColumnName(c, name);
             dao->ColumnName(c, name);
             dao->SetType(c, CQoOutputFilterDB::dbtypeText);
             dao->SetLength(c, 255);
         }
         dao->UseDB(m_outputDatabase);
-    } else if (OutputIsDatabase()) {
-        CQoOutputFilterODBC* odbc = new CQoOutputFilterODBC;
-        output.reset(odbc);
+        return dao.release();
+    }
+    if (OutputIsDatabase()) {
+        std::unique_ptr<CQoOutputFilterODBC> odbc(new CQoOutputFilterODBC);
         odbc->SetTableName(m_outputTable);
         odbc->NumCols(columns);
         for (int c = 0; c < columns; ++c) {
-            CQoString name;
-            input->ColName(c, name);
+            source.GetColumnName(c, name);
             odbc->ColumnName(c, Quoted(name));
             odbc->SetType(c, CQoOutputFilterDB::dbtypeText);
             odbc->SetLength(c, 255);
         }
         odbc->UseDB(m_outputConnect);
-    } else {
-        temp = OpenOutputBeside(file, CQoFile::binary);
-        CQoOutputFilterTextVar* text = new CQoOutputFilterTextVar;
-        output.reset(text);
-        text->NumCols(columns);
-        for (int c = 0; c < columns; ++c) {
-            CQoString name;
-            input->ColName(c, name);
-            text->ColumnName(c, name);
-        }
-        text->WriteHeaderFlag(true);
-        text->FileCharSet(FileMode(m_outputCharset));
-        text->UseFile(&file, true);
+        return odbc.release();
     }
+    // The stored settings keep the lengths of the columns they know; a
+    // column the input has gained gets the filter's default.
+    std::unique_ptr<CQoOutputFilter> text(NewTextOutput());
+    text->NumCols(columns);
+    for (int c = 0; c < columns; ++c) {
+        source.GetColumnName(c, name);
+        text->ColumnName(c, name);
+    }
+    temp = OpenOutputBeside(file, CQoFile::binary);
+    text->UseFile(&file, true);
+    return text.release();
+}
 
-    long records = 0;
+long CConversion::RunRecords()
+{
+    // The output table is replaced before the input is read: the same table
+    // of the same database would be emptied before it is read.
+    if (!m_inputDatabase.IsEmpty() && !m_outputDatabase.IsEmpty()
+        && CQoFile::SameFile(m_inputDatabase, m_outputDatabase) && m_inputSql.IsEmpty()
+        && _stricmp(m_inputTable, m_outputTable) == 0)
+        CQoException::Throw("Die Ausgabetabelle ist die Eingabetabelle; sie w\xFCrde geleert.", m_outputTable);
+
+    std::unique_ptr<CQoInputFilter> input(NewInput());
+    if (input->NumCols() == 0)
+        CQoException::Throw("Die Eingabe hat keine Spalten.", "CConversion::Run");
+    CInputRecords records(input.get());
+    int const columns = records.GetNumColumns();
+
+    CQoFile file;
+    std::string temp;
+    std::unique_ptr<CQoOutputFilter> output(NewOutput(records, file, temp));
+    long written = 0;
     try {
         if (!output->Init())
             CQoException::Throw("Die Ausgabe kann nicht geschrieben werden.", "CConversion::Run");
         output->WriteHeader();
         CQoString value;
-        for (bool ok = input->FirstRow(); ok; ok = input->NextRow()) {
+        long row = 0;
+        for (bool ok = input->FirstRow(); ok; ok = input->NextRow(), ++row) {
+            records.StandsOn(row);
             output->InitRow();
             for (int c = 0; c < columns; ++c) {
-                input->Value(c, value);
+                records.GetValue(row, c, value);
                 output->Value(c, value);
             }
             if (!output->WriteRow())
                 CQoException::Throw("Ein Satz wurde nicht gespeichert.", "CConversion::Run");
-            ++records;
+            ++written;
         }
-        if (!m_outputDatabase.IsEmpty())
-            output->ReleaseFile();   // closes the table: stores what is queued
-        else if (OutputIsDatabase())
+        if (OutputIsDatabase() && m_outputDatabase.IsEmpty())
             static_cast<CQoOutputFilterODBC*>(output.get())->ReleaseDB();
         else
-            output->ReleaseFile();
+            output->ReleaseFile();   // a table: closing it stores what is queued
     } catch (...) {
         if (!temp.empty()) {
             try {
@@ -224,7 +293,7 @@ long CConversion::RunRecords()
     }
     if (!temp.empty())
         PutOutputInPlace(temp);
-    return records;
+    return written;
 }
 
 std::string CConversion::OpenOutputBeside(CQoFile& file, int mode)

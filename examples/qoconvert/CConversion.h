@@ -18,6 +18,19 @@
 // names its table, or "SQL" gives a statement instead. An output writes into
 // a table of an ODBC source ("ODBC") or of an Access-type database file
 // ("Datenbank"), both with "Tabelle".
+//
+// Text files read and written through the filters keep the filters' own
+// settings, as their configuration pages leave them, in two sections of the
+// project:
+//
+//     [Eingabefilter]           the delimited input (delimiter, encloser,
+//                               escape, skip, character set, names in line 1)
+//     [Ausgabe]
+//     Format=1                  0 delimited text, 1 fixed-length text
+//     [Ausgabefilter]           the output filter's settings (lengths, ...)
+//
+// A project with neither filter section nor Format copies the lines of the
+// input from one character set into the other.
 #pragma once
 
 #include <CQoConfigFile.h>
@@ -26,17 +39,34 @@
 
 #include <string>
 
+class CQoInputFilter;
+class CQoInputFilterTextVar;
+class CQoOutputFilter;
+class CQoOutputSource;
+
 class CConversion
 {
 public:
     // The character sets as the pages offer them: Windows Ansi, DOS Ascii, Ansi/Ascii.
     enum { charsetAnsi = 0, charsetAscii = 1, charsetMixed = 2 };
+    // The text outputs.
+    enum { formatDelimited = 0, formatFixed = 1 };
 
     CConversion();
 
-    // Raises CQoException for a character set the program does not know.
+    // Raises CQoException for a character set or format the program does
+    // not know.
     void ReadConfig(CQoConfigFile& config);
     void WriteConfig(CQoConfigFile& config) const;
+
+    // The text filters as the project configures them (defaults for a
+    // project without their sections: ';', names in the first line, the
+    // character sets of "Zeichensatz"). The file is not opened.
+    void ConfigureInput(CQoInputFilterTextVar& filter) const;
+    // A new output filter of m_outputFormat, configured; the caller owns it.
+    CQoOutputFilter* NewTextOutput() const;
+    // Keeps the filters' settings for WriteConfig (what their pages set).
+    void TakeFilterSettings(CQoInputFilter& input, CQoOutputFilter& output);
 
     // Converts every record; returns the number of records written. Raises
     // CQoException when a file cannot be opened, read or written, or when
@@ -57,11 +87,16 @@ public:
     // File databases (empty: none).
     CQoString m_inputDatabase;
     CQoString m_outputDatabase;
+    int m_outputFormat;
+
+    bool UsesTextFilters() const { return m_bTextFilters; }
 
     bool InputIsDatabase() const { return !m_inputConnect.IsEmpty() || !m_inputDatabase.IsEmpty(); }
     bool OutputIsDatabase() const { return !m_outputConnect.IsEmpty() || !m_outputDatabase.IsEmpty(); }
 
 private:
+    CQoInputFilter* NewInput() const;
+    CQoOutputFilter* NewOutput(CQoOutputSource& source, CQoFile& file, std::string& temp);
     long RunLines();
     long RunRecords();
     // Opens a new file beside the output (refusing an output that is the
@@ -70,4 +105,8 @@ private:
     void PutOutputInPlace(const std::string& temp);
     static int FileMode(int charset);
     static void ReadCharset(CQoConfigFile& config, const char* section, int& charset);
+
+    // The two filter sections, as read or as the pages left them.
+    CQoConfigFile m_filterSettings;
+    bool m_bTextFilters;
 };

@@ -59,7 +59,8 @@ set(cases
     "other case|Datei=KUNDEN.TXT\nZeichensatz=1|ist die Eingabedatei"
     "dot-dot path|Datei=./sub/../kunden.txt\nZeichensatz=1|ist die Eingabedatei"
     "unknown charset|Datei=kunden-neu.txt\nZeichensatz=7|Unbekannter Zeichensatz '7'"
-    "charset not a number|Datei=kunden-neu.txt\nZeichensatz=dos|Unbekannter Zeichensatz 'dos'")
+    "charset not a number|Datei=kunden-neu.txt\nZeichensatz=dos|Unbekannter Zeichensatz 'dos'"
+    "unknown format|Datei=kunden-neu.txt\nFormat=3|Unbekanntes Ausgabeformat '3'")
 foreach(case IN LISTS cases)
   string(REPLACE "|" ";" parts "${case}")
   list(GET parts 0 what)
@@ -83,6 +84,27 @@ endforeach()
 file(GLOB leftovers ${project}/qo*.tmp ${project}/*.~tmp)
 if(leftovers)
   message(FATAL_ERROR "temporary files left: ${leftovers}")
+endif()
+
+# Through the text filters as their pages configure them: a tab-delimited
+# file with a title line and quoted names into fixed-length records in code
+# page 850, the lengths and line ends as the project's filter sections say.
+file(WRITE ${project}/make-tab.sh [=[
+{ printf 'Kundenliste\r\n'; tr ';' '\t' < kunden.txt | sed 's/\t\([^\t]*\)\t/\t"\1"\t/'; } > kunden-tab.txt
+tr -d '\r' < kunden.txt | awk -F';' 'NR>1{printf "%-3s%-10s%-18s%-12s\r\n",$1,$2,$3,$4}' | iconv -f CP1252 -t CP850 > expected.fix
+]=])
+execute_process(COMMAND sh make-tab.sh WORKING_DIRECTORY ${project} RESULT_VARIABLE rc)
+file(WRITE ${project}/qoconvert.ini
+     "[Eingabe]\nDatei=kunden-tab.txt\n[Eingabefilter]\ndelimiter=9\nencloser=34\nescape=0\nskip=1\nfirstrownames=1\ncharset=32\n"
+     "[Ausgabe]\nDatei=kunden.fix\nFormat=1\n[Ausgabefilter]\ncharset=16\ncrlf=1\ncolumns=4\n"
+     "column0_len=3\ncolumn1_len=10\ncolumn2_len=18\ncolumn3_len=12\n")
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/kunden.fix ${project}/expected.fix
+                RESULT_VARIABLE differs)
+if(NOT rc EQUAL 0 OR NOT differs EQUAL 0)
+  file(READ ${project}/qoconvert.log log)
+  message(FATAL_ERROR "through the text filters: exit ${rc}, differs ${differs}\n${err}\nlog:\n${log}")
 endif()
 
 # A project folder that does not exist: exit code 1 and the reason on the console.

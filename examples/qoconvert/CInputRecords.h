@@ -1,0 +1,38 @@
+// CInputRecords - the rows of an input filter as an output filter reads them:
+// an output source whose inner columns are the filter's columns, so that the
+// column view of COutputFilterSource (selection, order, upper case) lies
+// between what is read and what is written.
+//
+// The source moves its filter itself: give it a filter that nothing else
+// positions (the program's preview reads its own filter object). A row is
+// found by NextRow when it follows the last one read, else by AbsoluteRow;
+// a conversion that walks the input itself says where it stands with
+// StandsOn, so that no row is looked for twice.
+#pragma once
+
+#include <COutputFilterSource.h>
+#include <CQoInputFilter.h>
+
+class CInputRecords : public COutputFilterSource
+{
+public:
+    explicit CInputRecords(CQoInputFilter* filter = nullptr);
+
+    // A new filter (or the same one after new settings): the column view is
+    // rebuilt from its columns.
+    void SetInputFilter(CQoInputFilter* filter);
+    CQoInputFilter* GetInputFilter() const { return m_pFilter; }
+    // The filter stands on `row` (-1: on no known row).
+    void StandsOn(long row) { m_lRow = row; }
+
+    void GetSourceValue(long row, int column, CString& value) override;
+    void GetSourceName(int column, CString& name, int flag) override;
+    int NumSourceColumns() override;
+    long NumSourceRows() override;
+
+private:
+    bool MoveTo(long row);
+
+    CQoInputFilter* m_pFilter;
+    long m_lRow;
+};
