@@ -34,6 +34,10 @@ public:
   // iCount -1: as many entries as the header has items.
   BOOL GetColumnOrderArray(LPINT piArray, int iCount = -1) const;
   BOOL SetColumnOrderArray(int iCount, LPINT piArray);
+  BOOL SetColumn(int nCol, const LVCOLUMN* pColumn);
+  BOOL DeleteColumn(int nCol);
+  // Width in pixels of the text in the list's font.
+  int GetStringWidth(LPCTSTR lpsz) const;
 
   int GetItemCount() const;
   // Virtual (LVS_OWNERDATA) lists only: the number of rows, and whether scrolling and
@@ -43,6 +47,16 @@ public:
   UINT GetItemState(int nItem, UINT nMask) const;
   BOOL SetItemState(int nItem, UINT nState, UINT nMask);
   COLORREF GetBkColor() const;
+  // Items of a list that holds its own rows (not LVS_OWNERDATA for the texts).
+  int InsertItem(int nItem, LPCTSTR lpszItem);
+  BOOL SetItemText(int nItem, int nSubItem, LPCTSTR lpszText);
+  CString GetItemText(int nItem, int nSubItem) const;
+  BOOL DeleteAllItems();
+  BOOL EnsureVisible(int nItem, BOOL bPartialOK);
+  int GetTopIndex() const;
+  int GetCountPerPage() const;
+  // Repaints one item (LVM_UPDATE).
+  BOOL Update(int nItem);
 
   // LVS_OWNERDRAWFIXED lists paint each row here; the parent reflects WM_DRAWITEM.
   virtual void DrawItem(LPDRAWITEMSTRUCT lpDrawItemStruct);

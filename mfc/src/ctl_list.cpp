@@ -79,6 +79,46 @@ BOOL CListCtrl::SetItemState(int nItem, UINT nState, UINT nMask) {
   return (BOOL)SEND(LVM_SETITEMSTATE, nItem, &item);
 }
 COLORREF CListCtrl::GetBkColor() const { return (COLORREF)SEND(LVM_GETBKCOLOR, 0, 0); }
+BOOL CListCtrl::SetColumn(int nCol, const LVCOLUMN* pColumn) { return (BOOL)SEND(LVM_SETCOLUMNA, nCol, pColumn); }
+BOOL CListCtrl::DeleteColumn(int nCol) { return (BOOL)SEND(LVM_DELETECOLUMN, nCol, 0); }
+int CListCtrl::GetStringWidth(LPCTSTR lpsz) const { return (int)SEND(LVM_GETSTRINGWIDTHA, 0, lpsz); }
+int CListCtrl::InsertItem(int nItem, LPCTSTR lpszItem) {
+  LVITEMA item;
+  memset(&item, 0, sizeof(item));
+  item.mask = LVIF_TEXT;
+  item.iItem = nItem;
+  item.pszText = (LPSTR)lpszItem;
+  return (int)SEND(LVM_INSERTITEMA, 0, &item);
+}
+BOOL CListCtrl::SetItemText(int nItem, int nSubItem, LPCTSTR lpszText) {
+  LVITEMA item;
+  memset(&item, 0, sizeof(item));
+  item.iSubItem = nSubItem;
+  item.pszText = (LPSTR)lpszText;
+  return (BOOL)SEND(LVM_SETITEMTEXTA, nItem, &item);
+}
+// LVM_GETITEMTEXT answers the length copied; a full buffer may mean the text was
+// cut, so the buffer grows until the text fits.
+CString CListCtrl::GetItemText(int nItem, int nSubItem) const {
+  CString str;
+  LVITEMA item;
+  for (int nLen = 256;; nLen *= 2) {
+    memset(&item, 0, sizeof(item));
+    item.iSubItem = nSubItem;
+    item.cchTextMax = nLen;
+    item.pszText = str.GetBufferSetLength(nLen);
+    int nGot = (int)SEND(LVM_GETITEMTEXTA, nItem, &item);
+    if (nGot < nLen - 1 || nLen >= (1 << 20)) {
+      str.ReleaseBuffer(nGot < nLen ? nGot : nLen - 1);
+      return str;
+    }
+  }
+}
+BOOL CListCtrl::DeleteAllItems() { return (BOOL)SEND(LVM_DELETEALLITEMS, 0, 0); }
+BOOL CListCtrl::EnsureVisible(int nItem, BOOL bPartialOK) { return (BOOL)SEND(LVM_ENSUREVISIBLE, nItem, bPartialOK); }
+int CListCtrl::GetTopIndex() const { return (int)SEND(LVM_GETTOPINDEX, 0, 0); }
+int CListCtrl::GetCountPerPage() const { return (int)SEND(LVM_GETCOUNTPERPAGE, 0, 0); }
+BOOL CListCtrl::Update(int nItem) { return (BOOL)SEND(LVM_UPDATE, nItem, 0); }
 
 void CListCtrl::DrawItem(LPDRAWITEMSTRUCT) {
   ASSERT(FALSE); // an owner-drawn list must override DrawItem

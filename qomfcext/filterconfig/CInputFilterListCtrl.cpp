@@ -1,0 +1,100 @@
+#include "CInputFilterListCtrl.h"
+
+#include <climits>
+#include <vector>
+
+#include "CQoInputFilter.h"
+#include "CColoredInputFilterListCtrl.h"
+
+namespace {
+const int kNewColumnWidth = 170;
+const int kUnsampledWidth = 50;
+const int kColumnPadding = 30;
+const int kListPadding = 16;
+}
+
+BEGIN_MESSAGE_MAP(CInputFilterListCtrl, CListCtrl)
+END_MESSAGE_MAP()
+
+CInputFilterListCtrl::CInputFilterListCtrl(int useHeader)
+    : m_nUseHeader(useHeader), m_lMaxRows(0), m_pFilter(NULL)
+{
+}
+
+CInputFilterListCtrl::~CInputFilterListCtrl()
+{
+}
+
+void CInputFilterListCtrl::SetInputFilter(CQoInputFilter* pFilter)
+{
+    m_pFilter = pFilter;
+}
+
+void CInputFilterListCtrl::SetMaxRows(long maxRows)
+{
+    m_lMaxRows = maxRows > 0 ? maxRows : 0;
+}
+
+void CInputFilterListCtrl::UseHeader(int useHeader)
+{
+    m_nUseHeader = useHeader;
+}
+
+void CInputFilterListCtrl::Update()
+{
+    if (m_pFilter == NULL) return;
+    ASSERT(::IsWindow(m_hWnd));
+
+    DeleteAllItems();
+    while (DeleteColumn(0)) {
+    }
+
+    int n = m_pFilter->NumCols();
+    if (n < 0) n = 0;
+    if (n > CColoredInputFilterListCtrl::kMaxColumns) n = CColoredInputFilterListCtrl::kMaxColumns;
+    CQoString value;
+    for (int i = 0; i < n; ++i) {
+        if (m_nUseHeader != 0)
+            m_pFilter->ColName(i, value);
+        else
+            value.Empty();
+        if (InsertColumn(i, value, LVCFMT_LEFT, kNewColumnWidth) < 0) {
+            n = i;
+            break;
+        }
+    }
+
+    std::vector<long long> sums(static_cast<size_t>(n), 0);
+    int rows = 0;
+    if (n > 0 && m_pFilter->FirstRow()) {
+        for (;;) {
+            for (int i = 0; i < n; ++i) {
+                m_pFilter->Value(i, value);
+                sums[static_cast<size_t>(i)] += GetStringWidth(value);
+                if (i == 0)
+                    InsertItem(rows, value);
+                else
+                    SetItemText(rows, i, value);
+            }
+            ++rows;
+            if (m_lMaxRows != 0 && rows >= m_lMaxRows) break;
+            if (rows == INT_MAX) break;  // the list counts its items in an int
+            if (!m_pFilter->NextRow()) break;
+        }
+    }
+    if (n == 0) return;
+
+    std::vector<int> widths(static_cast<size_t>(n));
+    long long total = kListPadding;
+    for (int i = 0; i < n; ++i) {
+        long long w = rows > 0 ? sums[static_cast<size_t>(i)] / rows : kUnsampledWidth;
+        w += kColumnPadding;
+        if (w > 0x7fff) w = 0x7fff;
+        widths[static_cast<size_t>(i)] = static_cast<int>(w);
+        total += w;
+    }
+    CRect rcWindow;
+    GetWindowRect(&rcWindow);
+    const long long extra = total < rcWindow.Width() ? (rcWindow.Width() - total) / n : 0;
+    for (int i = 0; i < n; ++i) SetColumnWidth(i, widths[static_cast<size_t>(i)] + static_cast<int>(extra));
+}
