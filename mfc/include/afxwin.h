@@ -1325,6 +1325,8 @@ AFX_API void AFXAPI DDX_Radio(CDataExchange* pDX, int nIDC, int& value);
 AFX_API void AFXAPI DDX_Control(CDataExchange* pDX, int nIDC, CWnd& rControl);
 AFX_API void AFXAPI DDX_CBIndex(CDataExchange* pDX, int nIDC, int& index);
 AFX_API void AFXAPI DDX_CBString(CDataExchange* pDX, int nIDC, CString& value);
+// Loading selects only an item equal to the value (case-insensitive), else sets the text.
+AFX_API void AFXAPI DDX_CBStringExact(CDataExchange* pDX, int nIDC, CString& value);
 AFX_API void AFXAPI DDX_LBIndex(CDataExchange* pDX, int nIDC, int& index);
 AFX_API void AFXAPI DDX_LBString(CDataExchange* pDX, int nIDC, CString& value);
 AFX_API void AFXAPI DDV_MaxChars(CDataExchange* pDX, CString const& value, int nChars);

@@ -226,6 +226,26 @@ void AFXAPI DDX_CBString(CDataExchange* pDX, int nIDC, CString& value) {
   }
 }
 
+// As DDX_CBString, but loading does not take an item that merely begins with the
+// value: an empty value or "[" leaves the edit text as it is given.
+void AFXAPI DDX_CBStringExact(CDataExchange* pDX, int nIDC, CString& value) {
+  if (pDX->m_bSaveAndValidate) {
+    DDX_CBString(pDX, nIDC, value);
+    return;
+  }
+  HWND hWndCtrl = pDX->PrepareCtrl(nIDC);
+  DWORD dwStyle = (DWORD)::GetWindowLongA(hWndCtrl, GWL_STYLE);
+  int nIndex = (int)::SendMessageA(hWndCtrl, CB_FINDSTRINGEXACT, (WPARAM)-1, (LPARAM)(LPCSTR)value);
+  if (nIndex != CB_ERR) {
+    ::SendMessageA(hWndCtrl, CB_SETCURSEL, (WPARAM)nIndex, 0);
+  } else if ((dwStyle & 0x3) != CBS_DROPDOWNLIST) {
+    ::SendMessageA(hWndCtrl, CB_SETCURSEL, (WPARAM)-1, 0);
+    AfxSetWindowText(hWndCtrl, value);
+  } else {
+    ::SendMessageA(hWndCtrl, CB_SETCURSEL, (WPARAM)-1, 0);
+  }
+}
+
 void AFXAPI DDX_LBIndex(CDataExchange* pDX, int nIDC, int& index) {
   HWND hWndCtrl = pDX->PrepareCtrl(nIDC);
   if (pDX->m_bSaveAndValidate)

@@ -84,6 +84,9 @@
 #define IDC_TEXTVAR_LBL_ENCLOSER    4087
 #define IDC_TEXTVAR_LBL_SKIP        4088
 #define IDC_TEXTVAR_FIRST_NAMES     4128
+// Messages of the text input pages
+#define IDS_TEXTVAR_NO_DELIMITER    4150
+#define IDS_INPUT_NOT_TEXT          4151
 
 // Column configuration page (4017)
 #define IDC_COLUMN_PREVIEW          4033

@@ -1,0 +1,41 @@
+#include "CInputFilterConfig.h"
+
+#include "CInputFilterConfigTextVar.h"
+#include "CQoInputFilterTextVar.h"
+
+IMPLEMENT_DYNAMIC(CInputFilterConfig, CModelessDialog)
+
+CInputFilterConfig::CInputFilterConfig(CQoInputFilter* pFilter, int nNotifierId, UINT nIDTemplate,
+                                       CWnd* pParent)
+    : CModelessDialog(nIDTemplate, pParent),
+      CModifiedNotifier(nNotifierId),
+      m_lMaxPreviewRows(1000),
+      m_pInputFilter(pFilter)
+{
+}
+
+CInputFilterConfig::~CInputFilterConfig()
+{
+}
+
+void CInputFilterConfig::DefaultAction()
+{
+}
+
+// The page is chosen by the type the filter reports; the cast is checked as well,
+// so that a filter that claims a type it is not of gets no page rather than one
+// that would misread it.
+CInputFilterConfig* CInputFilterConfig::GetAppropriateConfig(CQoInputFilter* pFilter, int nNotifierId)
+{
+    if (pFilter == NULL) return NULL;
+    switch (pFilter->InputFilterType()) {
+    case CQoInputFilter::filterTextVar:
+        if (CQoInputFilterTextVar* pTextVar = dynamic_cast<CQoInputFilterTextVar*>(pFilter))
+            return new CInputFilterConfigTextVar(pTextVar, nNotifierId);
+        return NULL;
+    default:
+        // dBase (1, 2), fixed-length text (3, 7) and the file databases (5, 6)
+        // have no page in this build; unknown types never have one.
+        return NULL;
+    }
+}
