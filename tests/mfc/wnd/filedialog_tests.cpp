@@ -1,0 +1,82 @@
+// The file dialog over the system's open and save dialogs: the '|' filter,
+// the initial name, the default extension, and what the caller reads back.
+#include <gtest/gtest.h>
+
+#include <afxdlgs.h>
+
+#include <cstring>
+#include <string>
+
+#include "dialog_script.h"
+
+namespace {
+
+std::string TempFile(const char* name)
+{
+    char dir[MAX_PATH];
+    ::GetTempPathA(MAX_PATH, dir);
+    return std::string(dir) + name;
+}
+
+// The file name field of the explorer-style dialog.
+int NameField(HWND hDlg)
+{
+    return ::GetDlgItem(hDlg, 0x47c) != NULL ? 0x47c : 0x480;
+}
+
+}  // namespace
+
+TEST(FileDialog, OpenHandsBackTheChosenFileInItsParts)
+{
+    std::string path = TempFile("Kunden Liste.2024.txt");
+    FILE* f = fopen(path.c_str(), "wb");
+    ASSERT_NE(nullptr, f);
+    fclose(f);
+
+    CFileDialog dlg(TRUE, NULL, "vorschlag.txt", OFN_FILEMUSTEXIST | OFN_HIDEREADONLY,
+                    "Textdateien (*.txt)|*.txt|Alle Dateien (*.*)|*.*||");
+    // The filter reaches the system as NUL-separated pairs ending in two NULs.
+    const char* p = dlg.m_ofn.lpstrFilter;
+    ASSERT_NE(nullptr, p);
+    const char* parts[] = {"Textdateien (*.txt)", "*.txt", "Alle Dateien (*.*)", "*.*"};
+    for (const char* part : parts) {
+        EXPECT_STREQ(part, p);
+        p += strlen(p) + 1;
+    }
+    EXPECT_EQ('\0', *p);
+
+    std::string proposed;
+    CDialogScript script;
+    script.Then([&](HWND hDlg) {
+        proposed = CDialogScript::ItemText(hDlg, NameField(hDlg));
+        ::SetDlgItemTextA(hDlg, NameField(hDlg), path.c_str());
+        CDialogScript::Click(hDlg, IDOK);
+    });
+    EXPECT_EQ(IDOK, dlg.DoModal());
+    EXPECT_TRUE(script.Done());
+    EXPECT_EQ("vorschlag.txt", proposed);
+    EXPECT_STRCASEEQ(path.c_str(), dlg.GetPathName());
+    EXPECT_EQ(CString("Kunden Liste.2024.txt"), dlg.GetFileName());
+    EXPECT_EQ(CString("txt"), dlg.GetFileExt());
+    EXPECT_EQ(CString("Kunden Liste.2024"), dlg.GetFileTitle());
+    ::DeleteFileA(path.c_str());
+}
+
+TEST(FileDialog, SaveAddsTheDefaultExtensionAndCancelAnswersCancel)
+{
+    std::string folder = TempFile("");
+    CFileDialog save(FALSE, "csv", NULL, OFN_HIDEREADONLY | OFN_OVERWRITEPROMPT, "CSV (*.csv)|*.csv");
+    CDialogScript script;
+    script.Then([&](HWND hDlg) {
+        ::SetDlgItemTextA(hDlg, NameField(hDlg), (folder + "bericht").c_str());
+        CDialogScript::Click(hDlg, IDOK);
+    });
+    EXPECT_EQ(IDOK, save.DoModal());
+    EXPECT_STRCASEEQ((folder + "bericht.csv").c_str(), save.GetPathName());
+
+    CFileDialog cancelled(TRUE);
+    script.Then([&](HWND hDlg) { CDialogScript::Click(hDlg, IDCANCEL); });
+    EXPECT_EQ(IDCANCEL, cancelled.DoModal());
+    EXPECT_TRUE(script.Done());
+    EXPECT_EQ(CString(""), cancelled.GetPathName());
+}
