@@ -4,26 +4,83 @@
 
 #include <afxwin.h>
 
+#include <cstdio>
+#include <fstream>
+#include <sstream>
 #include <string>
 #include <vector>
 
+#include "CQoFileOpenDlg.h"
+#include "CQoHint.h"
 #include "CQoInfoView.h"
+#include "CQoInputDialog.h"
+#include "CQoLog.h"
+#include "CStaticFilespec.h"
+#include "CStaticLink.h"
 #include "Capture.h"
 #include "DialogDriver.h"
+#include "Input.h"
 #include "resource.h"
 
 namespace {
 
-// Runs one script on the dialog that `open` shows and checks that it was answered.
+// Runs the scripts, one per dialog in order, on the dialogs that `open` shows
+// and checks that each was answered.
 template <class Open>
-void Drive(qotest::DialogScript script, Open open)
+void Drive(std::vector<qotest::DialogScript> scripts, Open open)
 {
     qotest::DialogDriver driver;
-    driver.Expect(std::move(script));
+    for (auto& s : scripts) driver.Expect(std::move(s));
     open();
     EXPECT_TRUE(driver.Done());
     EXPECT_EQ(0, driver.Unanswered());
 }
+
+std::string TempPath(const char* name)
+{
+    char dir[MAX_PATH];
+    GetTempPathA(MAX_PATH, dir);
+    return std::string(dir) + name;
+}
+
+// A program that exists on every system and ends at once, whatever it is given.
+std::string HarmlessProgram()
+{
+    char dir[MAX_PATH];
+    GetSystemDirectoryA(dir, MAX_PATH);
+    return std::string(dir) + "\\hostname.exe";
+}
+
+// _theLog writes into a fresh file; Entries() are its lines without the time.
+class LoggedTest : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        m_log = TempPath("qo_smalldialogs.log");
+        DeleteFileA(m_log.c_str());
+        _theLog.Open(m_log.c_str());
+        CQoHint::Reset();
+    }
+    void TearDown() override
+    {
+        _theLog.Close();
+        DeleteFileA(m_log.c_str());
+        CQoHint::Reset();
+    }
+    std::vector<std::string> Entries() const
+    {
+        std::vector<std::string> out;
+        std::ifstream in(m_log, std::ios::binary);
+        std::string line;
+        while (std::getline(in, line)) {
+            if (!line.empty() && line.back() == '\r') line.pop_back();
+            size_t sep = line.find(" > ");
+            out.push_back(sep == std::string::npos ? line : line.substr(sep + 3));
+        }
+        return out;
+    }
+    std::string m_log;
+};
 
 }  // namespace
 
@@ -37,16 +94,15 @@ TEST(InfoView, EveryKindOfLineEndIsOneBreak)
     std::string text, title;
     int lines = 0;
     bool cancelVisible = true;
-    Drive(
-        [&](qotest::Dialog& d) {
-            title = d.Title();
-            text = d.Text(IDC_INFO_TEXT);
-            lines = (int)d.Send(IDC_INFO_TEXT, EM_GETLINECOUNT);
-            cancelVisible = d.IsVisible(IDCANCEL);
-            qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("info-4008.png").c_str());
-            d.Press(IDOK);
-        },
-        [&] { EXPECT_EQ(IDOK, view.DoModal()); });
+    Drive({[&](qotest::Dialog& d) {
+              title = d.Title();
+              text = d.Text(IDC_INFO_TEXT);
+              lines = (int)d.Send(IDC_INFO_TEXT, EM_GETLINECOUNT);
+              cancelVisible = d.IsVisible(IDCANCEL);
+              qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("info-4008.png").c_str());
+              d.Press(IDOK);
+          }},
+          [&] { EXPECT_EQ(IDOK, view.DoModal()); });
 
     EXPECT_EQ("Information", title);
     EXPECT_EQ("Eingabedatei: C:\\daten\\kunden.txt\r\nS\xE4tze: 1204\r\nFehlerhafte S\xE4tze: 3\r\n"
@@ -57,11 +113,424 @@ TEST(InfoView, EveryKindOfLineEndIsOneBreak)
 
     view.Clear();
     view.Append("neu");
-    Drive(
-        [&](qotest::Dialog& d) {
-            text = d.Text(IDC_INFO_TEXT);
-            d.Press(IDOK);
-        },
-        [&] { view.DoModal(); });
+    Drive({[&](qotest::Dialog& d) {
+              text = d.Text(IDC_INFO_TEXT);
+              d.Press(IDOK);
+          }},
+          [&] { view.DoModal(); });
     EXPECT_EQ("neu", text);
+}
+
+// ---------------------------------------------------------------------------
+// Hint
+
+using HintTest = LoggedTest;
+
+TEST_F(HintTest, SwitchedOffHintIsOnlyLoggedUntilReset)
+{
+    const unsigned id = IDS_PREVIEW_DOS_HINT;  // a text with line breaks
+    CString text;
+    text.LoadString(id);
+    ASSERT_EQ(std::string::npos, std::string((const char*)text).find('\r'));
+    std::string shown, logged;
+    for (char c : std::string((const char*)text)) {
+        shown += c == '\n' ? std::string("\r\n") : std::string(1, c);
+        logged += c == '\n' ? ';' : c;
+    }
+
+    std::string title, edit;
+    bool enabled = false, checked = true;
+    Drive({[&](qotest::Dialog& d) {
+              title = d.Title();
+              edit = d.Text(IDC_HINT_TEXT);
+              enabled = d.IsEnabled(IDC_HINT_DONT_SHOW);
+              checked = d.IsChecked(IDC_HINT_DONT_SHOW);
+              d.Check(IDC_HINT_DONT_SHOW);
+              qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("hint-4034.png").c_str());
+              d.Press(IDOK);
+          }},
+          [&] { CQoHint::ShowHint(id, true); });
+    EXPECT_EQ("Hinweis", title);
+    EXPECT_EQ(shown, edit);
+    EXPECT_TRUE(enabled);
+    EXPECT_FALSE(checked);
+
+    // Switched off: no window, only the log line.
+    qotest::DialogDriver none;
+    CQoHint::ShowHint(id, true);
+    EXPECT_EQ(0, none.Seen());
+
+    std::vector<unsigned> stored;
+    for (CQoHint::Iterator it = CQoHint::Begin(); it != CQoHint::End(); CQoHint::IteratorInc(it))
+        stored.push_back(*it);
+    EXPECT_EQ(std::vector<unsigned>{id}, stored);
+
+    CQoHint::Reset();
+    Drive({[&](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { CQoHint::ShowHint(id, true); });
+
+    std::vector<std::string> expected = {"CQoHint (" + logged + "), angezeigt.",
+                                         "CQoHint (" + logged + "), nicht angezeigt.",
+                                         "CQoHint (" + logged + "), angezeigt."};
+    EXPECT_EQ(expected, Entries());
+}
+
+TEST_F(HintTest, CheckBoxOnlyWhereTheHintMaySwitchOff)
+{
+    // Hidden by the host (as when it restores the stored ids), then a hint
+    // that may not be switched off, then one with a text of its own.
+    CQoHint::Hide(IDS_ODBC_MUST_EXIST);
+    std::vector<bool> enabled;
+    std::string edit;
+    auto tickAndOk = [&](qotest::Dialog& d) {
+        enabled.push_back(d.IsEnabled(IDC_HINT_DONT_SHOW));
+        edit = d.Text(IDC_HINT_TEXT);
+        d.Press(IDOK);
+    };
+    Drive({tickAndOk, tickAndOk}, [&] {
+        CQoHint::ShowHint(IDS_ODBC_MUST_EXIST, true);
+        CQoHint::ShowHint(IDS_UNKNOWN_COLUMN_TYPE, false);
+        CQoHint::ShowHint("Die Ausgabedatei\nwird \xFC" "berschrieben.");
+    });
+    EXPECT_EQ((std::vector<bool>{false, false}), enabled);
+    EXPECT_EQ("Die Ausgabedatei\r\nwird \xFC" "berschrieben.", edit);
+    EXPECT_EQ(1u, CQoHint::m_setDontShow.size());
+
+    std::vector<std::string> expected = {
+        "CQoHint (ODBC Datenbanken m\xFCssen schon angelegt sein!), nicht angezeigt.",
+        "CQoHint (Unbekannter Spaltentyp!), angezeigt.",
+        "CQoHint (Die Ausgabedatei;wird \xFC" "berschrieben.), angezeigt."};
+    EXPECT_EQ(expected, Entries());
+}
+
+// ---------------------------------------------------------------------------
+// Input dialog
+
+TEST(InputDialog, ShowsTitlePromptAndValueAndReturnsWhatWasTyped)
+{
+    CQoInputDialog dlg;
+    dlg.m_strTitle = "Eingabe";
+    dlg.m_strPrompt = "Bezeichnung eingeben";
+    dlg.m_strValue = "Neue_Spalte";
+
+    std::string title, prompt, value;
+    Drive({[&](qotest::Dialog& d) {
+              title = d.Title();
+              prompt = d.Text(IDC_INPUT_PROMPT);
+              value = d.Text(IDC_INPUT_VALUE);
+              // The proposal is selected: typing replaces it.
+              d.Type(IDC_INPUT_VALUE, "Stra\xDF" "e");
+              qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("input-4029.png").c_str());
+              d.Press(IDOK);
+          }},
+          [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
+    EXPECT_EQ("Eingabe", title);
+    EXPECT_EQ("Bezeichnung eingeben", prompt);
+    EXPECT_EQ("Neue_Spalte", value);
+    EXPECT_EQ(CString("Stra\xDF" "e"), dlg.m_strValue);
+
+    // Cancel keeps the value; without a title the caption stays the template's.
+    CQoInputDialog plain;
+    plain.m_strValue = "alt";
+    Drive({[&](qotest::Dialog& d) {
+              title = d.Title();
+              d.SetText(IDC_INPUT_VALUE, "neu");
+              d.Press(IDCANCEL);
+          }},
+          [&] { EXPECT_EQ(IDCANCEL, plain.DoModal()); });
+    EXPECT_EQ("Dialog", title);
+    EXPECT_EQ(CString("alt"), plain.m_strValue);
+}
+
+// ---------------------------------------------------------------------------
+// "Open with"
+
+TEST(FileOpenDlg, RadioChoiceIsZeroToTwo)
+{
+    CQoFileOpenDlg dlg;
+    const int given[] = {0, 1, 2, 3, -1, 100};
+    const int stored[] = {0, 1, 2, 0, 0, 0};
+    for (int i = 0; i < 6; ++i) {
+        dlg.SetRadio(given[i]);
+        EXPECT_EQ(stored[i], dlg.GetRadio()) << given[i];
+    }
+}
+
+TEST(FileOpenDlg, ProgramFieldsOnlyForAnotherProgramAndBrowseFillsThem)
+{
+    const std::string file =
+        "C:\\Daten\\Ausgabe\\2024\\Quartal 3\\Kunden mit langen Namen\\Filiale Nord\\kunden_gesamt.txt";
+    const std::string program = HarmlessProgram();
+    CQoFileOpenDlg dlg;
+    dlg.SetFile(file.c_str());
+
+    std::string fileShown, programAfterBrowse;
+    std::vector<bool> editEnabled, browseEnabled;
+    auto record = [&](qotest::Dialog& d) {
+        editEnabled.push_back(d.IsEnabled(IDC_OPEN_PROGRAM));
+        browseEnabled.push_back(d.IsEnabled(IDC_OPEN_BROWSE));
+    };
+    Drive({[&](qotest::Dialog& d) {
+               EXPECT_EQ("Datei \xF6" "ffnen mit ...", d.Title());
+               fileShown = d.Text(IDC_OPEN_FILE);
+               EXPECT_TRUE(d.IsChecked(IDC_OPEN_DEFAULT));
+               record(d);
+               d.Check(IDC_OPEN_NOTEPAD);
+               record(d);
+               d.Check(IDC_OPEN_OTHER);
+               record(d);
+               d.Press(IDC_OPEN_BROWSE);
+               qotest::WaitFor([&] { return !d.Text(IDC_OPEN_PROGRAM).empty(); }, 5000);
+               programAfterBrowse = d.Text(IDC_OPEN_PROGRAM);
+               qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("open-with-189.png").c_str());
+               d.Press(IDCANCEL);
+           },
+           [&](qotest::Dialog& d) {  // the program chooser
+               int nameId = d.Exists(0x47c) ? 0x47c : 0x480;
+               d.SetText(nameId, program);
+               d.Press(IDOK);
+           }},
+          [&] { EXPECT_EQ(IDCANCEL, dlg.DoModal()); });
+
+    EXPECT_EQ(file, fileShown);
+    EXPECT_EQ((std::vector<bool>{false, false, true}), editEnabled);
+    EXPECT_EQ((std::vector<bool>{false, false, true}), browseEnabled);
+    EXPECT_STRCASEEQ(program.c_str(), programAfterBrowse.c_str());
+}
+
+TEST(FileOpenDlg, ProgramThatCannotStartKeepsTheDialogOpen)
+{
+    const std::string file = TempPath("qo_oeffnen_mit.txt");
+    CQoFileOpenDlg dlg;
+    dlg.SetFile(file.c_str());
+    dlg.SetRadio(2);
+    dlg.SetProgram("C:\\gibt es nicht\\programm.exe");
+
+    std::string message;
+    bool openAfterMessage = false;
+    Drive({[&](qotest::Dialog& d) {
+               d.Press(IDOK);
+               qotest::PumpFor(300);  // the message box appears and is answered meanwhile
+               qotest::WaitFor([&] { return !message.empty(); }, 5000);
+               openAfterMessage = IsWindowVisible(d.Hwnd()) != FALSE;
+               d.Press(IDCANCEL);
+           },
+           [&](qotest::Dialog& box) {
+               message = box.MessageText();
+               box.Press(IDOK);
+           }},
+          [&] { EXPECT_EQ(IDCANCEL, dlg.DoModal()); });
+    EXPECT_EQ("Die Datei '" + file + "' konnte nicht ge\xF6" "ffnet werden.", message);
+    EXPECT_TRUE(openAfterMessage);
+}
+
+TEST(FileOpenDlg, OkStartsTheProgramOrClosesWhenThereIsNone)
+{
+    // Another program with none given: nothing to start, the dialog closes.
+    CQoFileOpenDlg empty;
+    empty.SetFile("C:\\daten\\kunden.txt");
+    empty.SetRadio(2);
+    Drive({[&](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, empty.DoModal()); });
+
+    // A program that starts: the dialog closes with OK, no message.
+    CQoFileOpenDlg started;
+    started.SetFile("C:\\daten mit blank\\kunden.txt");
+    started.SetRadio(2);
+    started.SetProgram(HarmlessProgram().c_str());
+    Drive({[&](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, started.DoModal()); });
+}
+
+// ---------------------------------------------------------------------------
+// Statics on a frame
+
+namespace {
+
+class StaticsTest : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        m_pFrame = new CFrameWnd;
+        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW),
+                                                              (HBRUSH)(COLOR_BTNFACE + 1)),
+                                       "Statics", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 40, 40, 500, 200, NULL, NULL));
+        m_font.CreatePointFont(80, "MS Sans Serif");
+        m_pFrame->SetFont(&m_font, FALSE);
+    }
+    void TearDown() override
+    {
+        if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();  // deletes it
+        qotest::PumpFor(50);
+    }
+
+    CFrameWnd* m_pFrame = nullptr;
+    CFont m_font;
+};
+
+// What DrawTextEx makes of `text` in `rect` with the frame's font and `flags`.
+std::string Shortened(HWND hwnd, const std::string& text, UINT flags)
+{
+    std::vector<char> buffer(text.begin(), text.end());
+    buffer.resize(text.size() + 8, '\0');  // room for the ellipsis
+    RECT rect;
+    GetClientRect(hwnd, &rect);
+    HDC hdc = GetDC(hwnd);
+    HGDIOBJ old = SelectObject(hdc, (HGDIOBJ)SendMessageA(GetParent(hwnd), WM_GETFONT, 0, 0));
+    DrawTextExA(hdc, buffer.data(), (int)text.size(), &rect, flags | DT_MODIFYSTRING | DT_CALCRECT, NULL);
+    SelectObject(hdc, old);
+    ReleaseDC(hwnd, hdc);
+    return buffer.data();
+}
+
+// `text` drawn as the control should show it: on the button face, no further shortening.
+qotest::Image Rendered(HWND hwnd, const std::string& text, UINT format)
+{
+    RECT rect;
+    GetClientRect(hwnd, &rect);
+    HDC screen = GetDC(hwnd);
+    HDC hdc = CreateCompatibleDC(screen);
+    BITMAPINFO bi = {};
+    bi.bmiHeader.biSize = sizeof bi.bmiHeader;
+    bi.bmiHeader.biWidth = rect.right;
+    bi.bmiHeader.biHeight = -rect.bottom;
+    bi.bmiHeader.biPlanes = 1;
+    bi.bmiHeader.biBitCount = 32;
+    void* bits = nullptr;
+    HBITMAP bmp = CreateDIBSection(hdc, &bi, DIB_RGB_COLORS, &bits, NULL, 0);
+    HGDIOBJ oldBmp = SelectObject(hdc, bmp);
+    HGDIOBJ oldFont = SelectObject(hdc, (HGDIOBJ)SendMessageA(GetParent(hwnd), WM_GETFONT, 0, 0));
+    FillRect(hdc, &rect, GetSysColorBrush(COLOR_BTNFACE));
+    SetBkMode(hdc, TRANSPARENT);
+    SetTextColor(hdc, GetSysColor(COLOR_BTNTEXT));
+    std::vector<char> buffer(text.begin(), text.end());
+    buffer.push_back('\0');
+    DrawTextExA(hdc, buffer.data(), (int)text.size(), &rect, format, NULL);
+    GdiFlush();
+    qotest::Image img;
+    img.Resize(rect.right, rect.bottom);
+    const uint8_t* p = static_cast<const uint8_t*>(bits);
+    for (int i = 0; i < rect.right * rect.bottom; ++i) {
+        img.rgb[i * 3] = p[i * 4 + 2];
+        img.rgb[i * 3 + 1] = p[i * 4 + 1];
+        img.rgb[i * 3 + 2] = p[i * 4];
+    }
+    SelectObject(hdc, oldFont);
+    SelectObject(hdc, oldBmp);
+    DeleteObject(bmp);
+    DeleteDC(hdc);
+    ReleaseDC(hwnd, screen);
+    return img;
+}
+
+int Differences(const qotest::Image& a, const qotest::Image& b)
+{
+    if (a.width != b.width || a.height != b.height) return -1;
+    int n = 0;
+    for (size_t i = 0; i < a.rgb.size(); i += 3)
+        if (a.rgb[i] != b.rgb[i] || a.rgb[i + 1] != b.rgb[i + 1] || a.rgb[i + 2] != b.rgb[i + 2]) ++n;
+    return n;
+}
+
+}  // namespace
+
+TEST_F(StaticsTest, FilespecShortensInTheMiddleAsPathElseAtTheEnd)
+{
+    const std::string path = "C:\\Daten\\Kunden\\Ausgabe 2024\\Quartal 3\\Filiale Nord\\kunden_gesamt.txt";
+    CStaticFilespec asPath(DT_NOPREFIX | DT_VCENTER | DT_SINGLELINE, 1);
+    CStaticFilespec atEnd;  // default: cut at the end
+    ASSERT_TRUE(asPath.Create("STATIC", "", WS_CHILD | WS_VISIBLE, CRect(10, 10, 230, 30), m_pFrame, 1));
+    ASSERT_TRUE(atEnd.Create("STATIC", "", WS_CHILD | WS_VISIBLE, CRect(10, 40, 230, 60), m_pFrame, 2));
+    EXPECT_TRUE(asPath.IsPath());
+    EXPECT_FALSE(atEnd.IsPath());
+    EXPECT_EQ((UINT)(DT_NOPREFIX | DT_VCENTER), atEnd.GetFormat());
+    asPath.SetWindowText(path.c_str());
+    atEnd.SetWindowText(path.c_str());
+    qotest::BringToFront(m_pFrame->m_hWnd);
+
+    std::string middle = Shortened(asPath, path, asPath.DrawFlags());
+    std::string end = Shortened(atEnd, path, atEnd.DrawFlags());
+    EXPECT_EQ(0u, middle.find("C:\\")) << middle;
+    EXPECT_NE(std::string::npos, middle.find("...\\kunden_gesamt.txt")) << middle;
+    EXPECT_EQ(0u, end.find("C:\\Daten\\Kunden\\")) << end;
+    EXPECT_EQ(end.size() - 3, end.rfind("...")) << end;
+
+    // The window keeps the whole path; the screen shows the shortened text.
+    CString kept;
+    asPath.GetWindowText(kept);
+    EXPECT_EQ(path, (const char*)kept);
+    qotest::Image seenPath, seenEnd;
+    ASSERT_TRUE(qotest::CaptureImage(asPath, seenPath, true));
+    ASSERT_TRUE(qotest::CaptureImage(atEnd, seenEnd, true));
+    EXPECT_EQ(0, Differences(seenPath, Rendered(asPath, middle, asPath.GetFormat())));
+    EXPECT_EQ(0, Differences(seenEnd, Rendered(atEnd, end, atEnd.GetFormat())));
+    EXPECT_GT(Differences(seenPath, seenEnd), 0);
+
+    // A new text is painted at once, the old one erased.
+    EXPECT_TRUE(::SetWindowTextA(asPath, "D:\\kurz.txt"));
+    qotest::PumpFor(100);
+    ASSERT_TRUE(qotest::CaptureImage(asPath, seenPath, true));
+    EXPECT_EQ(0, Differences(seenPath, Rendered(asPath, "D:\\kurz.txt", asPath.GetFormat())));
+}
+
+namespace {
+
+class CCountedLink : public CStaticLink {
+public:
+    CCountedLink(const char* link, bool* deleted) : CStaticLink(link, 1), m_pDeleted(deleted) {}
+    ~CCountedLink() override { *m_pDeleted = true; }
+    bool* m_pDeleted;
+};
+
+int CountColour(const qotest::Image& img, COLORREF colour)
+{
+    int n = 0;
+    for (int y = 0; y < img.height; ++y)
+        for (int x = 0; x < img.width; ++x)
+            if (img.Pixel(x, y) == colour) ++n;
+    return n;
+}
+
+}  // namespace
+
+TEST_F(StaticsTest, LinkOpensOnClickAndTurnsPurpleOnlyWhenOpened)
+{
+    CStaticLink broken("C:\\gibt es nicht\\liesmich.qox");
+    CStaticLink working;  // the window text is the link
+    ASSERT_TRUE(broken.Create("Liesmich", WS_CHILD | WS_VISIBLE | SS_LEFT, CRect(10, 10, 200, 30), m_pFrame, 1));
+    ASSERT_TRUE(working.Create(HarmlessProgram().c_str(), WS_CHILD | WS_VISIBLE | SS_LEFT,
+                               CRect(10, 40, 400, 60), m_pFrame, 2));
+    broken.SetFont(&m_font);
+    working.SetFont(&m_font);
+    qotest::BringToFront(m_pFrame->m_hWnd);
+
+    qotest::Image img;
+    ASSERT_TRUE(qotest::CaptureImage(broken, img, true));
+    EXPECT_GT(CountColour(img, CStaticLink::g_colorUnvisited), 20);
+
+    // The real mouse: a plain static would let the click through to the frame.
+    qotest::Click(broken, 5, 8);
+    qotest::PumpFor(200);
+    EXPECT_EQ(CStaticLink::g_colorUnvisited, broken.m_color);
+    ASSERT_TRUE(qotest::CaptureImage(broken, img, true));
+    EXPECT_EQ(0, CountColour(img, CStaticLink::g_colorVisited));
+
+    qotest::Click(working, 5, 8);
+    qotest::PumpFor(300);
+    EXPECT_EQ(CStaticLink::g_colorVisited, working.m_color);
+    EXPECT_EQ(HarmlessProgram(), (const char*)working.m_link);
+    ASSERT_TRUE(qotest::CaptureImage(working, img, true));
+    EXPECT_GT(CountColour(img, CStaticLink::g_colorVisited), 20);
+    EXPECT_EQ(0, CountColour(img, CStaticLink::g_colorUnvisited));
+
+    // Over the link the cursor is the hand.
+    EXPECT_TRUE(working.SendMessage(WM_SETCURSOR, (WPARAM)working.m_hWnd, MAKELPARAM(HTCLIENT, WM_MOUSEMOVE)));
+    EXPECT_NE(nullptr, CStaticLink::g_hCursorLink);
+    EXPECT_EQ(CStaticLink::g_hCursorLink, ::GetCursor());
+}
+
+TEST_F(StaticsTest, LinkMadeToDeleteItselfGoesWithItsWindow)
+{
+    bool deleted = false;
+    CCountedLink* link = new CCountedLink("x", &deleted);
+    ASSERT_TRUE(link->Create("x", WS_CHILD | WS_VISIBLE, CRect(0, 0, 50, 20), m_pFrame, 3));
+    link->DestroyWindow();
+    EXPECT_TRUE(deleted);
 }
