@@ -18,7 +18,7 @@ namespace {
 const int kErrorConversion = 2100;
 
 // File names in the project may be relative to the project folder.
-CQoString InProject(const CQoString& folder, const CQoString& file)
+CQoString InFolder(const CQoString& folder, const CQoString& file)
 {
     bool absolute = (file.GetLength() >= 2 && file.GetAt(1) == ':')
                     || (!file.IsEmpty() && (file.GetAt(0) == '\\' || file.GetAt(0) == '/'));
@@ -41,7 +41,7 @@ CQoString ConnectInProject(const CQoString& folder, const CQoString& connect)
             CQoString key = part.Left(equals);
             key.Trim();
             if (_stricmp(key, "Database") == 0 || _stricmp(key, "DBQ") == 0)
-                part = part.Left(equals + 1) + InProject(folder, part.Mid(equals + 1));
+                part = part.Left(equals + 1) + InFolder(folder, part.Mid(equals + 1));
         }
         if (!result.IsEmpty() || start > 0)
             result += ";";
@@ -71,6 +71,11 @@ void ToConsole(const char* text)
     DWORD written = 0;
     WriteFile(err, (const char*)line, (DWORD)line.GetLength(), &written, NULL);
 }
+}
+
+CQoString CQoConvertApp::InProject(const CQoString& file) const
+{
+    return InFolder(m_projectFolder, file);
 }
 
 CQoConvertApp::CQoConvertApp()
@@ -175,13 +180,13 @@ bool CQoConvertApp::Convert()
         return false;
     }
 
-    job.m_inputFile = InProject(m_projectFolder, job.m_inputFile);
-    job.m_outputFile = InProject(m_projectFolder, job.m_outputFile);
+    job.m_inputFile = InProject(job.m_inputFile);
+    job.m_outputFile = InProject(job.m_outputFile);
     // Database files named in a connect string are relative to the project too.
     job.m_inputConnect = ConnectInProject(m_projectFolder, job.m_inputConnect);
     job.m_outputConnect = ConnectInProject(m_projectFolder, job.m_outputConnect);
-    job.m_inputDatabase = InProject(m_projectFolder, job.m_inputDatabase);
-    job.m_outputDatabase = InProject(m_projectFolder, job.m_outputDatabase);
+    job.m_inputDatabase = InProject(job.m_inputDatabase);
+    job.m_outputDatabase = InProject(job.m_outputDatabase);
     try {
         CWaitCursor wait;
         long records = job.Run();

@@ -24,6 +24,8 @@ public:
 
     // Converts the project and reports the result (box or log). True on success.
     bool Convert();
+    // A file name of the project, relative to its folder unless absolute.
+    CQoString InProject(const CQoString& file) const;
 
     CQoString m_projectFolder;
     CQoString m_projectFile;

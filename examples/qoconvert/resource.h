@@ -7,15 +7,20 @@
 
 #define IDC_PROJECT          1000
 #define IDC_INPUT_FILE       1001
-#define IDC_INPUT_CHARSET    1002
 #define IDC_OUTPUT_FILE      1003
-#define IDC_OUTPUT_CHARSET   1004
 #define IDC_CONVERT          1005
 #define IDC_STATUS           1006
 #define IDC_INPUT_DATABASE   1007
 #define IDC_INPUT_TABLE      1008
 #define IDC_OUTPUT_DATABASE  1009
 #define IDC_OUTPUT_TABLE     1010
+#define IDC_INPUT_BROWSE     1011
+#define IDC_OUTPUT_BROWSE    1012
+#define IDC_OUTPUT_FORMAT    1013
+#define IDC_INPUT_PAGE       1014
+#define IDC_OUTPUT_PAGE      1015
+#define IDC_INPUT_GROUP      1016
+#define IDC_OUTPUT_GROUP     1017
 
 #define IDS_APP_TITLE        5000
 #define IDS_DONE             5001
