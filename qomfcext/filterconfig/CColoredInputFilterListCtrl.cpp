@@ -3,6 +3,7 @@
 #include <exception>
 #include <vector>
 
+#include "CListRedrawOff.h"
 #include "CQoInputFilter.h"
 
 namespace {
@@ -89,6 +90,7 @@ void CColoredInputFilterListCtrl::Update()
 {
     if (m_pFilter == NULL) return;
     ASSERT(::IsWindow(m_hWnd));
+    CListRedrawOff redrawOff(*this);
 
     int n = m_pFilter->NumCols();
     if (n < 0) n = 0;

@@ -3,6 +3,7 @@
 #include <climits>
 #include <vector>
 
+#include "CListRedrawOff.h"
 #include "CQoInputFilter.h"
 #include "CColoredInputFilterListCtrl.h"
 
@@ -44,6 +45,7 @@ void CInputFilterListCtrl::Update()
 {
     if (m_pFilter == NULL) return;
     ASSERT(::IsWindow(m_hWnd));
+    CListRedrawOff redrawOff(*this);
 
     DeleteAllItems();
     while (DeleteColumn(0)) {
