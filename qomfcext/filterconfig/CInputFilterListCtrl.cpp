@@ -33,7 +33,7 @@ void CInputFilterListCtrl::SetInputFilter(CQoInputFilter* pFilter)
 
 void CInputFilterListCtrl::SetMaxRows(long maxRows)
 {
-    m_lMaxRows = maxRows > 0 ? maxRows : 0;
+    m_lMaxRows = maxRows;
 }
 
 void CInputFilterListCtrl::UseHeader(int useHeader)

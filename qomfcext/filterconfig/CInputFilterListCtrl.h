@@ -28,7 +28,7 @@ public:
     CInputFilterListCtrl& operator=(const CInputFilterListCtrl&) = delete;
 
     void SetInputFilter(CQoInputFilter* pFilter);
-    // 0: no limit. A negative limit counts as none.
+    // Rows copied at most; 0: no limit.
     void SetMaxRows(long maxRows);
     // Nonzero: the columns are titled with the filter's names; 0: untitled.
     void UseHeader(int useHeader);

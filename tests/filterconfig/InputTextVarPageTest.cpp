@@ -57,6 +57,17 @@ public:
     }
 };
 
+CString ColumnTitle(const CListCtrl& list, int col)
+{
+    char buf[64] = "";
+    LVCOLUMN column = {};
+    column.mask = LVCF_TEXT;
+    column.pszText = buf;
+    column.cchTextMax = sizeof(buf);
+    list.GetColumn(col, &column);
+    return buf;
+}
+
 std::string TempFolder()
 {
     char path[MAX_PATH];
@@ -156,16 +167,7 @@ protected:
         return text;
     }
     int HeaderCount() { return m_list.GetHeaderCtrl()->GetItemCount(); }
-    CString Title(int col)
-    {
-        char buf[64] = "";
-        LVCOLUMN column = {};
-        column.mask = LVCF_TEXT;
-        column.pszText = buf;
-        column.cchTextMax = sizeof(buf);
-        m_list.GetColumn(col, &column);
-        return buf;
-    }
+    CString Title(int col) { return ColumnTitle(m_list, col); }
 
     CColoredInputFilterListCtrl m_list;
     CQoInputFilterTextVar m_filter;
@@ -447,22 +449,17 @@ TEST_F(TextVarPageTest, AppliesWhatTheUserSetAndTellsTheListenersOnce)
     // Ticking the first-line box applies the pending edits with it; the names
     // are read under the new settings.
     page.SelectText(IDC_TEXTVAR_DELIMITER, "[TAB]");
-    page.SetText(IDC_TEXTVAR_SKIP, "0");
+    page.SetText(IDC_TEXTVAR_SKIP, "-3");  // becomes 0, and is shown so
     page.Select(IDC_TEXTVAR_CHARSET, 2);
     page.Check(IDC_TEXTVAR_FIRST_NAMES, true);
     PumpApp(100);
     EXPECT_TRUE(m_filter.GetFirstRowHasNames());
     EXPECT_EQ(0, m_filter.Skip());
+    EXPECT_EQ("0", page.Text(IDC_TEXTVAR_SKIP));
     EXPECT_EQ(CQoFile::ansimix, m_filter.CharSet());
     EXPECT_EQ(3, m_pPage->m_preview.GetItemCount());
     EXPECT_EQ("Meier", Cell(0, 0));
-    char title[32] = "";
-    LVCOLUMN column = {};
-    column.mask = LVCF_TEXT;
-    column.pszText = title;
-    column.cchTextMax = sizeof(title);
-    m_pPage->m_preview.GetColumn(1, &column);
-    EXPECT_STREQ("Ort", title);
+    EXPECT_EQ("Ort", ColumnTitle(m_pPage->m_preview, 1));
     EXPECT_EQ(3u, m_listener.m_ids.size());
 }
 
