@@ -2,6 +2,8 @@
 
 #include <CQoException.h>
 #include <CQoFile.h>
+#include <CQoInterActive.h>
+#include <CQoLog.h>
 #include <CQoInputFilterDao.h>
 #include <CQoInputFilterODBC.h>
 #include <CQoOutputFilterDao.h>
@@ -22,9 +24,59 @@ const char kInputFilter[] = "Eingabefilter";
 const char kOutputFilter[] = "Ausgabefilter";
 }
 
+// The delimited input of a run. Every record that does not fit leaves one
+// line in the log: where it is and what is wrong (the filter's own message,
+// complete only once the filter has acted on the answer), how it begins, and
+// what became of it.
+class CConversionInput : public CQoInputFilterTextVar
+{
+public:
+    explicit CConversionInput(CConversion& job) : m_job(job), m_answer(0), m_bPending(false) {}
+    ~CConversionInput() override { Flush(); }
+
+    int ReportWrongInput(CQoString& data, int& nextPos) override
+    {
+        Flush();
+        // The record as it stood in the file, up to the presumed next one.
+        m_excerpt = data.Left(nextPos > 0 && nextPos < kExcerpt ? nextPos : kExcerpt);
+        m_excerpt.TrimNewline();
+        int answer = CQoInputFilterTextVar::ReportWrongInput(data, nextPos);
+        if (answer == CQoInterActive::repairNoHandler && m_job.m_bSkipDefective)
+            answer = CQoInterActive::repairSkip;   // the presumed next record follows
+        if (answer == CQoInterActive::repairSkip)
+            ++m_job.m_lSkipped;
+        m_answer = answer;
+        m_bPending = true;
+        return answer;
+    }
+
+    void Flush()
+    {
+        if (!m_bPending)
+            return;
+        m_bPending = false;
+        const char* what;
+        switch (m_answer) {
+        case CQoInterActive::repairSkip:     what = "\xFC" "bersprungen"; break;
+        case CQoInterActive::repairTakeOver: what = "korrigiert \xFC" "bernommen"; break;
+        case CQoInterActive::repairStop:     what = "Einlesen abgebrochen"; break;
+        default:                             what = "nicht lesbar, Konvertierung beendet"; break;
+        }
+        _theLog << "Fehlerhafter Satz " << what << ": " << LastWrongInput().GetString() << ", Anfang: "
+                << m_excerpt.GetString() << CQoLog::endl;
+    }
+
+private:
+    enum { kExcerpt = 100 };
+    CConversion& m_job;
+    CQoString m_excerpt;
+    int m_answer;
+    bool m_bPending;
+};
+
 CConversion::CConversion()
-    : m_inputCharset(charsetAnsi), m_outputCharset(charsetAnsi), m_outputFormat(formatDelimited),
-      m_bTextFilters(false)
+    : m_bSkipDefective(false), m_inputCharset(charsetAnsi), m_outputCharset(charsetAnsi),
+      m_outputFormat(formatDelimited), m_bTextFilters(false), m_pProgress(nullptr), m_lSkipped(0)
 {
 }
 
@@ -98,6 +150,51 @@ void CConversion::WriteConfig(CQoConfigFile& config) const
     }
 }
 
+CQoString CConversion::InFolder(const CQoString& folder, const CQoString& file)
+{
+    bool absolute = (file.GetLength() >= 2 && file.GetAt(1) == ':')
+                    || (!file.IsEmpty() && (file.GetAt(0) == '\\' || file.GetAt(0) == '/'));
+    return absolute || file.IsEmpty() ? file : folder + "\\" + file;
+}
+
+namespace {
+// The value of Database= or DBQ= in a connect string, made absolute against
+// the project folder like the file names.
+CQoString ConnectInFolder(const CQoString& folder, const CQoString& connect)
+{
+    CQoString result;
+    int start = 0;
+    while (start <= connect.GetLength()) {
+        int end = connect.Find(';', start);
+        if (end < 0)
+            end = connect.GetLength();
+        CQoString part = connect.Mid(start, end - start);
+        int equals = part.Find('=');
+        if (equals > 0) {
+            CQoString key = part.Left(equals);
+            key.Trim();
+            if (_stricmp(key, "Database") == 0 || _stricmp(key, "DBQ") == 0)
+                part = part.Left(equals + 1) + CConversion::InFolder(folder, part.Mid(equals + 1));
+        }
+        if (!result.IsEmpty() || start > 0)
+            result += ";";
+        result += part;
+        start = end + 1;
+    }
+    return result;
+}
+}
+
+void CConversion::PlaceInFolder(const CQoString& folder)
+{
+    m_inputFile = InFolder(folder, m_inputFile);
+    m_outputFile = InFolder(folder, m_outputFile);
+    m_inputConnect = ConnectInFolder(folder, m_inputConnect);
+    m_outputConnect = ConnectInFolder(folder, m_outputConnect);
+    m_inputDatabase = InFolder(folder, m_inputDatabase);
+    m_outputDatabase = InFolder(folder, m_outputDatabase);
+}
+
 int CConversion::FileMode(int charset)
 {
     switch (charset) {
@@ -153,7 +250,7 @@ CQoInputFilter* CConversion::NewInput() const
             odbc->InitTable(m_inputSql, CQoInputFilterDB::tableSql, false);
         return odbc.release();
     }
-    std::unique_ptr<CQoInputFilterTextVar> text(new CQoInputFilterTextVar);
+    std::unique_ptr<CQoInputFilterTextVar> text(new CConversionInput(*const_cast<CConversion*>(this)));
     ConfigureInput(*text);
     text->Init(m_inputFile);
     return text.release();
@@ -250,7 +347,9 @@ long CConversion::RunRecords()
         && _stricmp(m_inputTable, m_outputTable) == 0)
         CQoException::Throw("Die Ausgabetabelle ist die Eingabetabelle; sie w\xFCrde geleert.", m_outputTable);
 
+    m_lSkipped = 0;
     std::unique_ptr<CQoInputFilter> input(NewInput());
+    CConversionInput* logged = dynamic_cast<CConversionInput*>(input.get());
     if (input->NumCols() == 0)
         CQoException::Throw("Die Eingabe hat keine Spalten.", "CConversion::Run");
     CInputRecords records(input.get());
@@ -276,12 +375,18 @@ long CConversion::RunRecords()
             if (!output->WriteRow())
                 CQoException::Throw("Ein Satz wurde nicht gespeichert.", "CConversion::Run");
             ++written;
+            if (m_pProgress != nullptr && !m_pProgress->Advance(written, input->getActPosInFile()))
+                throw CConversionCancelled();
         }
+        if (logged != nullptr)
+            logged->Flush();
         if (OutputIsDatabase() && m_outputDatabase.IsEmpty())
             static_cast<CQoOutputFilterODBC*>(output.get())->ReleaseDB();
         else
             output->ReleaseFile();   // a table: closing it stores what is queued
     } catch (...) {
+        if (logged != nullptr)
+            logged->Flush();
         if (!temp.empty()) {
             try {
                 output->ReleaseFile();
@@ -350,6 +455,8 @@ long CConversion::RunLines()
             line += "\r\n";
             output.Write(line);
             ++records;
+            if (m_pProgress != nullptr && !m_pProgress->Advance(records, input.Tell()))
+                throw CConversionCancelled();
         }
         output.Flush(true);
         output.Close();

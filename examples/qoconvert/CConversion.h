@@ -44,6 +44,22 @@ class CQoInputFilterTextVar;
 class CQoOutputFilter;
 class CQoOutputSource;
 
+// Told after every record a conversion has written, with the byte offset of
+// the input's current record (-1 for inputs that are no file). Answering
+// false stops the run: Run then raises CConversionCancelled and the previous
+// output stays as it was.
+class CConversionProgress
+{
+public:
+    virtual ~CConversionProgress() = default;
+    virtual bool Advance(long records, long long position) = 0;
+};
+
+// Raised by CConversion::Run when its progress listener stopped the run.
+struct CConversionCancelled
+{
+};
+
 class CConversion
 {
 public:
@@ -72,7 +88,17 @@ public:
     // CQoException when a file cannot be opened, read or written, or when
     // the output is the input. The target is replaced only by a complete
     // output.
+    //
+    // Defective records of a delimited input go to the record-repair hook
+    // (CQoInterActive) and each leaves a line in the log with the answer.
+    // Without a hook a defective record stops the run, unless
+    // m_bSkipDefective is set: then it is skipped (and logged) as the hook's
+    // "skip" would. SkippedRecords() counts the records left out.
     long Run();
+    long SkippedRecords() const { return m_lSkipped; }
+    // Listener between records (not owned; may be null).
+    void SetProgress(CConversionProgress* progress) { m_pProgress = progress; }
+    bool m_bSkipDefective;
 
     CQoString m_inputFile;
     int m_inputCharset;
@@ -90,6 +116,12 @@ public:
     int m_outputFormat;
 
     bool UsesTextFilters() const { return m_bTextFilters; }
+
+    // A file name of a project, relative to its folder unless absolute.
+    static CQoString InFolder(const CQoString& folder, const CQoString& file);
+    // Makes every file named by the project (files, database files, the
+    // database file of a connect string) absolute against its folder.
+    void PlaceInFolder(const CQoString& folder);
 
     bool InputIsDatabase() const { return !m_inputConnect.IsEmpty() || !m_inputDatabase.IsEmpty(); }
     bool OutputIsDatabase() const { return !m_outputConnect.IsEmpty() || !m_outputDatabase.IsEmpty(); }
@@ -109,4 +141,8 @@ private:
     // The two filter sections, as read or as the pages left them.
     CQoConfigFile m_filterSettings;
     bool m_bTextFilters;
+    CConversionProgress* m_pProgress;
+    long m_lSkipped;
+
+    friend class CConversionInput;
 };

@@ -7,8 +7,12 @@
 #include <COutputFilterConfigTextVar.h>
 #include <CQoConfigFile.h>
 #include <CQoException.h>
+#include <CQoLog.h>
 
 #include "QoConvertApp.h"
+#include "QoConvertRun.h"
+
+#include <commctrl.h>
 
 BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
     ON_BN_CLICKED(IDC_CONVERT, OnConvert)
@@ -17,10 +21,14 @@ BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
     ON_EN_KILLFOCUS(IDC_INPUT_FILE, OnInputFileChanged)
     ON_CBN_SELCHANGE(IDC_OUTPUT_FORMAT, OnFormatChanged)
     ON_WM_DESTROY()
+    ON_BN_CLICKED(IDC_ABORT, OnAbort)
+    ON_MESSAGE(WM_QOCONVERT_START, OnRunStart)
+    ON_MESSAGE(WM_QOCONVERT_PROGRESS, OnRunProgress)
 END_MESSAGE_MAP()
 
 CMainDlg::CMainDlg(CWnd* pParent)
-    : CDialog(IDD, pParent), m_outputFormat(CConversion::formatDelimited), m_records(&m_outputRows)
+    : CDialog(IDD, pParent), m_outputFormat(CConversion::formatDelimited), m_records(&m_outputRows),
+      m_hCancel(NULL), m_llInputSize(-1), m_bCloseWhenDone(false)
 {
 }
 
@@ -60,6 +68,8 @@ BOOL CMainDlg::OnInitDialog()
     m_inputPage->Create(this);
     m_inputPage->AddModifiedListener(this);
     MakeOutputPage();
+    GetDlgItem(IDC_PROGRESS)->SendMessage(PBM_SETRANGE32, 0, 10000);
+    EnableForRun(false);
     if (!problem.IsEmpty())
         Status(problem);
     return TRUE;
@@ -80,6 +90,11 @@ void CMainDlg::DoDataExchange(CDataExchange* pDX)
 
 void CMainDlg::OnDestroy()
 {
+    if (m_hCancel != NULL) {
+        // Only after the run ended (OnCancel waits for it); the handle goes.
+        CloseHandle(m_hCancel);
+        m_hCancel = NULL;
+    }
     // The pages are children of this window: they go before it does.
     if (m_outputPage && ::IsWindow(m_outputPage->m_hWnd))
         m_outputPage->DestroyWindow();
@@ -200,15 +215,24 @@ void CMainDlg::Arrange()
     // The status line at the left, the buttons at the right, under the groups.
     const int right = out.left + outWidth;
     const int top = groupBottom + unit.bottom;
+    // From the right: Beenden, Abbrechen, Konvertieren, the progress bar.
     CRect status = ChildRect(this, GetDlgItem(IDC_STATUS));
     CRect convert = ChildRect(this, GetDlgItem(IDC_CONVERT));
     CRect quit = ChildRect(this, GetDlgItem(IDCANCEL));
-    GetDlgItem(IDCANCEL)->SetWindowPos(NULL, right - quit.Width(), top, 0, 0, SWP_NOSIZE | SWP_NOZORDER | SWP_NOACTIVATE);
-    GetDlgItem(IDC_CONVERT)->SetWindowPos(NULL, right - quit.Width() - unit.right - convert.Width(), top, 0, 0,
-                                          SWP_NOSIZE | SWP_NOZORDER | SWP_NOACTIVATE);
+    CRect abort = ChildRect(this, GetDlgItem(IDC_ABORT));
+    CRect bar = ChildRect(this, GetDlgItem(IDC_PROGRESS));
+    const UINT place = SWP_NOSIZE | SWP_NOZORDER | SWP_NOACTIVATE;
+    int x = right - quit.Width();
+    GetDlgItem(IDCANCEL)->SetWindowPos(NULL, x, top, 0, 0, place);
+    x -= unit.right + abort.Width();
+    GetDlgItem(IDC_ABORT)->SetWindowPos(NULL, x, top, 0, 0, place);
+    x -= unit.right + convert.Width();
+    GetDlgItem(IDC_CONVERT)->SetWindowPos(NULL, x, top, 0, 0, place);
+    x -= 2 * unit.right + bar.Width();
+    GetDlgItem(IDC_PROGRESS)->SetWindowPos(NULL, x, top + (convert.Height() - bar.Height()) / 2, 0, 0, place);
     GetDlgItem(IDC_STATUS)->SetWindowPos(NULL, status.left, top + (convert.Height() - status.Height()) / 2,
-                                         right - 2 * unit.right - quit.Width() - convert.Width() - status.left,
-                                         status.Height(), SWP_NOZORDER | SWP_NOACTIVATE);
+                                         x - unit.right - status.left, status.Height(),
+                                         SWP_NOZORDER | SWP_NOACTIVATE);
 
     CRect window, client;
     GetWindowRect(&window);
@@ -298,5 +322,102 @@ void CMainDlg::OnConvert()
         Status("Projektdatei nicht gespeichert.");
         return;
     }
-    Status(theApp.Convert() ? "Konvertiert." : "Fehlgeschlagen.");
+
+    // The module converts on a thread of its own; this window stays live,
+    // shows its progress and may set the event that stops it.
+    static LONG runs = 0;
+    CString name;
+    name.Format("qoconvert-abbrechen-%lu-%ld", GetCurrentProcessId(), InterlockedIncrement(&runs));
+    m_hCancel = CreateEventA(NULL, TRUE, FALSE, name);
+    if (m_hCancel == NULL) {
+        Status("Die Konvertierung kann nicht gestartet werden.");
+        return;
+    }
+    m_llInputSize = -1;
+    GetDlgItem(IDC_PROGRESS)->SendMessage(PBM_SETPOS, 0, 0);
+    EnableForRun(true);
+    Status("Konvertierung l\xE4uft...");
+    if (!theApp.StartConversion(m_hWnd, name)) {
+        CloseHandle(m_hCancel);
+        m_hCancel = NULL;
+        EnableForRun(false);
+        Status("Die Konvertierung kann nicht gestartet werden.");
+    }
+}
+
+void CMainDlg::EnableForRun(bool running)
+{
+    const int controls[] = {IDC_INPUT_FILE, IDC_INPUT_BROWSE, IDC_INPUT_DATABASE, IDC_INPUT_TABLE,
+                            IDC_OUTPUT_FILE, IDC_OUTPUT_BROWSE, IDC_OUTPUT_FORMAT, IDC_OUTPUT_DATABASE,
+                            IDC_OUTPUT_TABLE, IDC_CONVERT};
+    for (int id : controls)
+        GetDlgItem(id)->EnableWindow(!running);
+    if (m_inputPage && ::IsWindow(m_inputPage->m_hWnd))
+        m_inputPage->EnableWindow(!running);
+    if (m_outputPage && ::IsWindow(m_outputPage->m_hWnd))
+        m_outputPage->EnableWindow(!running);
+    GetDlgItem(IDC_ABORT)->EnableWindow(running);
+    GetDlgItem(IDC_PROGRESS)->ShowWindow(running ? SW_SHOW : SW_HIDE);
+    if (running)
+        GotoDlgCtrl(GetDlgItem(IDC_ABORT));
+}
+
+void CMainDlg::OnAbort()
+{
+    if (m_hCancel != NULL) {
+        SetEvent(m_hCancel);
+        Status("Wird abgebrochen...");
+    }
+}
+
+void CMainDlg::OnCancel()
+{
+    // Closing while the module runs would end it in the middle of a record:
+    // it is stopped first, and the window closes when it is over.
+    if (m_hCancel != NULL) {
+        m_bCloseWhenDone = true;
+        OnAbort();
+        return;
+    }
+    CDialog::OnCancel();
+}
+
+LRESULT CMainDlg::OnRunStart(WPARAM, LPARAM lParam)
+{
+    m_llInputSize = (long long)lParam;
+    return 0;
+}
+
+LRESULT CMainDlg::OnRunProgress(WPARAM wParam, LPARAM lParam)
+{
+    if (m_hCancel == NULL)
+        return 0;   // a late message of a run that is over
+    long long position = (long long)lParam;
+    CString text;
+    text.Format("Konvertierung l\xE4uft: %lu S\xE4tze", (unsigned long)wParam);
+    if (m_llInputSize > 0 && position >= 0) {
+        int permyriad = (int)(position >= m_llInputSize ? 10000 : position * 10000 / m_llInputSize);
+        GetDlgItem(IDC_PROGRESS)->SendMessage(PBM_SETPOS, permyriad, 0);
+        CString share;
+        share.Format(" (%d %%)", permyriad / 100);
+        text += share;
+    }
+    if (WaitForSingleObject(m_hCancel, 0) == WAIT_OBJECT_0)
+        text = "Wird abgebrochen...";
+    Status(text);
+    return 0;
+}
+
+void CMainDlg::ConversionDone(int code)
+{
+    if (m_hCancel != NULL) {
+        CloseHandle(m_hCancel);
+        m_hCancel = NULL;
+    }
+    _theLog << "Ergebnis der Konvertierung: " << (long)code << " - " << (const char*)CQoConvertApp::ResultText(code)
+            << CQoLog::endl;
+    EnableForRun(false);
+    Status(CQoConvertApp::ResultText(code));
+    if (m_bCloseWhenDone)
+        EndDialog(IDCANCEL);
 }

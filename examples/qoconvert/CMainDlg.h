@@ -37,6 +37,9 @@ public:
 
     // A page changed its filter: the output side follows the input's settings.
     int ModifiedListenerSetModified(int bModified, int nNotifierId) override;
+    // The conversion started by "Konvertieren" is over (the module's result code).
+    void ConversionDone(int code);
+    bool IsConverting() const { return m_hCancel != NULL; }
 
 protected:
     virtual BOOL OnInitDialog();
@@ -48,6 +51,10 @@ protected:
     afx_msg void OnInputFileChanged();
     afx_msg void OnFormatChanged();
     afx_msg void OnDestroy();
+    afx_msg void OnAbort();
+    virtual void OnCancel();
+    afx_msg LRESULT OnRunStart(WPARAM wParam, LPARAM lParam);
+    afx_msg LRESULT OnRunProgress(WPARAM wParam, LPARAM lParam);
     DECLARE_MESSAGE_MAP()
 
 private:
@@ -61,6 +68,12 @@ private:
     void Arrange();
     bool Browse(CString& file, bool open);
     void Status(const CString& text);
+    // While a conversion runs only "Abbrechen" takes input.
+    void EnableForRun(bool running);
+
+    HANDLE m_hCancel;            // the running conversion's cancel event, else NULL
+    long long m_llInputSize;     // of the running conversion's input; -1 unknown
+    bool m_bCloseWhenDone;
 
     CConversion m_job;
     CString m_project;

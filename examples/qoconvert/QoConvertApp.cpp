@@ -1,81 +1,26 @@
 #include "QoConvertApp.h"
 
-#include <CQoConfigFile.h>
+#include <CExecuter.h>
+#include <CQoArray.h>
 #include <CQoErrorDlg.h>
-#include <CQoException.h>
 #include <CQoInterActive.h>
 #include <CQoLog.h>
+#include <CRepairRecordDlg.h>
 #include <QoBatchMessageBox.h>
 
 #include "CConversion.h"
 #include "CMainDlg.h"
-#include "resource.h"
+#include "QoConvertRun.h"
 
 CQoConvertApp theApp;
 
-namespace {
-// The program's own error numbers.
-const int kErrorConversion = 2100;
-
-// File names in the project may be relative to the project folder.
-CQoString InFolder(const CQoString& folder, const CQoString& file)
-{
-    bool absolute = (file.GetLength() >= 2 && file.GetAt(1) == ':')
-                    || (!file.IsEmpty() && (file.GetAt(0) == '\\' || file.GetAt(0) == '/'));
-    return absolute || file.IsEmpty() ? file : folder + "\\" + file;
-}
-
-// The value of Database= or DBQ= in a connect string, made absolute against
-// the project folder like the file names.
-CQoString ConnectInProject(const CQoString& folder, const CQoString& connect)
-{
-    CQoString result;
-    int start = 0;
-    while (start <= connect.GetLength()) {
-        int end = connect.Find(';', start);
-        if (end < 0)
-            end = connect.GetLength();
-        CQoString part = connect.Mid(start, end - start);
-        int equals = part.Find('=');
-        if (equals > 0) {
-            CQoString key = part.Left(equals);
-            key.Trim();
-            if (_stricmp(key, "Database") == 0 || _stricmp(key, "DBQ") == 0)
-                part = part.Left(equals + 1) + InFolder(folder, part.Mid(equals + 1));
-        }
-        if (!result.IsEmpty() || start > 0)
-            result += ";";
-        result += part;
-        start = end + 1;
-    }
-    return result;
-}
-
-// A batch run has no window: its errors go to the console that started it
-// (attached when the program has none of its own) as well as to the log.
-void ToConsole(const char* text)
-{
-    HANDLE err = GetStdHandle(STD_ERROR_HANDLE);
-    if (err == NULL || err == INVALID_HANDLE_VALUE) {
-        if (!AttachConsole(ATTACH_PARENT_PROCESS))
-            return;
-        err = GetStdHandle(STD_ERROR_HANDLE);
-        if (err == NULL || err == INVALID_HANDLE_VALUE)
-            return;
-    }
-    // The console shows OEM characters; the program's texts are Ansi.
-    CString line = text;
-    line += "\r\n";
-    CharToOemBuffA(line.GetBuffer(), line.GetBuffer(), (DWORD)line.GetLength());
-    line.ReleaseBuffer();
-    DWORD written = 0;
-    WriteFile(err, (const char*)line, (DWORD)line.GetLength(), &written, NULL);
-}
-}
+BEGIN_MESSAGE_MAP(CQoConvertApp, CSingleWinApp)
+    ON_THREAD_MESSAGE(WM_QOCONVERT_DONE, OnConversionDone)
+END_MESSAGE_MAP()
 
 CQoString CQoConvertApp::InProject(const CQoString& file) const
 {
-    return InFolder(m_projectFolder, file);
+    return CConversion::InFolder(m_projectFolder, file);
 }
 
 CQoConvertApp::CQoConvertApp()
@@ -110,6 +55,10 @@ void CQoConvertApp::ParseArguments()
 BOOL CQoConvertApp::InitInstance()
 {
     ParseArguments();
+    // A batch run works beside a running window and beside other batch runs;
+    // only the interactive program is there once.
+    if (!m_batch && !CSingleWinApp::InitInstance())
+        return FALSE;
 
     CQoString log = m_projectFolder + "\\qoconvert.log";
     _theLog.Open(log);
@@ -118,13 +67,14 @@ BOOL CQoConvertApp::InitInstance()
 
     QoBatchMessageBoxSetMode(m_batch);
     CQoInterActive::SetQuiet(m_batch);
-    CQoErrorDlg::AddMessage(kErrorConversion, "Die Konvertierung ist fehlgeschlagen.");
-
     if (m_batch) {
-        m_exitCode = Convert() ? 0 : 1;
+        m_exitCode = RunBatch();
         return FALSE;  // no window, no message loop
     }
 
+    // Defective input records are repaired by the user, in a dialog that the
+    // conversion opens on its own thread.
+    CQoInterActive::SetRepairRecord(CRepairRecordDlgDoIt);
     CMainDlg dlg;
     m_pMainWnd = &dlg;
     dlg.DoModal();
@@ -136,71 +86,88 @@ int CQoConvertApp::ExitInstance()
 {
     _theLog << "qoconvert beendet mit " << (long)m_exitCode << CQoLog::endl;
     _theLog.Close();
-    CWinApp::ExitInstance();
+    CSingleWinApp::ExitInstance();
     return m_exitCode;
 }
 
-void CQoConvertApp::Refuse(int number, const char* text)
+bool CQoConvertApp::StartConversion(HWND progress, const char* cancelEvent)
 {
+    char path[MAX_PATH];
+    DWORD n = GetModuleFileNameA(NULL, path, MAX_PATH);
+    if (n == 0 || n >= MAX_PATH)
+        return false;
+    CQoString module = path;
+    module = module.Left(module.ReverseFind('\\') + 1) + "qoconvert_run.dll";
+
+    CQoArray<CQoString, CQoString&> args;
+    args.Add(module);
+    args.Add(m_projectFolder);
     if (m_batch)
-        ToConsole(text);
-    QoBatchMessageBox(number, IDOK, text, MB_OK | MB_ICONSTOP, 0);
+        args.Add(CQoString("/batch"));
+    if (progress != NULL) {
+        CQoString option;
+        option.Format("/progress=%llu", (unsigned long long)(UINT_PTR)progress);
+        args.Add(option);
+    }
+    if (cancelEvent != NULL && *cancelEvent != '\0')
+        args.Add(CQoString("/cancel=") + cancelEvent);
+
+    CExecuter* job = new CExecuter(false, this, WM_QOCONVERT_DONE, 0);
+    job->SetArguments(args);
+    if (!job->CreateThread()) {
+        job->Delete();
+        return false;
+    }
+    return true;
 }
 
-bool CQoConvertApp::Convert()
+CString CQoConvertApp::ResultText(int code)
 {
-    DWORD attributes = GetFileAttributesA(m_projectFolder);
-    if (attributes == INVALID_FILE_ATTRIBUTES || !(attributes & FILE_ATTRIBUTE_DIRECTORY)) {
+    switch (code) {
+    case qoConvertDone:      return "Konvertiert.";
+    case qoConvertFailed:    return "Fehlgeschlagen.";
+    case qoConvertCancelled: return "Abgebrochen; die Ausgabedatei ist unver\xE4ndert.";
+    case qoConvertSkipped:   return "Konvertiert; fehlerhafte S\xE4tze wurden ausgelassen (siehe Protokoll).";
+    case qoConvertUsage:     return "Fehlerhafter Aufruf des Konvertierungsmoduls.";
+    case CExecuter::errModuleNotLoaded:
+        return "Das Konvertierungsmodul qoconvert_run.dll kann nicht geladen werden.";
+    case CExecuter::errNoEntryOrNoProcess:
+        return "Das Konvertierungsmodul hat keinen Einsprungpunkt QoMain.";
+    default: {
         CString text;
-        text.Format(IDS_NO_FOLDER, (const char*)m_projectFolder);
-        Refuse(2102, text);
-        return false;
+        text.Format("Das Konvertierungsmodul endete mit dem Code %d.", code);
+        return text;
     }
-    CQoConfigFile config;
-    if (!config.Open(m_projectFile)) {
-        CString text;
-        text.Format(IDS_CANNOT_READ, (const char*)m_projectFile);
-        Refuse(2103, text);
-        return false;
     }
-    CConversion job;
-    try {
-        job.ReadConfig(config);
-    } catch (const CQoException& e) {
-        CString text;
-        text.Format(IDS_BAD_PROJECT, (const char*)m_projectFile, e.Text());
-        Refuse(2104, text);
-        return false;
-    }
-    if ((job.m_inputFile.IsEmpty() && !job.InputIsDatabase())
-        || (job.m_outputFile.IsEmpty() && !job.OutputIsDatabase())) {
-        CString text;
-        text.Format(IDS_NO_PROJECT, (const char*)m_projectFile);
-        Refuse(2101, text);
-        return false;
-    }
+}
 
-    job.m_inputFile = InProject(job.m_inputFile);
-    job.m_outputFile = InProject(job.m_outputFile);
-    // Database files named in a connect string are relative to the project too.
-    job.m_inputConnect = ConnectInProject(m_projectFolder, job.m_inputConnect);
-    job.m_outputConnect = ConnectInProject(m_projectFolder, job.m_outputConnect);
-    job.m_inputDatabase = InProject(job.m_inputDatabase);
-    job.m_outputDatabase = InProject(job.m_outputDatabase);
-    try {
-        CWaitCursor wait;
-        long records = job.Run();
-        CString done;
-        done.Format(IDS_DONE, records, (const char*)job.m_outputFile);
-        QoBatchMessageBox(1001, IDOK, done, MB_OK | MB_ICONINFORMATION, 0);
-        return true;
-    } catch (const CQoException& e) {
-        if (m_batch) {
-            // No window in batch mode: the console and the log say why.
-            Refuse(kErrorConversion, e.Message());
-        } else {
-            CQoErrorDlg::ShowError(kErrorConversion, e.Message());
-        }
-        return false;
+void CQoConvertApp::OnConversionDone(WPARAM wParam, LPARAM /*lParam*/)
+{
+    int code = (int)(INT_PTR)wParam;
+    CMainDlg* window = dynamic_cast<CMainDlg*>(m_pMainWnd);
+    if (window != NULL && ::IsWindow(window->m_hWnd))
+        window->ConversionDone(code);
+}
+
+int CQoConvertApp::RunBatch()
+{
+    if (!StartConversion(NULL, NULL)) {
+        QoBatchMessageBox(2106, IDOK, "Die Konvertierung kann nicht gestartet werden.", MB_OK | MB_ICONSTOP, 0);
+        return qoConvertFailed;
     }
+    // The executer's message ends the wait; nothing else comes to a batch run.
+    MSG msg;
+    while (GetMessageA(&msg, NULL, 0, 0) > 0) {
+        if (msg.hwnd == NULL && msg.message == WM_QOCONVERT_DONE) {
+            int code = (int)(INT_PTR)msg.wParam;
+            if (code >= qoConvertDone && code <= qoConvertUsage)
+                return code;
+            // The module did not run: say why, in the log and on the console.
+            QoBatchMessageBox(2107, IDOK, ResultText(code), MB_OK | MB_ICONSTOP, 0);
+            return qoConvertFailed;
+        }
+        TranslateMessage(&msg);
+        DispatchMessageA(&msg);
+    }
+    return qoConvertFailed;
 }

@@ -21,6 +21,8 @@
 #define IDC_OUTPUT_PAGE      1015
 #define IDC_INPUT_GROUP      1016
 #define IDC_OUTPUT_GROUP     1017
+#define IDC_PROGRESS         1018
+#define IDC_ABORT            1019
 
 #define IDS_APP_TITLE        5000
 #define IDS_DONE             5001
