@@ -176,3 +176,46 @@ if(NOT rc EQUAL 0 OR NOT differs EQUAL 0)
   file(READ ${project}/qoconvert.log log)
   message(FATAL_ERROR "from a workbook: exit ${rc}, differs ${differs}\n${err}\nlog:\n${log}")
 endif()
+
+# The large sample with its four defective records: a batch run converts the
+# rest, names each defective record in the log and ends with 3 (converted,
+# records left out).
+set(big ${WORK_DIR}/big-project)
+file(REMOVE_RECURSE ${big})
+execute_process(COMMAND /usr/bin/python3 ${SOURCE_DIR}/sample/make-big-sample.py ${big} RESULT_VARIABLE rc)
+if(NOT rc EQUAL 0)
+  message(FATAL_ERROR "the large sample could not be generated")
+endif()
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${big}
+                RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 300)
+file(READ ${big}/qoconvert.log log)
+string(REGEX MATCHALL "Fehlerhafter Satz .bersprungen: Satz [0-9]+: [^\n]*Anfang: [0-9]+" skipped "${log}")
+list(LENGTH skipped nskipped)
+execute_process(COMMAND sh -c "wc -l < kunden-gross-dos.txt" WORKING_DIRECTORY ${big} OUTPUT_VARIABLE lines)
+string(STRIP "${lines}" lines)
+if(NOT rc EQUAL 3 OR NOT nskipped EQUAL 4 OR NOT lines EQUAL 119997
+   OR NOT log MATCHES "Satz [0-9]+: 11 Felder statt 10 [^\n]*Anfang: 1000;"
+   OR NOT log MATCHES "Begrenzer nicht geschlossen [^\n]*Anfang: 120000;"
+   OR NOT log MATCHES "H:1001 119996 S.tze konvertiert")
+  message(FATAL_ERROR "large sample: exit ${rc}, ${nskipped} skipped, ${lines} lines\n${err}\nlog:\n${log}")
+endif()
+# The records around a skipped one arrive whole, in code page 850.
+execute_process(COMMAND sh -c "grep -a -c -E '^(999|1001);' kunden-gross-dos.txt; grep -a '^2;' kunden-gross-dos.txt | iconv -f CP850 -t UTF-8"
+                WORKING_DIRECTORY ${big} OUTPUT_VARIABLE around)
+if(NOT around MATCHES "^2\n2;Wei[^;]+;K[^;]+the;[^;]+bergasse 8;")
+  message(FATAL_ERROR "large sample: records around the defects:\n${around}")
+endif()
+
+# Cancelled after its first progress message (a driver that runs the module
+# as the window does): code 2, and the previous output is still there as it was.
+file(WRITE ${big}/kunden-gross-dos.txt "die vorige Ausgabe\n")
+file(COPY_FILE ${big}/kunden-gross-dos.txt ${big}/vorher.txt)
+execute_process(COMMAND ${EMULATOR} ${CANCEL} ${MODULE} ${big}
+                RESULT_VARIABLE rc OUTPUT_VARIABLE out ERROR_VARIABLE err TIMEOUT 300)
+execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${big}/kunden-gross-dos.txt ${big}/vorher.txt
+                RESULT_VARIABLE previous)
+file(GLOB leftovers ${big}/qo*.tmp ${big}/*.~tmp)
+if(NOT rc EQUAL 2 OR NOT previous EQUAL 0 OR leftovers
+   OR NOT out MATCHES "start size 11[0-9]+\r?\nprogress records [1-9]")
+  message(FATAL_ERROR "cancelled run: exit ${rc}, output '${previous}', left ${leftovers}\n${out}\n${err}")
+endif()
