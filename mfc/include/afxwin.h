@@ -923,6 +923,8 @@ public:
   CWnd* GetTopLevelParent() const;
   CWnd* GetWindow(UINT nCmd) const;
   CWnd* GetTopWindow() const;
+  // The owned popup that was active last; the window itself when it has none.
+  CWnd* GetLastActivePopup() const { return CWnd::FromHandle(::GetLastActivePopup(m_hWnd)); }
   CWnd* GetDescendantWindow(int nID, BOOL bOnlyPerm = FALSE) const;
   static CWnd* PASCAL GetDesktopWindow();
 

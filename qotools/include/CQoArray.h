@@ -15,7 +15,10 @@
 #include <cstddef>
 #include <vector>
 
-template <class T>
+// The second parameter names the argument type as the family's interfaces
+// spell it (CQoArray<CQoString, CQoString&>, as MFC's CArray does); elements
+// are always taken by const reference, so both spellings hold the same data.
+template <class T, class ARG_T = T const &>
 class CQoArray {
 public:
     CQoArray() = default;

@@ -1,0 +1,197 @@
+// The executer with real threads, modules and processes: helpers/TestModule.cpp
+// (QoMain writes its arguments and returns argv[2] or throws),
+// helpers/NoEntryModule.cpp and helpers/ArgsProgram.cpp. The completion
+// message comes to this test's main thread, the application's thread.
+#include <afxwin.h>
+
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <cstdlib>
+#include <fstream>
+#include <string>
+#include <vector>
+
+#include "CExecuter.h"
+#include "CQoLog.h"
+
+namespace {
+
+const UINT WM_JOB_DONE = WM_APP + 31;
+
+std::atomic<int> g_nDeleted{0};
+
+// Counts the executers that deleted themselves.
+class CCountedExecuter : public CExecuter {
+public:
+    using CExecuter::CExecuter;
+    ~CCountedExecuter() override { ++g_nDeleted; }
+};
+
+std::string BinDir()
+{
+    char szPath[MAX_PATH];
+    DWORD n = ::GetModuleFileNameA(NULL, szPath, MAX_PATH);
+    std::string strPath(szPath, n);
+    return strPath.substr(0, strPath.rfind('\\'));
+}
+
+std::string ModuleDir() { return BinDir() + "\\modules"; }
+
+std::string TempFile(const char* pszName)
+{
+    char szDir[MAX_PATH];
+    ::GetTempPathA(MAX_PATH, szDir);
+    std::string strPath = std::string(szDir) + pszName;
+    ::DeleteFileA(strPath.c_str());
+    return strPath;
+}
+
+std::vector<std::string> ReadLines(const std::string& strPath)
+{
+    std::vector<std::string> lines;
+    std::ifstream in(strPath);
+    for (std::string line; std::getline(in, line);)
+        lines.push_back(line);
+    return lines;
+}
+
+std::string Path()
+{
+    const char* psz = getenv("PATH");
+    return psz != NULL ? psz : "";
+}
+
+struct Result {
+    bool bPosted = false;
+    int nCode = 0;
+    long lUser = 0;
+    bool bEnded = false;   // the thread ended and its object is gone
+};
+
+// Runs one job and waits (with a limit) for its message, its thread and the
+// deletion of its object.
+Result RunJob(bool bProcess, const std::vector<std::string>& args, long lUser, CWinThread* pTarget, DWORD ms = 15000)
+{
+    Result r;
+    const int nDeletedBefore = g_nDeleted;
+    CExecuter* pJob = new CCountedExecuter(bProcess, pTarget, WM_JOB_DONE, lUser);
+    CQoArray<CQoString, CQoString&> arrArgs;
+    for (const std::string& s : args)
+        arrArgs.Add(CQoString(s.c_str()));
+    EXPECT_TRUE(pJob->SetArguments(arrArgs));
+    if (!pJob->CreateThread(CREATE_SUSPENDED)) {
+        ADD_FAILURE() << "no thread";
+        return r;
+    }
+    HANDLE hThread = NULL;
+    ::DuplicateHandle(::GetCurrentProcess(), pJob->m_hThread, ::GetCurrentProcess(), &hThread, 0, FALSE,
+                      DUPLICATE_SAME_ACCESS);
+    pJob->ResumeThread(); // the object is the thread's from here on
+    r.bEnded = ::WaitForSingleObject(hThread, ms) == WAIT_OBJECT_0 && g_nDeleted == nDeletedBefore + 1;
+    ::CloseHandle(hThread);
+    // Posted before the thread ended: it is in the queue by now, if at all.
+    MSG msg;
+    if (::PeekMessageA(&msg, (HWND)-1, WM_JOB_DONE, WM_JOB_DONE, PM_REMOVE)) {
+        r.bPosted = true;
+        r.nCode = (int)msg.wParam;
+        r.lUser = (long)msg.lParam;
+    }
+    return r;
+}
+
+TEST(ExecuterTest, LibraryModeCallsQoMainWithTheArgumentsAndPutsTheModuleFolderFirstInPath)
+{
+    const std::string strModule = ModuleDir() + "\\qo_test_module.dll";
+    const std::string strOut = TempFile("qo_exec_args.txt");
+    const struct {
+        const char* pszReturn;
+        int nExpected;
+        long lUser;
+    } cases[] = {{"7", 7, 11}, {"0", 0, -12}, {"-5", -5, 13}};
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.pszReturn);
+        const std::string strPathBefore = Path();
+        Result r = RunJob(false, {strModule, strOut, c.pszReturn, "mit Leerzeichen"}, c.lUser, AfxGetApp());
+        EXPECT_TRUE(r.bEnded);
+        ASSERT_TRUE(r.bPosted);
+        EXPECT_EQ(c.nExpected, r.nCode);
+        EXPECT_EQ(c.lUser, r.lUser);
+        EXPECT_EQ(ModuleDir() + ";" + strPathBefore, Path());
+        const std::vector<std::string> expected = {"4", strModule, strOut, c.pszReturn, "mit Leerzeichen", "(null)"};
+        EXPECT_EQ(expected, ReadLines(strOut));
+    }
+}
+
+TEST(ExecuterTest, FailuresArePostedAsCodes)
+{
+    const std::string strMissing = ModuleDir() + "\\fehlt.dll";
+    const std::string strNoEntry = ModuleDir() + "\\qo_test_nomain.dll";
+    const struct {
+        const char* pszCase;
+        bool bProcess;
+        std::vector<std::string> args;
+        int nExpected;
+    } cases[] = {
+        {"missing module", false, {strMissing}, -1},
+        {"module without QoMain", false, {strNoEntry, "x"}, -2},
+        {"library mode without arguments", false, {}, -1},
+        {"process mode without arguments", true, {}, -2},
+        {"program that does not exist", true, {BinDir() + "\\fehlt.exe"}, -2},
+    };
+    long lUser = 100;
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.pszCase);
+        Result r = RunJob(c.bProcess, c.args, ++lUser, AfxGetApp());
+        EXPECT_TRUE(r.bEnded);
+        ASSERT_TRUE(r.bPosted);
+        EXPECT_EQ(c.nExpected, r.nCode);
+        EXPECT_EQ(lUser, r.lUser);
+    }
+}
+
+TEST(ExecuterTest, ProcessModeQuotesEveryArgumentAndWaitsForTheProgram)
+{
+    const std::string strProgram = BinDir() + "\\qo_test_args.exe";
+    const std::string strOut = TempFile("qo_exec_process.txt");
+    Result r = RunJob(true, {strProgram, strOut, "zwei Worte"}, 21, AfxGetApp());
+    EXPECT_TRUE(r.bEnded);
+    ASSERT_TRUE(r.bPosted);
+    EXPECT_EQ(0, r.nCode); // the program's own exit code (5) is not reported
+    EXPECT_EQ(21, r.lUser);
+    // Written before the program ended, so before the message.
+    const std::vector<std::string> expected = {
+        "\"" + strProgram + "\" \"" + strOut + "\" \"zwei Worte\" ", strOut, "zwei Worte"};
+    EXPECT_EQ(expected, ReadLines(strOut));
+}
+
+TEST(ExecuterTest, WithoutTargetThreadNothingRunsAndNothingIsPosted)
+{
+    const std::string strOut = TempFile("qo_exec_notarget.txt");
+    Result r = RunJob(false, {ModuleDir() + "\\qo_test_module.dll", strOut, "7"}, 5, NULL);
+    EXPECT_TRUE(r.bEnded);
+    EXPECT_FALSE(r.bPosted);
+    EXPECT_EQ(INVALID_FILE_ATTRIBUTES, ::GetFileAttributesA(strOut.c_str())) << "the module ran";
+}
+
+TEST(ExecuterTest, ExceptionOutOfQoMainIsReportedAndLogged)
+{
+    const std::string strLog = TempFile("qo_exec_throw.log");
+    const std::string strModule = ModuleDir() + "\\qo_test_module.dll";
+    _theLog.Open(strLog.c_str());
+    Result r = RunJob(false, {strModule, TempFile("qo_exec_throw.txt"), "throw"}, 9, AfxGetApp());
+    _theLog.Close();
+    EXPECT_TRUE(r.bEnded);
+    ASSERT_TRUE(r.bPosted);
+    EXPECT_EQ(CExecuter::errEntryException, r.nCode);
+    EXPECT_EQ(9, r.lUser);
+    const std::vector<std::string> lines = ReadLines(strLog);
+    ASSERT_EQ(1u, lines.size());
+    EXPECT_NE(std::string::npos, lines[0].find(strModule)) << lines[0];
+    EXPECT_NE(std::string::npos, lines[0].find("Eingabedatei nicht lesbar")) << lines[0];
+    // The module is unloaded again and can be run once more.
+    EXPECT_EQ(NULL, ::GetModuleHandleA(strModule.c_str()));
+    EXPECT_EQ(3, RunJob(false, {strModule, TempFile("qo_exec_again.txt"), "3"}, 0, AfxGetApp()).nCode);
+}
+
+} // namespace

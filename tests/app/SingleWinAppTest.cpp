@@ -1,0 +1,217 @@
+// The single-instance application with real processes: helpers/SingleApp.cpp
+// built as qo_single_a and qo_single_b (two applications). Each helper writes
+// its steps into a log file; what comes to the front is checked from here.
+#include <afxwin.h>
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <fstream>
+#include <functional>
+#include <string>
+#include <vector>
+
+namespace {
+
+std::string BinDir()
+{
+    char szPath[MAX_PATH];
+    DWORD n = ::GetModuleFileNameA(NULL, szPath, MAX_PATH);
+    std::string strPath(szPath, n);
+    return strPath.substr(0, strPath.rfind('\\'));
+}
+
+std::string TempFile(const char* pszName)
+{
+    char szDir[MAX_PATH];
+    ::GetTempPathA(MAX_PATH, szDir);
+    std::string strPath = std::string(szDir) + pszName;
+    ::DeleteFileA(strPath.c_str());
+    return strPath;
+}
+
+// Lets this thread's windows work while waiting for `done`.
+bool WaitUntil(const std::function<bool()>& done, DWORD ms = 10000)
+{
+    const DWORD start = ::GetTickCount();
+    for (;;) {
+        if (done())
+            return true;
+        if (::GetTickCount() - start > ms)
+            return false;
+        MSG msg;
+        while (::PeekMessageA(&msg, NULL, 0, 0, PM_REMOVE)) {
+            ::TranslateMessage(&msg);
+            ::DispatchMessageA(&msg);
+        }
+        ::Sleep(20);
+    }
+}
+
+// One started helper; killed when the test leaves it running.
+struct Instance {
+    HANDLE hProcess = NULL;
+    DWORD dwPid = 0;
+    ~Instance()
+    {
+        if (hProcess == NULL)
+            return;
+        if (::WaitForSingleObject(hProcess, 0) == WAIT_TIMEOUT)
+            ::TerminateProcess(hProcess, 99);
+        ::WaitForSingleObject(hProcess, 5000);
+        ::CloseHandle(hProcess);
+    }
+    // The exit code, or -1 when it has not ended within ms.
+    int Exit(DWORD ms = 10000)
+    {
+        if (::WaitForSingleObject(hProcess, ms) != WAIT_OBJECT_0)
+            return -1;
+        DWORD dwCode = 0;
+        ::GetExitCodeProcess(hProcess, &dwCode);
+        return (int)dwCode;
+    }
+};
+
+void Start(Instance& inst, const char* pszApp, const std::string& strLog, const char* pszMode = "")
+{
+    std::string strLine = "\"" + BinDir() + "\\" + pszApp + ".exe\" \"" + strLog + "\" " + pszMode;
+    STARTUPINFOA si = {};
+    si.cb = sizeof(si);
+    PROCESS_INFORMATION pi = {};
+    ASSERT_TRUE(::CreateProcessA(NULL, &strLine[0], NULL, NULL, FALSE, 0, NULL, NULL, &si, &pi)) << strLine;
+    ::CloseHandle(pi.hThread);
+    inst.hProcess = pi.hProcess;
+    inst.dwPid = pi.dwProcessId;
+}
+
+std::vector<std::string> ReadLines(const std::string& strPath)
+{
+    std::vector<std::string> lines;
+    std::ifstream in(strPath);
+    for (std::string line; std::getline(in, line);)
+        lines.push_back(line);
+    return lines;
+}
+
+int CountLines(const std::string& strLog, DWORD dwPid, const std::string& strStep)
+{
+    int n = 0;
+    std::string strPrefix = std::to_string(dwPid) + " " + strStep;
+    for (const std::string& line : ReadLines(strLog))
+        if (line.compare(0, strPrefix.size(), strPrefix) == 0)
+            ++n;
+    return n;
+}
+
+// The window that the helper named in its line "<pid> <step> <hwnd>".
+HWND WaitForWindow(const std::string& strLog, DWORD dwPid, const char* pszStep)
+{
+    HWND hWnd = NULL;
+    std::string strPrefix = std::to_string(dwPid) + " " + pszStep + " ";
+    WaitUntil([&] {
+        for (const std::string& line : ReadLines(strLog))
+            if (line.compare(0, strPrefix.size(), strPrefix) == 0)
+                hWnd = (HWND)(UINT_PTR)std::stoull(line.substr(strPrefix.size()));
+        return hWnd != NULL && ::IsWindowVisible(hWnd);
+    });
+    return hWnd;
+}
+
+// True when hAbove lies above hBelow in the z-order of the top-level windows.
+bool IsAbove(HWND hAbove, HWND hBelow)
+{
+    for (HWND h = ::GetWindow(hBelow, GW_HWNDPREV); h != NULL; h = ::GetWindow(h, GW_HWNDPREV))
+        if (h == hAbove)
+            return true;
+    return false;
+}
+
+// A window of the test process that holds the foreground before a second start.
+HWND CreateForegroundWindow()
+{
+    HWND hWnd = ::CreateWindowExA(0, "STATIC", "Testfenster", WS_POPUP | WS_VISIBLE | WS_BORDER, 150, 150, 300, 200,
+                                  NULL, NULL, ::GetModuleHandleA(NULL), NULL);
+    ::SetForegroundWindow(hWnd);
+    WaitUntil([&] { return ::GetForegroundWindow() == hWnd; }, 3000);
+    return hWnd;
+}
+
+void CloseInstance(Instance& inst, HWND hMain, HWND hDialog)
+{
+    if (hDialog != NULL)
+        ::PostMessageA(hDialog, WM_COMMAND, IDCANCEL, 0);
+    WaitUntil([&] { return !::IsWindow(hDialog); }, 5000);
+    ::PostMessageA(hMain, WM_CLOSE, 0, 0);
+}
+
+TEST(SingleWinAppTest, SecondStartEndsAndBringsTheFirstInstanceOrItsDialogToTheFront)
+{
+    struct Case {
+        const char* pszMode;
+        bool bDialog;
+    };
+    const Case cases[] = {{"", false}, {"dialog", true}};
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.pszMode);
+        const std::string strLog = TempFile("qo_single_front.log");
+        Instance first;
+        ASSERT_NO_FATAL_FAILURE(Start(first, "qo_single_a", strLog, c.pszMode));
+        HWND hMain = WaitForWindow(strLog, first.dwPid, "ready");
+        ASSERT_NE(nullptr, hMain) << "the first instance shows no window";
+        HWND hDialog = c.bDialog ? WaitForWindow(strLog, first.dwPid, "dialog") : NULL;
+        HWND hExpected = c.bDialog ? hDialog : hMain;
+        ASSERT_NE(nullptr, hExpected);
+
+        HWND hOwn = CreateForegroundWindow();
+        ASSERT_EQ(hOwn, ::GetForegroundWindow());
+        ASSERT_TRUE(IsAbove(hOwn, hExpected));
+
+        Instance second;
+        ASSERT_NO_FATAL_FAILURE(Start(second, "qo_single_a", strLog, c.pszMode));
+        EXPECT_EQ(3, second.Exit()) << "the second instance did not end as one";
+        EXPECT_EQ(0, CountLines(strLog, second.dwPid, "ready"));
+        EXPECT_EQ(1, CountLines(strLog, second.dwPid, "before"));
+
+        EXPECT_TRUE(WaitUntil([&] { return ::GetForegroundWindow() == hExpected; }))
+            << "foreground: " << ::GetForegroundWindow();
+        EXPECT_TRUE(IsAbove(hExpected, hOwn));
+        EXPECT_TRUE(WaitUntil([&] { return CountLines(strLog, first.dwPid, "activated") == 1; }));
+
+        ::DestroyWindow(hOwn);
+        CloseInstance(first, hMain, hDialog);
+        EXPECT_EQ(0, first.Exit());
+    }
+}
+
+TEST(SingleWinAppTest, OtherApplicationsAndStartsAfterTheEndAreFirstInstances)
+{
+    const std::string strLog = TempFile("qo_single_names.log");
+    Instance a, b;
+    ASSERT_NO_FATAL_FAILURE(Start(a, "qo_single_a", strLog));
+    HWND hMainA = WaitForWindow(strLog, a.dwPid, "ready");
+    ASSERT_NE(nullptr, hMainA);
+
+    // Another application name: a first instance of its own, A is not woken.
+    ASSERT_NO_FATAL_FAILURE(Start(b, "qo_single_b", strLog));
+    HWND hMainB = WaitForWindow(strLog, b.dwPid, "ready");
+    ASSERT_NE(nullptr, hMainB);
+    EXPECT_EQ(0, CountLines(strLog, b.dwPid, "before"));
+
+    // A ends: its event goes with it, and the next start of A is a first one.
+    CloseInstance(a, hMainA, NULL);
+    EXPECT_EQ(0, a.Exit());
+    Instance a2;
+    ASSERT_NO_FATAL_FAILURE(Start(a2, "qo_single_a", strLog));
+    HWND hMainA2 = WaitForWindow(strLog, a2.dwPid, "ready");
+    EXPECT_NE(nullptr, hMainA2);
+    EXPECT_EQ(0, CountLines(strLog, a2.dwPid, "before"));
+
+    EXPECT_EQ(0, CountLines(strLog, a.dwPid, "activated"));
+    EXPECT_EQ(0, CountLines(strLog, b.dwPid, "activated"));
+    CloseInstance(a2, hMainA2, NULL);
+    CloseInstance(b, hMainB, NULL);
+    EXPECT_EQ(0, a2.Exit());
+    EXPECT_EQ(0, b.Exit());
+}
+
+} // namespace

@@ -1,0 +1,80 @@
+// Events and the lock helpers over real kernel objects and threads.
+#include "afxmt.h"
+
+#include <gtest/gtest.h>
+
+#include <thread>
+
+namespace {
+
+TEST(SyncTest, NamedEventIsSharedAndTellsThatItExisted)
+{
+    CEvent first(FALSE, FALSE, "QoSyncTest.Event");
+    EXPECT_NE(ERROR_ALREADY_EXISTS, ::GetLastError());
+    CEvent second(FALSE, FALSE, "QoSyncTest.Event");
+    EXPECT_EQ(ERROR_ALREADY_EXISTS, ::GetLastError());
+    EXPECT_NE((HANDLE)first, (HANDLE)second);
+
+    // Auto-reset: one signal releases one wait.
+    ASSERT_TRUE(second.SetEvent());
+    EXPECT_TRUE(first.Lock(0));
+    EXPECT_FALSE(first.Lock(0));
+
+    // Manual reset: stays signalled until reset.
+    CEvent manual(TRUE, TRUE);
+    EXPECT_TRUE(manual.Lock(0));
+    EXPECT_TRUE(manual.Lock(0));
+    manual.ResetEvent();
+    CSingleLock single(&manual);
+    EXPECT_FALSE(single.Lock(10));
+    EXPECT_FALSE(single.IsLocked());
+}
+
+TEST(SyncTest, MultiLockWaitsForAnyOneOrForAll)
+{
+    CEvent a, b;
+    CSyncObject* objects[2] = {&a, &b};
+    CMultiLock lock(objects, 2);
+
+    EXPECT_EQ((DWORD)WAIT_TIMEOUT, lock.Lock(10, FALSE));
+
+    // Signalled by another thread while we wait.
+    std::thread signaller([&] {
+        ::Sleep(50);
+        b.SetEvent();
+    });
+    EXPECT_EQ(WAIT_OBJECT_0 + 1, lock.Lock(INFINITE, FALSE, 0));
+    signaller.join();
+    EXPECT_FALSE(lock.IsLocked(0));
+    EXPECT_TRUE(lock.IsLocked(1));
+    EXPECT_TRUE(lock.Unlock());
+    EXPECT_FALSE(lock.IsLocked(1));
+
+    // Waiting for all: one signalled event is not enough, and the wait takes
+    // none of them.
+    a.SetEvent();
+    EXPECT_EQ((DWORD)WAIT_TIMEOUT, lock.Lock(20, TRUE));
+    b.SetEvent();
+    EXPECT_EQ(WAIT_OBJECT_0, lock.Lock(1000, TRUE));
+    EXPECT_TRUE(lock.IsLocked(0));
+    EXPECT_TRUE(lock.IsLocked(1));
+    EXPECT_FALSE(a.Lock(0)); // both were taken
+    EXPECT_FALSE(b.Lock(0));
+}
+
+TEST(SyncTest, MultiLockWakesForQueueInputWithTheWakeMask)
+{
+    CEvent a;
+    CSyncObject* objects[1] = {&a};
+    CMultiLock lock(objects, 1);
+    MSG msg;
+    ::PeekMessageA(&msg, NULL, 0, 0, PM_NOREMOVE); // this thread's queue
+    ASSERT_TRUE(::PostThreadMessageA(::GetCurrentThreadId(), WM_APP, 0, 0));
+    EXPECT_EQ(WAIT_OBJECT_0 + 1, lock.Lock(1000, FALSE, QS_POSTMESSAGE));
+    EXPECT_FALSE(lock.IsLocked(0));
+    // Without the mask the message does not end the wait.
+    EXPECT_EQ((DWORD)WAIT_TIMEOUT, lock.Lock(20, FALSE, 0));
+    ::PeekMessageA(&msg, NULL, WM_APP, WM_APP, PM_REMOVE);
+}
+
+} // namespace
