@@ -64,3 +64,43 @@ public:
 protected:
   virtual BOOL OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* pResult);
 };
+
+// The up-down control ("spin button"). The 16-bit forms (SetRange, GetRange,
+// SetPos, GetPos) pack their values into one message parameter as the control's
+// first version did; the 32-bit forms reach the whole int range. With
+// UDS_ARROWKEYS the arrow keys move it too; every change asks the parent first
+// through UDN_DELTAPOS (answer nonzero to refuse it).
+class AFX_API CSpinButtonCtrl : public CWnd {
+  DECLARE_DYNAMIC(CSpinButtonCtrl)
+public:
+  CSpinButtonCtrl() {}
+  virtual BOOL Create(DWORD dwStyle, const RECT& rect, CWnd* pParentWnd, UINT nID);
+
+  // Acceleration steps: how far one step moves after how many seconds held.
+  BOOL SetAccel(int nAccel, UDACCEL* pAccel);
+  UINT GetAccel(int nAccel, UDACCEL* pAccel) const;
+  // 10 (decimal) or 16 (hexadecimal) in the buddy; the previous base, 0 if refused.
+  int SetBase(int nBase);
+  UINT GetBase() const;
+  // The window whose text follows the position (UDS_SETBUDDYINT); the previous one.
+  CWnd* SetBuddy(CWnd* pWndBuddy);
+  CWnd* GetBuddy() const;
+
+  // Position, 16 bits: SetPos answers the previous position; GetPos answers the
+  // position in the low word and a nonzero high word when the buddy's text is
+  // not a valid position.
+  int SetPos(int nPos);
+  int GetPos() const;
+  // Position, 32 bits: SetPos32 answers the previous position; GetPos32 puts
+  // the error flag into *lpbError when given.
+  int SetPos32(int nPos);
+  int GetPos32(LPBOOL lpbError = NULL) const;
+
+  // Range, 16 bits: the lower limit in the high word of GetRange(), the upper in
+  // the low word. The lower limit may exceed the upper one (the arrows reverse).
+  void SetRange(short nLower, short nUpper);
+  DWORD GetRange() const;
+  void GetRange(int& lower, int& upper) const;
+  void SetRange32(int nLower, int nUpper);
+  void GetRange32(int& lower, int& upper) const;
+};
