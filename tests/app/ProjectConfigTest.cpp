@@ -1,0 +1,217 @@
+// The project's configuration file: where it lives, what reading and writing
+// report, and that a failed write leaves the stored file as it was.
+#include <gtest/gtest.h>
+
+#include <windows.h>
+
+#include <fstream>
+#include <sstream>
+#include <string>
+
+#include "CProjectConfig.h"
+
+namespace {
+
+// Shows the protected path.
+class CPathProbe : public CProjectConfig {
+public:
+    using CProjectConfig::CProjectConfig;
+    using CProjectConfig::GetConfigFilePath;
+};
+
+std::string ReadFile(const std::string& path)
+{
+    std::ifstream in(path, std::ios::binary);
+    std::ostringstream text;
+    text << in.rdbuf();
+    return text.str();
+}
+
+// A projects directory of its own for every test, removed afterwards.
+class ProjectFolder : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        char temp[MAX_PATH];
+        GetTempPathA(MAX_PATH, temp);
+        m_dir = std::string(temp) + "qo_projects_" + std::to_string(GetCurrentProcessId());
+        CreateDirectoryA(m_dir.c_str(), nullptr);
+        CreateDirectoryA((m_dir + "\\Kunden").c_str(), nullptr);
+    }
+    void TearDown() override
+    {
+        std::string folder = m_dir + "\\Kunden";
+        WIN32_FIND_DATAA found;
+        HANDLE h = FindFirstFileA((folder + "\\*").c_str(), &found);
+        if (h != INVALID_HANDLE_VALUE) {
+            do {
+                std::string file = folder + "\\" + found.cFileName;
+                SetFileAttributesA(file.c_str(), FILE_ATTRIBUTE_NORMAL);
+                DeleteFileA(file.c_str());
+            } while (FindNextFileA(h, &found));
+            FindClose(h);
+        }
+        RemoveDirectoryA(folder.c_str());
+        RemoveDirectoryA(m_dir.c_str());
+    }
+    // The names in the project folder.
+    std::string Listing() const
+    {
+        std::string names;
+        WIN32_FIND_DATAA found;
+        HANDLE h = FindFirstFileA((m_dir + "\\Kunden\\*").c_str(), &found);
+        if (h == INVALID_HANDLE_VALUE) return names;
+        do {
+            std::string name = found.cFileName;
+            if (name != "." && name != "..") names += name + ";";
+        } while (FindNextFileA(h, &found));
+        FindClose(h);
+        return names;
+    }
+    std::string m_dir;
+};
+
+}  // namespace
+
+TEST(ProjectConfig, FilePathFromDirectoryNameAndFile)
+{
+    struct Case {
+        const char* dir;
+        const char* name;
+        const char* file;
+        const char* path;
+    } const cases[] = {
+        {"C:\\Projekte", "Kunden", "projekt.cfg", "C:\\Projekte\\Kunden\\projekt.cfg"},
+        {"C:\\Projekte\\", "Kunden", "projekt.cfg", "C:\\Projekte\\Kunden\\projekt.cfg"},
+        {"C:\\Projekte", "", "projekt.cfg", "C:\\Projekte\\projekt.cfg"},
+        {"C:\\Projekte", "Kunden\\", "projekt.cfg", "C:\\Projekte\\Kunden\\projekt.cfg"},
+        {"", "Kunden", "projekt.cfg", ""},  // no directory: no place to guess
+    };
+    for (const Case& c : cases) {
+        CPathProbe project(c.dir, c.name, c.file);
+        EXPECT_STREQ(c.path, (const char*)project.GetConfigFilePath()) << c.dir << "|" << c.name;
+    }
+
+    // Changed names take effect at once.
+    CPathProbe project("D:\\alt", "Kunden", "projekt.cfg");
+    project.SetDirectory("E:\\neu");
+    project.SetName("Lieferanten");
+    EXPECT_STREQ("E:\\neu\\Lieferanten\\projekt.cfg", (const char*)project.GetConfigFilePath());
+    EXPECT_STREQ("Lieferanten", (const char*)project.GetName());
+    EXPECT_STREQ("E:\\neu", (const char*)project.GetDirectory());
+}
+
+TEST(ProjectConfig, MissingKeysEmptyTextsAndKeepNumbers)
+{
+    CProjectConfig project("C:\\Projekte", "Kunden", "projekt.cfg");
+    project.SetValue("Eingabe", "Datei", "kunden.txt");
+    project.SetValue("Eingabe", "Zeilen", 12);
+
+    CString text = "vorher";
+    int number = 7;
+    project.GetValue("Eingabe", "fehlt", text);
+    project.GetValue("Eingabe", "fehlt", number);
+    EXPECT_STREQ("", (const char*)text);
+    EXPECT_EQ(7, number);
+
+    project.GetValue("Eingabe", "Datei", text);
+    project.GetValue("Eingabe", "Zeilen", number);
+    EXPECT_STREQ("kunden.txt", (const char*)text);
+    EXPECT_EQ(12, number);
+
+    project.DeleteKey("Eingabe", "Datei");
+    project.GetValue("Eingabe", "Datei", text);
+    EXPECT_STREQ("", (const char*)text);
+    project.DeleteSection("Eingabe");
+    EXPECT_FALSE(project.ConfigFile().HasSection("Eingabe"));
+}
+
+TEST(ProjectConfig, CopiesAreIndependentAndCopySectionTakesTheOthersKeys)
+{
+    CProjectConfig original("C:\\Projekte", "Kunden", "projekt.cfg");
+    original.SetValue("Ausgabe", "Format", "fest");
+    original.SetValue("Eingabe", "Datei", "a.txt");
+
+    CProjectConfig copy(original);
+    copy.SetValue("Ausgabe", "Format", "csv");
+    copy.DeleteSection("Eingabe");
+
+    CString text;
+    original.GetValue("Ausgabe", "Format", text);
+    EXPECT_STREQ("fest", (const char*)text);
+    original.GetValue("Eingabe", "Datei", text);
+    EXPECT_STREQ("a.txt", (const char*)text);
+
+    // From the copy into the original: the section's keys are the copy's.
+    original.CopySection(&copy, "Ausgabe");
+    original.GetValue("Ausgabe", "Format", text);
+    EXPECT_STREQ("csv", (const char*)text);
+    original.CopySection(nullptr, "Ausgabe");
+    original.GetValue("Ausgabe", "Format", text);
+    EXPECT_STREQ("csv", (const char*)text);
+}
+
+TEST_F(ProjectFolder, WrittenFileIsReadBackByAnotherProject)
+{
+    CProjectConfig project(m_dir.c_str(), "Kunden", "projekt.cfg");
+    project.SetValue("Eingabe", "Datei", "K\xFCnden ; \xE4\xF6\xFC.txt");
+    project.SetValue("Eingabe", "Zeilen", -3);
+    ASSERT_TRUE(project.WriteConfigFile());
+    EXPECT_EQ("projekt.cfg;", Listing());  // no temporary file left
+
+    CProjectConfig reader((m_dir + "\\").c_str(), "Kunden", "projekt.cfg");
+    reader.SetValue("Alt", "weg", 1);
+    ASSERT_TRUE(reader.ReadConfigFile());
+    CString text;
+    int number = 0;
+    reader.GetValue("Eingabe", "Datei", text);
+    reader.GetValue("Eingabe", "Zeilen", number);
+    EXPECT_STREQ("K\xFCnden ; \xE4\xF6\xFC.txt", (const char*)text);
+    EXPECT_EQ(-3, number);
+    EXPECT_FALSE(reader.ConfigFile().HasSection("Alt"));
+
+    // A project whose file does not exist yet reads as empty.
+    CProjectConfig fresh(m_dir.c_str(), "Kunden", "neu.cfg");
+    fresh.SetValue("Alt", "weg", 1);
+    EXPECT_TRUE(fresh.ReadConfigFile());
+    EXPECT_FALSE(fresh.ConfigFile().HasSection("Alt"));
+}
+
+TEST_F(ProjectFolder, WritesThatCannotBeDoneAnswerFalse)
+{
+    // No project folder, no projects directory: nothing is created.
+    CProjectConfig missing(m_dir.c_str(), "Lieferanten", "projekt.cfg");
+    missing.SetValue("Eingabe", "Datei", "a.txt");
+    EXPECT_FALSE(missing.WriteConfigFile());
+    EXPECT_EQ(INVALID_FILE_ATTRIBUTES, GetFileAttributesA((m_dir + "\\Lieferanten").c_str()));
+
+    CProjectConfig noDirectory("", "Kunden", "projekt.cfg");
+    noDirectory.SetValue("Eingabe", "Datei", "a.txt");
+    EXPECT_FALSE(noDirectory.WriteConfigFile());
+    EXPECT_FALSE(noDirectory.ReadConfigFile());
+}
+
+TEST_F(ProjectFolder, FailedReplaceLeavesTheStoredFileWhole)
+{
+    CProjectConfig project(m_dir.c_str(), "Kunden", "projekt.cfg");
+    project.SetValue("Eingabe", "Datei", "alt.txt");
+    ASSERT_TRUE(project.WriteConfigFile());
+    std::string path = m_dir + "\\Kunden\\projekt.cfg";
+    std::string before = ReadFile(path);
+    ASSERT_NE(std::string::npos, before.find("alt.txt"));
+
+    project.SetValue("Eingabe", "Datei", "neu.txt");
+    {
+        // Another program holds the file open without sharing it.
+        HANDLE hLock = CreateFileA(path.c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr);
+        ASSERT_NE(INVALID_HANDLE_VALUE, hLock);
+        EXPECT_FALSE(project.WriteConfigFile());
+        CloseHandle(hLock);
+    }
+    EXPECT_EQ(before, ReadFile(path));
+    EXPECT_EQ("projekt.cfg;", Listing());
+
+    // Once the file is free again, the write goes through.
+    EXPECT_TRUE(project.WriteConfigFile());
+    EXPECT_NE(std::string::npos, ReadFile(path).find("neu.txt"));
+}
