@@ -135,3 +135,11 @@
 #define IDC_OPEN_OTHER              1011
 #define IDC_OPEN_PROGRAM            1145
 #define IDC_OPEN_BROWSE             1146
+
+// Record repair dialogs: repair (4043) and one-line correction (4044)
+#define IDD_REPAIR_RECORD           4043
+#define IDD_CORRECT_REPAIR          4044
+#define IDC_REPAIR_CORRECTION       4120
+#define IDC_REPAIR_DATA             4121
+#define IDC_REPAIR_IGNORE           4124
+#define IDC_REPAIR_SPIN             4160

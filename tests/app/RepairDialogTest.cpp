@@ -1,0 +1,252 @@
+// Repairing defective records: a delimited file read through the real text
+// filter with the repair dialog installed, the dialogs answered as a user
+// would (typing, clicking the spin arrows, arrow keys, buttons).
+#include <gtest/gtest.h>
+
+#include <windows.h>
+
+#include <fstream>
+#include <string>
+#include <vector>
+
+#include "CQoException.h"
+#include "CQoInputFilterTextVar.h"
+#include "CQoInterActive.h"
+#include "CRepairRecordDlg.h"
+#include "Capture.h"
+#include "DialogDriver.h"
+#include "Input.h"
+#include "resource.h"
+
+namespace {
+
+using qotest::Dialog;
+using qotest::DialogScript;
+
+const char kHead[] = "Name;Ort;PLZ\r\nMeier;Bonn;53111\r\n";
+const char kTail[] = "Schulz;Essen;45127\r\nWolf;Ulm;89073\r\n";
+
+std::string Text(UINT id)
+{
+    CString text;
+    text.LoadString(id);
+    return (const char*)text;
+}
+
+// One step of the spin control with a real click on its upper or lower arrow.
+void ClickSpin(Dialog& d, bool up)
+{
+    HWND spin = d.Item(IDC_REPAIR_SPIN);
+    RECT rc;
+    GetClientRect(spin, &rc);
+    qotest::Click(spin, rc.right / 2, up ? 2 : rc.bottom - 3);
+}
+
+// Presses a button whose refusal opens a message box, answered by the next
+// queued script; returns when the box is gone.
+void PressRefused(Dialog& d, int id)
+{
+    d.Press(id);
+    qotest::PumpFor(600);
+}
+
+DialogScript ExpectMessage(UINT id)
+{
+    return [id](Dialog& box) {
+        EXPECT_EQ(Text(id), box.MessageText());
+        box.Press(IDOK);
+    };
+}
+
+struct Outcome {
+    std::vector<std::string> rows;
+    std::string stop;   // the message that ended reading, if any
+};
+
+class RepairTest : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        char temp[MAX_PATH];
+        GetTempPathA(MAX_PATH, temp);
+        m_path = std::string(temp) + "qo_repair_" + std::to_string(GetCurrentProcessId()) + ".csv";
+        CQoInterActive::SetRepairRecord(CRepairRecordDlgDoIt);
+    }
+    void TearDown() override
+    {
+        CQoInterActive::SetRepairRecord(nullptr);
+        CQoInterActive::SetCorrectRepair(nullptr);
+        DeleteFileA(m_path.c_str());
+    }
+
+    // Reads every row of `content` with the dialogs answered by `scripts`.
+    Outcome Read(const std::string& content, std::vector<DialogScript> scripts)
+    {
+        std::ofstream(m_path, std::ios::binary) << content;
+        Outcome out;
+        qotest::DialogDriver driver;
+        for (auto& s : scripts) driver.Expect(std::move(s));
+        try {
+            CQoInputFilterTextVar filter;
+            filter.SetFirstRowHasNames(true);
+            filter.Init(m_path.c_str());
+            for (bool ok = filter.FirstRow(); ok; ok = filter.NextRow()) {
+                std::string row;
+                for (int c = 0; c < filter.NumCols(); ++c) {
+                    CQoString value;
+                    filter.Value(c, value);
+                    row += (c ? "|" : "") + std::string(value.GetString());
+                }
+                out.rows.push_back(row);
+            }
+        } catch (CQoException const& e) {
+            out.stop = e.Message();
+        }
+        EXPECT_TRUE(driver.Done());
+        EXPECT_EQ(0, driver.Unanswered());
+        return out;
+    }
+
+    std::string m_path;
+};
+
+const std::vector<std::string> kAllRows = {"Meier|Bonn|53111", "Huber|K\xF6ln|50667", "Schulz|Essen|45127",
+                                           "Wolf|Ulm|89073"};
+
+}  // namespace
+
+TEST_F(RepairTest, EachAnswerOfTheUserReachesTheFilter)
+{
+    const std::string file = std::string(kHead) + "Huber;K\xF6ln;50667;X\r\n" + kTail;
+    auto typeAndTakeOver = [](const char* record) {
+        return [record](Dialog& d) {
+            EXPECT_EQ("Daten korrigieren...", d.Title());
+            EXPECT_EQ("Huber;K\xF6ln;50667;X\r\n", d.Text(IDC_REPAIR_CORRECTION));
+            EXPECT_EQ(kTail, d.Text(IDC_REPAIR_DATA));
+            d.SetText(IDC_REPAIR_CORRECTION, record);
+            d.Press(IDOK);
+        };
+    };
+    auto press = [](int id) { return [id](Dialog& d) { d.Press(id); }; };
+    auto correct = [](int id, const char* record) {
+        return [id, record](Dialog& d) {
+            EXPECT_EQ("Eingabe korrigieren", d.Title());
+            EXPECT_EQ("Huber;K\xF6ln;50667;X;Y", d.Text(IDC_REPAIR_CORRECTION));
+            d.SetText(IDC_REPAIR_CORRECTION, record);
+            if (id == IDOK)
+                qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("correct-repair-4044.png").c_str());
+            d.Press(id);
+        };
+    };
+    const std::vector<std::string> withoutHuber = {"Meier|Bonn|53111", "Schulz|Essen|45127", "Wolf|Ulm|89073"};
+    struct Case {
+        const char* what;
+        std::vector<DialogScript> scripts;
+        std::vector<std::string> rows;
+        bool stopped;
+    } cases[] = {
+        {"corrected", {typeAndTakeOver("Huber;K\xF6ln;50667")}, kAllRows, false},
+        {"skipped", {press(IDC_REPAIR_IGNORE)}, withoutHuber, false},
+        {"stopped", {press(IDCANCEL)}, {"Meier|Bonn|53111"}, true},
+        {"corrected twice",
+         {typeAndTakeOver("Huber;K\xF6ln;50667;X;Y"), correct(IDOK, "Huber;K\xF6ln;50667")},
+         kAllRows,
+         false},
+        {"second correction given up",
+         {typeAndTakeOver("Huber;K\xF6ln;50667;X;Y"), correct(IDCANCEL, "egal")},
+         {"Meier|Bonn|53111"},
+         true},
+    };
+    for (Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        Outcome out = Read(file, std::move(c.scripts));
+        EXPECT_EQ(c.rows, out.rows);
+        EXPECT_EQ(c.stopped, !out.stop.empty()) << out.stop;
+    }
+}
+
+TEST_F(RepairTest, SpinMovesARecordThatRunsOverTwoLinesIntoTheCorrection)
+{
+    // An encloser left open swallows the rest of the file; the presumed next
+    // record starts one line too early.
+    const std::string file = std::string(kHead) + "Huber;\"K\xF6\r\nln;50667\r\n" + kTail;
+    Outcome out = Read(file, {[](Dialog& d) {
+        EXPECT_EQ("Huber;\"K\xF6\r\n", d.Text(IDC_REPAIR_CORRECTION));
+        // Two steps too far with the mouse, back with the arrow keys.
+        for (int i = 0; i < 12; ++i) ClickSpin(d, true);
+        EXPECT_EQ("Huber;\"K\xF6\r\nln;50667\r\nSc", d.Text(IDC_REPAIR_CORRECTION));
+        qotest::Focus(d.Item(IDC_REPAIR_SPIN));
+        qotest::KeyPress(VK_DOWN);
+        qotest::KeyPress(VK_DOWN);
+        EXPECT_EQ("Huber;\"K\xF6\r\nln;50667\r\n", d.Text(IDC_REPAIR_CORRECTION));
+        EXPECT_EQ(kTail, d.Text(IDC_REPAIR_DATA));
+        qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("repair-4043.png").c_str());
+        d.SetText(IDC_REPAIR_CORRECTION, "Huber;K\xF6ln;50667");
+        d.Press(IDOK);
+    }});
+    EXPECT_EQ(kAllRows, out.rows);
+    EXPECT_EQ("", out.stop);
+}
+
+TEST_F(RepairTest, SplitAtTheStartRefusesBothWaysOutUntilMoved)
+{
+    CQoString data("abc;def\r\nghi;jkl\r\n");
+    int pos = 0;
+    qotest::DialogDriver driver;
+    driver.Expect([](Dialog& d) {
+        EXPECT_EQ("", d.Text(IDC_REPAIR_CORRECTION));
+        EXPECT_EQ("abc;def\r\nghi;jkl\r\n", d.Text(IDC_REPAIR_DATA));
+        ClickSpin(d, false);  // below 0: stays there
+        EXPECT_EQ("", d.Text(IDC_REPAIR_CORRECTION));
+        PressRefused(d, IDOK);
+        PressRefused(d, IDC_REPAIR_IGNORE);
+        d.Cancel();
+    });
+    driver.Expect(ExpectMessage(IDS_REPAIR_SET_SPLIT));
+    driver.Expect(ExpectMessage(IDS_REPAIR_SET_SPLIT));
+    EXPECT_EQ(0, CRepairRecordDlgDoIt("kunden.csv", data, pos));
+    EXPECT_EQ(0, pos);
+    EXPECT_STREQ("abc;def\r\nghi;jkl\r\n", data.GetString());
+    EXPECT_TRUE(driver.Done());
+    EXPECT_EQ(0, driver.Unanswered());
+}
+
+TEST_F(RepairTest, UnchangedRecordIsRefusedButMayBeSkipped)
+{
+    CQoString data("abc;def;xyz");
+    int pos = data.GetLength();
+    qotest::DialogDriver driver;
+    driver.Expect([](Dialog& d) {
+        EXPECT_EQ("abc;def;xyz", d.Text(IDC_REPAIR_CORRECTION));
+        EXPECT_EQ("", d.Text(IDC_REPAIR_DATA));
+        ClickSpin(d, true);  // beyond the end: stays there
+        PressRefused(d, IDOK);
+        d.SetText(IDC_REPAIR_CORRECTION, "abc;def;xyz  \r\n");  // trailing blanks and breaks only
+        PressRefused(d, IDOK);
+        d.Press(IDC_REPAIR_IGNORE);
+    });
+    driver.Expect(ExpectMessage(IDS_REPAIR_UNCHANGED));
+    driver.Expect(ExpectMessage(IDS_REPAIR_UNCHANGED));
+    EXPECT_EQ(2, CRepairRecordDlgDoIt("kunden.csv", data, pos));
+    EXPECT_EQ(11, pos);
+    EXPECT_STREQ("abc;def;xyz  \r\n", data.GetString());
+    EXPECT_TRUE(driver.Done());
+    EXPECT_EQ(0, driver.Unanswered());
+}
+
+TEST_F(RepairTest, SplitReachesDataLongerThanSixteenBits)
+{
+    CQoString data(std::string(40000, 'a'));
+    int pos = 39990;
+    qotest::DialogDriver driver;
+    driver.Expect([](Dialog& d) {
+        EXPECT_EQ(39990u, d.Text(IDC_REPAIR_CORRECTION).size());
+        ClickSpin(d, false);
+        EXPECT_EQ(39989u, d.Text(IDC_REPAIR_CORRECTION).size());
+        EXPECT_EQ(11u, d.Text(IDC_REPAIR_DATA).size());
+        d.Press(IDC_REPAIR_IGNORE);
+    });
+    EXPECT_EQ(2, CRepairRecordDlgDoIt("gross.txt", data, pos));
+    EXPECT_EQ(39989, pos);
+    EXPECT_EQ(39989, data.GetLength());
+}
