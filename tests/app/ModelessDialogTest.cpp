@@ -10,6 +10,7 @@
 #include "CModelessDialog.h"
 #include "DialogDriver.h"
 #include "Input.h"
+#include "MfcTestHost.h"
 
 namespace {
 
@@ -52,53 +53,16 @@ protected:
     }
 };
 
-// The application's message loop in small: PreTranslateMessage first.
-void PumpApp(DWORD ms)
-{
-    const DWORD start = GetTickCount();
-    for (;;) {
-        MSG msg;
-        while (PeekMessageA(&msg, NULL, 0, 0, PM_REMOVE)) {
-            if (msg.message == WM_QUIT) {
-                PostQuitMessage(static_cast<int>(msg.wParam));
-                return;
-            }
-            if (!AfxPreTranslateMessage(&msg)) {
-                TranslateMessage(&msg);
-                DispatchMessageA(&msg);
-            }
-        }
-        const DWORD elapsed = GetTickCount() - start;
-        if (elapsed >= ms) return;
-        MsgWaitForMultipleObjects(0, NULL, FALSE, ms - elapsed, QS_ALLINPUT);
-    }
-}
-
-void Press(WORD vk, bool ctrl = false)
-{
-    if (ctrl) qotest::InjectKey(VK_CONTROL, true);
-    qotest::InjectKey(vk, true);
-    qotest::InjectKey(vk, false);
-    if (ctrl) qotest::InjectKey(VK_CONTROL, false);
-    PumpApp(250);
-}
-
-std::string Text(HWND hwnd)
-{
-    char buf[256] = "";
-    GetWindowTextA(hwnd, buf, sizeof(buf));
-    return buf;
-}
+using qotest::PressKey;
+using qotest::PumpApp;
+using qotest::WindowText;
 
 class ModelessDialogTest : public ::testing::Test {
 protected:
     void SetUp() override
     {
         m_pFrame = new CTestFrame;
-        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW),
-                                                              (HBRUSH)(COLOR_WINDOW + 1)),
-                                       "Hauptfenster", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 40, 40, 480, 300,
-                                       NULL, NULL));
+        ASSERT_TRUE(qotest::CreateHostFrame(m_pFrame, "Hauptfenster", 480, 300, COLOR_WINDOW));
         ACCEL keys[] = {{FVIRTKEY | FCONTROL, 'K', (WORD)ID_CMD_CTRL_K}, {FVIRTKEY, VK_F5, (WORD)ID_CMD_F5}};
         m_hAccel = CreateAcceleratorTableA(keys, 2);
         m_pFrame->m_hAccelTable = m_hAccel;
@@ -123,9 +87,8 @@ protected:
             delete m_pPage;
         }
         AfxGetApp()->m_pMainWnd = NULL;  // else its end would end the program's loop
-        if (m_pFrame != NULL && ::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();  // deletes it
+        qotest::DestroyHostFrame(m_pFrame);
         if (m_hAccel != NULL) DestroyAcceleratorTable(m_hAccel);
-        qotest::PumpFor(50);
     }
 
     CTestFrame* m_pFrame = nullptr;
@@ -136,20 +99,20 @@ protected:
 
 TEST_F(ModelessDialogTest, FrameShortcutsRunTheFramesCommandAndTheEditDoesNotSeeThem)
 {
-    Press('K', true);
+    PressKey('K', true);
     EXPECT_EQ(1, m_pFrame->m_nCtrlK);
-    Press(VK_F5);
+    PressKey(VK_F5);
     EXPECT_EQ(1, m_pFrame->m_nF5);
-    EXPECT_EQ("", Text(m_hFirst));
+    EXPECT_EQ("", WindowText(m_hFirst));
     EXPECT_EQ(m_hFirst, GetFocus());
 
     // Keys that are no shortcut are the page's as in any dialog.
-    Press('A');
-    EXPECT_EQ("a", Text(m_hFirst));
-    Press(VK_TAB);
+    PressKey('A');
+    EXPECT_EQ("a", WindowText(m_hFirst));
+    PressKey(VK_TAB);
     EXPECT_EQ(m_hSecond, GetFocus());
-    Press('B');
-    EXPECT_EQ("b", Text(m_hSecond));
+    PressKey('B');
+    EXPECT_EQ("b", WindowText(m_hSecond));
     EXPECT_EQ(1, m_pFrame->m_nCtrlK);
     EXPECT_EQ(1, m_pFrame->m_nF5);
 }
@@ -166,12 +129,12 @@ TEST_F(ModelessDialogTest, WithoutAFrameAsMainWindowTheKeysStayWithThePage)
         if (pMain == m_pFrame) m_pFrame->m_hAccelTable = NULL;
         ::SetWindowTextA(m_hFirst, "");
         qotest::Focus(m_hFirst);
-        Press('K', true);  // Ctrl+K in an edit types nothing either
-        Press(VK_F5);
-        Press('C');
+        PressKey('K', true);  // Ctrl+K in an edit types nothing either
+        PressKey(VK_F5);
+        PressKey('C');
         EXPECT_EQ(0, m_pFrame->m_nCtrlK);
         EXPECT_EQ(0, m_pFrame->m_nF5);
-        EXPECT_EQ("c", Text(m_hFirst));
+        EXPECT_EQ("c", WindowText(m_hFirst));
     }
     AfxGetApp()->m_pMainWnd = m_pFrame;
     plain.DestroyWindow();
@@ -179,10 +142,10 @@ TEST_F(ModelessDialogTest, WithoutAFrameAsMainWindowTheKeysStayWithThePage)
 
 TEST_F(ModelessDialogTest, EnterAndEscapeReachThePageAndLeaveItOpen)
 {
-    Press('X');
-    Press(VK_RETURN);
+    PressKey('X');
+    PressKey(VK_RETURN);
     EXPECT_EQ(1, m_pPage->m_nOk);
-    Press(VK_ESCAPE);
+    PressKey(VK_ESCAPE);
     EXPECT_EQ(1, m_pPage->m_nCancel);
     // The user closing the page's window (no caption: only by message) is Cancel too.
     m_pPage->SendMessage(WM_CLOSE);
@@ -191,7 +154,7 @@ TEST_F(ModelessDialogTest, EnterAndEscapeReachThePageAndLeaveItOpen)
 
     EXPECT_TRUE(::IsWindow(m_pPage->m_hWnd));
     EXPECT_TRUE(m_pPage->IsWindowVisible());
-    EXPECT_EQ("x", Text(m_hFirst));
+    EXPECT_EQ("x", WindowText(m_hFirst));
     EXPECT_EQ(0, m_pFrame->m_nCtrlK + m_pFrame->m_nF5);
 }
 

@@ -11,6 +11,7 @@
 #include "Capture.h"
 #include "DialogDriver.h"
 #include "Input.h"
+#include "MfcTestHost.h"
 
 namespace {
 
@@ -57,9 +58,7 @@ protected:
     void SetUp() override
     {
         m_pFrame = new CFrameWnd;
-        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW),
-                                                              (HBRUSH)(COLOR_WINDOW + 1)),
-                                       "Liste", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 30, 30, 640, 360, NULL, NULL));
+        ASSERT_TRUE(qotest::CreateHostFrame(m_pFrame, "Liste", 640, 360, COLOR_WINDOW));
         ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | WS_BORDER | LVS_REPORT | LVS_OWNERDRAWFIXED |
                                       LVS_OWNERDATA | LVS_SHOWSELALWAYS,
                                   CRect(5, 5, 605, 305), m_pFrame, 100));
@@ -76,8 +75,7 @@ protected:
     void TearDown() override
     {
         m_list.RemoveListener(&m_listener);
-        if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();  // deletes it
-        qotest::PumpFor(50);
+        qotest::DestroyHostFrame(m_pFrame);
     }
 
     void Repaint()

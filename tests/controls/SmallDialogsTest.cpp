@@ -2,11 +2,7 @@
 // what they hand back, and the log lines of the hint.
 #include <gtest/gtest.h>
 
-#include <afxwin.h>
-
-#include <cstdio>
 #include <fstream>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -17,31 +13,12 @@
 #include "CQoLog.h"
 #include "CStaticFilespec.h"
 #include "CStaticLink.h"
-#include "Capture.h"
-#include "DialogDriver.h"
-#include "Input.h"
+#include "MfcTestHost.h"
 #include "resource.h"
 
+using qotest::Answering;
+
 namespace {
-
-// Runs the scripts, one per dialog in order, on the dialogs that `open` shows
-// and checks that each was answered.
-template <class Open>
-void Drive(std::vector<qotest::DialogScript> scripts, Open open)
-{
-    qotest::DialogDriver driver;
-    for (auto& s : scripts) driver.Expect(std::move(s));
-    open();
-    EXPECT_TRUE(driver.Done());
-    EXPECT_EQ(0, driver.Unanswered());
-}
-
-std::string TempPath(const char* name)
-{
-    char dir[MAX_PATH];
-    GetTempPathA(MAX_PATH, dir);
-    return std::string(dir) + name;
-}
 
 // A program that exists on every system and ends at once, whatever it is given.
 std::string HarmlessProgram()
@@ -51,12 +28,40 @@ std::string HarmlessProgram()
     return std::string(dir) + "\\hostname.exe";
 }
 
-// _theLog writes into a fresh file; Entries() are its lines without the time.
-class LoggedTest : public ::testing::Test {
+// Presses a button of a dialog without looking at it.
+qotest::DialogScript Pressing(int id)
+{
+    return [id](qotest::Dialog& d) { d.Press(id); };
+}
+
+}  // namespace
+
+TEST(InfoView, EveryKindOfLineEndIsOneBreak)
+{
+    CQoInfoView view;
+    view.Append("Eingabedatei: C:\\daten\\kunden.txt\nS\xE4tze: 1204");
+    view.Append("\r\nFehlerhafte S\xE4tze: 3\r\n");
+    view.Append("Satz 17: Feld 4 zu lang\nSatz 90: Feld 2 fehlt\n");
+    Answering({[&](qotest::Dialog& d) {
+                  EXPECT_EQ("Information", d.Title());
+                  EXPECT_EQ("Eingabedatei: C:\\daten\\kunden.txt\r\nS\xE4tze: 1204\r\nFehlerhafte S\xE4tze: 3\r\n"
+                            "Satz 17: Feld 4 zu lang\r\nSatz 90: Feld 2 fehlt\r\n",
+                            d.Text(IDC_INFO_TEXT));
+                  EXPECT_EQ(6, d.Send(IDC_INFO_TEXT, EM_GETLINECOUNT));  // and the empty one after the last break
+                  EXPECT_FALSE(d.IsVisible(IDCANCEL));
+                  qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("info-4008.png").c_str());
+                  d.Press(IDOK);
+              }},
+              [&] { EXPECT_EQ(IDOK, view.DoModal()); });
+}
+
+// ---------------------------------------------------------------------------
+// Hint: _theLog writes into a fresh file; Entries() are its lines without the time.
+
+class HintTest : public ::testing::Test {
 protected:
     void SetUp() override
     {
-        m_log = TempPath("qo_smalldialogs.log");
         DeleteFileA(m_log.c_str());
         _theLog.Open(m_log.c_str());
         CQoHint::Reset();
@@ -71,85 +76,39 @@ protected:
     {
         std::vector<std::string> out;
         std::ifstream in(m_log, std::ios::binary);
-        std::string line;
-        while (std::getline(in, line)) {
+        for (std::string line; std::getline(in, line);) {
             if (!line.empty() && line.back() == '\r') line.pop_back();
-            size_t sep = line.find(" > ");
+            const size_t sep = line.find(" > ");
             out.push_back(sep == std::string::npos ? line : line.substr(sep + 3));
         }
         return out;
     }
-    std::string m_log;
+    const std::string m_log = qotest::TempPath("qo_smalldialogs.log");
 };
-
-}  // namespace
-
-TEST(InfoView, EveryKindOfLineEndIsOneBreak)
-{
-    CQoInfoView view;
-    view.Append("Eingabedatei: C:\\daten\\kunden.txt\nS\xE4tze: 1204");
-    view.Append("\r\nFehlerhafte S\xE4tze: 3\r\n");
-    view.Append("Satz 17: Feld 4 zu lang\nSatz 90: Feld 2 fehlt\n");
-
-    std::string text, title;
-    int lines = 0;
-    bool cancelVisible = true;
-    Drive({[&](qotest::Dialog& d) {
-              title = d.Title();
-              text = d.Text(IDC_INFO_TEXT);
-              lines = (int)d.Send(IDC_INFO_TEXT, EM_GETLINECOUNT);
-              cancelVisible = d.IsVisible(IDCANCEL);
-              qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("info-4008.png").c_str());
-              d.Press(IDOK);
-          }},
-          [&] { EXPECT_EQ(IDOK, view.DoModal()); });
-
-    EXPECT_EQ("Information", title);
-    EXPECT_EQ("Eingabedatei: C:\\daten\\kunden.txt\r\nS\xE4tze: 1204\r\nFehlerhafte S\xE4tze: 3\r\n"
-              "Satz 17: Feld 4 zu lang\r\nSatz 90: Feld 2 fehlt\r\n",
-              text);
-    EXPECT_EQ(6, lines);  // five lines and the empty one after the last break
-    EXPECT_FALSE(cancelVisible);
-}
-
-// ---------------------------------------------------------------------------
-// Hint
-
-using HintTest = LoggedTest;
 
 TEST_F(HintTest, SwitchedOffHintIsOnlyLoggedUntilReset)
 {
     const unsigned id = IDS_PREVIEW_DOS_HINT;  // a text with line breaks
     CString text;
     text.LoadString(id);
-    ASSERT_EQ(std::string::npos, std::string((const char*)text).find('\r'));
     std::string shown, logged;
     for (char c : std::string((const char*)text)) {
         shown += c == '\n' ? std::string("\r\n") : std::string(1, c);
         logged += c == '\n' ? ';' : c;
     }
+    ASSERT_NE(shown.size(), logged.size());
 
-    std::string title, edit;
-    bool enabled = false, checked = true;
-    Drive({[&](qotest::Dialog& d) {
-              title = d.Title();
-              edit = d.Text(IDC_HINT_TEXT);
-              enabled = d.IsEnabled(IDC_HINT_DONT_SHOW);
-              checked = d.IsChecked(IDC_HINT_DONT_SHOW);
-              d.Check(IDC_HINT_DONT_SHOW);
-              qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("hint-4034.png").c_str());
-              d.Press(IDOK);
-          }},
-          [&] { CQoHint::ShowHint(id, true); });
-    EXPECT_EQ("Hinweis", title);
-    EXPECT_EQ(shown, edit);
-    EXPECT_TRUE(enabled);
-    EXPECT_FALSE(checked);
-
-    // Switched off: no window, only the log line.
-    qotest::DialogDriver none;
-    CQoHint::ShowHint(id, true);
-    EXPECT_EQ(0, none.Seen());
+    Answering({[&](qotest::Dialog& d) {
+                  EXPECT_EQ("Hinweis", d.Title());
+                  EXPECT_EQ(shown, d.Text(IDC_HINT_TEXT));
+                  EXPECT_TRUE(d.IsEnabled(IDC_HINT_DONT_SHOW));
+                  EXPECT_FALSE(d.IsChecked(IDC_HINT_DONT_SHOW));
+                  d.Check(IDC_HINT_DONT_SHOW);
+                  qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("hint-4034.png").c_str());
+                  d.Press(IDOK);
+              }},
+              [&] { CQoHint::ShowHint(id, true); });
+    Answering({}, [&] { CQoHint::ShowHint(id, true); });  // switched off: no window
 
     std::vector<unsigned> stored;
     for (CQoHint::Iterator it = CQoHint::Begin(); it != CQoHint::End(); CQoHint::IteratorInc(it))
@@ -157,12 +116,10 @@ TEST_F(HintTest, SwitchedOffHintIsOnlyLoggedUntilReset)
     EXPECT_EQ(std::vector<unsigned>{id}, stored);
 
     CQoHint::Reset();
-    Drive({[&](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { CQoHint::ShowHint(id, true); });
-
-    std::vector<std::string> expected = {"CQoHint (" + logged + "), angezeigt.",
-                                         "CQoHint (" + logged + "), nicht angezeigt.",
-                                         "CQoHint (" + logged + "), angezeigt."};
-    EXPECT_EQ(expected, Entries());
+    Answering({Pressing(IDOK)}, [&] { CQoHint::ShowHint(id, true); });
+    const std::string line = "CQoHint (" + logged + "), ";
+    EXPECT_EQ((std::vector<std::string>{line + "angezeigt.", line + "nicht angezeigt.", line + "angezeigt."}),
+              Entries());
 }
 
 TEST_F(HintTest, CheckBoxOnlyWhereTheHintMaySwitchOff)
@@ -172,12 +129,12 @@ TEST_F(HintTest, CheckBoxOnlyWhereTheHintMaySwitchOff)
     CQoHint::Hide(IDS_ODBC_MUST_EXIST);
     std::vector<bool> enabled;
     std::string edit;
-    auto tickAndOk = [&](qotest::Dialog& d) {
+    auto look = [&](qotest::Dialog& d) {
         enabled.push_back(d.IsEnabled(IDC_HINT_DONT_SHOW));
         edit = d.Text(IDC_HINT_TEXT);
         d.Press(IDOK);
     };
-    Drive({tickAndOk, tickAndOk}, [&] {
+    Answering({look, look}, [&] {
         CQoHint::ShowHint(IDS_ODBC_MUST_EXIST, true);
         CQoHint::ShowHint(IDS_UNKNOWN_COLUMN_TYPE, false);
         CQoHint::ShowHint("Die Ausgabedatei\nwird \xFC" "berschrieben.");
@@ -185,16 +142,11 @@ TEST_F(HintTest, CheckBoxOnlyWhereTheHintMaySwitchOff)
     EXPECT_EQ((std::vector<bool>{false, false}), enabled);
     EXPECT_EQ("Die Ausgabedatei\r\nwird \xFC" "berschrieben.", edit);
     EXPECT_EQ(1u, CQoHint::m_setDontShow.size());
-
-    std::vector<std::string> expected = {
-        "CQoHint (ODBC Datenbanken m\xFCssen schon angelegt sein!), nicht angezeigt.",
-        "CQoHint (Unbekannter Spaltentyp!), angezeigt.",
-        "CQoHint (Die Ausgabedatei;wird \xFC" "berschrieben.), angezeigt."};
-    EXPECT_EQ(expected, Entries());
+    EXPECT_EQ((std::vector<std::string>{"CQoHint (ODBC Datenbanken m\xFCssen schon angelegt sein!), nicht angezeigt.",
+                                        "CQoHint (Unbekannter Spaltentyp!), angezeigt.",
+                                        "CQoHint (Die Ausgabedatei;wird \xFC" "berschrieben.), angezeigt."}),
+              Entries());
 }
-
-// ---------------------------------------------------------------------------
-// Input dialog
 
 TEST(InputDialog, ShowsTitlePromptAndValueAndReturnsWhatWasTyped)
 {
@@ -202,49 +154,31 @@ TEST(InputDialog, ShowsTitlePromptAndValueAndReturnsWhatWasTyped)
     dlg.m_strTitle = "Eingabe";
     dlg.m_strPrompt = "Bezeichnung eingeben";
     dlg.m_strValue = "Neue_Spalte";
-
-    std::string title, prompt, value;
-    Drive({[&](qotest::Dialog& d) {
-              title = d.Title();
-              prompt = d.Text(IDC_INPUT_PROMPT);
-              value = d.Text(IDC_INPUT_VALUE);
-              // The proposal is selected: typing replaces it.
-              d.Type(IDC_INPUT_VALUE, "Stra\xDF" "e");
-              qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("input-4029.png").c_str());
-              d.Press(IDOK);
-          }},
-          [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
-    EXPECT_EQ("Eingabe", title);
-    EXPECT_EQ("Bezeichnung eingeben", prompt);
-    EXPECT_EQ("Neue_Spalte", value);
+    Answering({[&](qotest::Dialog& d) {
+                  EXPECT_EQ("Eingabe", d.Title());
+                  EXPECT_EQ("Bezeichnung eingeben", d.Text(IDC_INPUT_PROMPT));
+                  EXPECT_EQ("Neue_Spalte", d.Text(IDC_INPUT_VALUE));
+                  d.Type(IDC_INPUT_VALUE, "Stra\xDF" "e");  // the proposal is selected: typing replaces it
+                  qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("input-4029.png").c_str());
+                  d.Press(IDOK);
+              }},
+              [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
     EXPECT_EQ(CString("Stra\xDF" "e"), dlg.m_strValue);
 
     // Cancel keeps the value; without a title the caption stays the template's.
     CQoInputDialog plain;
     plain.m_strValue = "alt";
-    Drive({[&](qotest::Dialog& d) {
-              title = d.Title();
-              d.SetText(IDC_INPUT_VALUE, "neu");
-              d.Press(IDCANCEL);
-          }},
-          [&] { EXPECT_EQ(IDCANCEL, plain.DoModal()); });
-    EXPECT_EQ("Dialog", title);
+    Answering({[&](qotest::Dialog& d) {
+                  EXPECT_EQ("Dialog", d.Title());
+                  d.SetText(IDC_INPUT_VALUE, "neu");
+                  d.Press(IDCANCEL);
+              }},
+              [&] { EXPECT_EQ(IDCANCEL, plain.DoModal()); });
     EXPECT_EQ(CString("alt"), plain.m_strValue);
 }
 
 // ---------------------------------------------------------------------------
 // "Open with"
-
-TEST(FileOpenDlg, RadioChoiceIsZeroToTwo)
-{
-    CQoFileOpenDlg dlg;
-    const int given[] = {2, 3, 1, -1};
-    const int stored[] = {2, 0, 1, 0};
-    for (int i = 0; i < 4; ++i) {
-        dlg.SetRadio(given[i]);
-        EXPECT_EQ(stored[i], dlg.GetRadio()) << given[i];
-    }
-}
 
 TEST(FileOpenDlg, ProgramFieldsOnlyForAnotherProgramAndBrowseFillsThem)
 {
@@ -253,81 +187,67 @@ TEST(FileOpenDlg, ProgramFieldsOnlyForAnotherProgramAndBrowseFillsThem)
     const std::string program = HarmlessProgram();
     CQoFileOpenDlg dlg;
     dlg.SetFile(file.c_str());
+    dlg.SetRadio(3);  // no such choice: the system's default program
 
-    std::string fileShown, programAfterBrowse;
-    std::vector<bool> editEnabled, browseEnabled;
+    std::vector<bool> enabled;  // the program's edit and button, after each choice
     auto record = [&](qotest::Dialog& d) {
-        editEnabled.push_back(d.IsEnabled(IDC_OPEN_PROGRAM));
-        browseEnabled.push_back(d.IsEnabled(IDC_OPEN_BROWSE));
+        enabled.push_back(d.IsEnabled(IDC_OPEN_PROGRAM));
+        enabled.push_back(d.IsEnabled(IDC_OPEN_BROWSE));
     };
-    Drive({[&](qotest::Dialog& d) {
-               EXPECT_EQ("Datei \xF6" "ffnen mit ...", d.Title());
-               fileShown = d.Text(IDC_OPEN_FILE);
-               EXPECT_TRUE(d.IsChecked(IDC_OPEN_DEFAULT));
-               record(d);
-               d.Check(IDC_OPEN_NOTEPAD);
-               record(d);
-               d.Check(IDC_OPEN_OTHER);
-               record(d);
-               d.Press(IDC_OPEN_BROWSE);
-               qotest::WaitFor([&] { return !d.Text(IDC_OPEN_PROGRAM).empty(); }, 5000);
-               programAfterBrowse = d.Text(IDC_OPEN_PROGRAM);
-               qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("open-with-189.png").c_str());
-               d.Press(IDCANCEL);
-           },
-           [&](qotest::Dialog& d) {  // the program chooser
-               int nameId = d.Exists(0x47c) ? 0x47c : 0x480;
-               d.SetText(nameId, program);
-               d.Press(IDOK);
-           }},
-          [&] { EXPECT_EQ(IDCANCEL, dlg.DoModal()); });
-
-    EXPECT_EQ(file, fileShown);
-    EXPECT_EQ((std::vector<bool>{false, false, true}), editEnabled);
-    EXPECT_EQ((std::vector<bool>{false, false, true}), browseEnabled);
-    EXPECT_STRCASEEQ(program.c_str(), programAfterBrowse.c_str());
+    Answering({[&](qotest::Dialog& d) {
+                   EXPECT_EQ("Datei \xF6" "ffnen mit ...", d.Title());
+                   EXPECT_EQ(file, d.Text(IDC_OPEN_FILE));
+                   EXPECT_TRUE(d.IsChecked(IDC_OPEN_DEFAULT));
+                   record(d);
+                   d.Check(IDC_OPEN_NOTEPAD);
+                   record(d);
+                   d.Check(IDC_OPEN_OTHER);
+                   record(d);
+                   d.Press(IDC_OPEN_BROWSE);
+                   qotest::WaitFor([&] { return !d.Text(IDC_OPEN_PROGRAM).empty(); }, 5000);
+                   EXPECT_STRCASEEQ(program.c_str(), d.Text(IDC_OPEN_PROGRAM).c_str());
+                   qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("open-with-189.png").c_str());
+                   d.Press(IDCANCEL);
+               },
+               [&](qotest::Dialog& d) {  // the program chooser
+                   d.SetText(d.Exists(0x47c) ? 0x47c : 0x480, program);
+                   d.Press(IDOK);
+               }},
+              [&] { EXPECT_EQ(IDCANCEL, dlg.DoModal()); });
+    EXPECT_EQ((std::vector<bool>{false, false, false, false, true, true}), enabled);
 }
 
-TEST(FileOpenDlg, ProgramThatCannotStartKeepsTheDialogOpen)
+TEST(FileOpenDlg, OkStartsTheProgramOrReportsThatItCannot)
 {
-    const std::string file = TempPath("qo_oeffnen_mit.txt");
-    CQoFileOpenDlg dlg;
-    dlg.SetFile(file.c_str());
-    dlg.SetRadio(2);
-    dlg.SetProgram("C:\\gibt es nicht\\programm.exe");
-
+    // A program that cannot start: the message, and the dialog stays open.
+    const std::string file = qotest::TempPath("qo_oeffnen_mit.txt");
+    CQoFileOpenDlg broken;
+    broken.SetFile(file.c_str());
+    broken.SetRadio(2);
+    broken.SetProgram("C:\\gibt es nicht\\programm.exe");
     std::string message;
-    bool openAfterMessage = false;
-    Drive({[&](qotest::Dialog& d) {
-               d.Press(IDOK);
-               qotest::PumpFor(300);  // the message box appears and is answered meanwhile
-               qotest::WaitFor([&] { return !message.empty(); }, 5000);
-               openAfterMessage = IsWindowVisible(d.Hwnd()) != FALSE;
-               d.Press(IDCANCEL);
-           },
-           [&](qotest::Dialog& box) {
-               message = box.MessageText();
-               box.Press(IDOK);
-           }},
-          [&] { EXPECT_EQ(IDCANCEL, dlg.DoModal()); });
+    Answering({[&](qotest::Dialog& d) {
+                   d.Press(IDOK);
+                   qotest::WaitFor([&] { return !message.empty(); }, 5000);  // answered meanwhile
+                   EXPECT_TRUE(IsWindowVisible(d.Hwnd()));
+                   d.Press(IDCANCEL);
+               },
+               [&](qotest::Dialog& box) {
+                   message = box.MessageText();
+                   box.Press(IDOK);
+               }},
+              [&] { EXPECT_EQ(IDCANCEL, broken.DoModal()); });
     EXPECT_EQ("Die Datei '" + file + "' konnte nicht ge\xF6" "ffnet werden.", message);
-    EXPECT_TRUE(openAfterMessage);
-}
 
-TEST(FileOpenDlg, OkStartsTheProgramOrClosesWhenThereIsNone)
-{
-    // Another program with none given: nothing to start, the dialog closes.
-    CQoFileOpenDlg empty;
-    empty.SetFile("C:\\daten\\kunden.txt");
-    empty.SetRadio(2);
-    Drive({[&](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, empty.DoModal()); });
-
-    // A program that starts: the dialog closes with OK, no message.
-    CQoFileOpenDlg started;
-    started.SetFile("C:\\daten mit blank\\kunden.txt");
-    started.SetRadio(2);
-    started.SetProgram(HarmlessProgram().c_str());
-    Drive({[&](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, started.DoModal()); });
+    // A program that starts, and another program with none given: the dialog closes with OK.
+    for (const std::string& program : {HarmlessProgram(), std::string()}) {
+        SCOPED_TRACE(program);
+        CQoFileOpenDlg dlg;
+        dlg.SetFile("C:\\daten mit blank\\kunden.txt");
+        dlg.SetRadio(2);
+        dlg.SetProgram(program.c_str());
+        Answering({Pressing(IDOK)}, [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
+    }
 }
 
 // ---------------------------------------------------------------------------
@@ -335,24 +255,15 @@ TEST(FileOpenDlg, OkStartsTheProgramOrClosesWhenThereIsNone)
 
 namespace {
 
-class StaticsTest : public ::testing::Test {
+class StaticsTest : public qotest::HostFrameTest {
 protected:
+    StaticsTest() : HostFrameTest("Statics", 500, 200) {}
     void SetUp() override
     {
-        m_pFrame = new CFrameWnd;
-        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW),
-                                                              (HBRUSH)(COLOR_BTNFACE + 1)),
-                                       "Statics", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 40, 40, 500, 200, NULL, NULL));
+        HostFrameTest::SetUp();
         m_font.CreatePointFont(80, "MS Sans Serif");
         m_pFrame->SetFont(&m_font, FALSE);
     }
-    void TearDown() override
-    {
-        if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();  // deletes it
-        qotest::PumpFor(50);
-    }
-
-    CFrameWnd* m_pFrame = nullptr;
     CFont m_font;
 };
 
@@ -371,6 +282,7 @@ std::string Shortened(HWND hwnd, const std::string& text, UINT flags)
     return buffer.data();
 }
 
+// What the screen shows now, without making the window paint.
 qotest::Image Seen(HWND hwnd)
 {
     qotest::Image img;
@@ -391,12 +303,8 @@ TEST_F(StaticsTest, FilespecShortensInTheMiddleAsPathElseAtTheEnd)
     for (int i = 0; i < 4; ++i)
         ASSERT_TRUE(all[i]->Create("STATIC", "", WS_CHILD | WS_VISIBLE, CRect(10, 10 + 25 * i, 230, 30 + 25 * i),
                                    m_pFrame, i + 1));
-    EXPECT_TRUE(asPath.IsPath());
-    EXPECT_FALSE(atEnd.IsPath());
-    EXPECT_EQ((UINT)(DT_NOPREFIX | DT_VCENTER), CStaticFilespec().GetFormat());
-
-    std::string middle = Shortened(asPath, path, format | DT_PATH_ELLIPSIS);
-    std::string end = Shortened(atEnd, path, format | DT_END_ELLIPSIS);
+    const std::string middle = Shortened(asPath, path, format | DT_PATH_ELLIPSIS);
+    const std::string end = Shortened(atEnd, path, format | DT_END_ELLIPSIS);
     EXPECT_EQ(0u, middle.find("C:\\")) << middle;
     EXPECT_NE(std::string::npos, middle.find("...\\kunden_gesamt.txt")) << middle;
     EXPECT_EQ(0u, end.find("C:\\Daten\\Kunden\\")) << end;
@@ -409,9 +317,7 @@ TEST_F(StaticsTest, FilespecShortensInTheMiddleAsPathElseAtTheEnd)
     qotest::BringToFront(m_pFrame->m_hWnd);
 
     // The window keeps the whole path; the screen shows the shortened text.
-    CString kept;
-    asPath.GetWindowText(kept);
-    EXPECT_EQ(path, (const char*)kept);
+    EXPECT_EQ(path, qotest::WindowText(asPath));
     EXPECT_TRUE(Seen(asPath).rgb == Seen(middleShown).rgb);
     EXPECT_TRUE(Seen(atEnd).rgb == Seen(endShown).rgb);
     EXPECT_FALSE(Seen(asPath).rgb == Seen(atEnd).rgb);
@@ -423,26 +329,6 @@ TEST_F(StaticsTest, FilespecShortensInTheMiddleAsPathElseAtTheEnd)
     EXPECT_TRUE(Seen(asPath).rgb == Seen(middleShown).rgb);
 }
 
-namespace {
-
-class CCountedLink : public CStaticLink {
-public:
-    CCountedLink(const char* link, bool* deleted) : CStaticLink(link, 1), m_pDeleted(deleted) {}
-    ~CCountedLink() override { *m_pDeleted = true; }
-    bool* m_pDeleted;
-};
-
-int CountColour(const qotest::Image& img, COLORREF colour)
-{
-    int n = 0;
-    for (int y = 0; y < img.height; ++y)
-        for (int x = 0; x < img.width; ++x)
-            if (img.Pixel(x, y) == colour) ++n;
-    return n;
-}
-
-}  // namespace
-
 TEST_F(StaticsTest, LinkOpensOnClickAndTurnsPurpleOnlyWhenOpened)
 {
     CStaticLink broken("C:\\gibt es nicht\\liesmich.qox");
@@ -453,37 +339,33 @@ TEST_F(StaticsTest, LinkOpensOnClickAndTurnsPurpleOnlyWhenOpened)
     broken.SetFont(&m_font);
     working.SetFont(&m_font);
     qotest::BringToFront(m_pFrame->m_hWnd);
-
-    qotest::Image img;
-    ASSERT_TRUE(qotest::CaptureImage(broken, img, true));
-    EXPECT_GT(CountColour(img, CStaticLink::g_colorUnvisited), 20);
+    EXPECT_GT(qotest::CountPixels(Seen(broken), CStaticLink::g_colorUnvisited), 20);
 
     // The real mouse: a plain static would let the click through to the frame.
     qotest::Click(broken, 5, 8);
     qotest::PumpFor(200);
-    EXPECT_EQ(CStaticLink::g_colorUnvisited, broken.m_color);
-    ASSERT_TRUE(qotest::CaptureImage(broken, img, true));
-    EXPECT_EQ(0, CountColour(img, CStaticLink::g_colorVisited));
+    EXPECT_EQ(0, qotest::CountPixels(Seen(broken), CStaticLink::g_colorVisited)) << "it could not be opened";
 
     qotest::Click(working, 5, 8);
     qotest::PumpFor(300);
-    EXPECT_EQ(CStaticLink::g_colorVisited, working.m_color);
     EXPECT_EQ(HarmlessProgram(), (const char*)working.m_link);
-    ASSERT_TRUE(qotest::CaptureImage(working, img, true));
-    EXPECT_GT(CountColour(img, CStaticLink::g_colorVisited), 20);
-    EXPECT_EQ(0, CountColour(img, CStaticLink::g_colorUnvisited));
+    EXPECT_GT(qotest::CountPixels(Seen(working), CStaticLink::g_colorVisited), 20);
+    EXPECT_EQ(0, qotest::CountPixels(Seen(working), CStaticLink::g_colorUnvisited));
 
     // Over the link the cursor is the hand.
     EXPECT_TRUE(working.SendMessage(WM_SETCURSOR, (WPARAM)working.m_hWnd, MAKELPARAM(HTCLIENT, WM_MOUSEMOVE)));
     EXPECT_NE(nullptr, CStaticLink::g_hCursorLink);
     EXPECT_EQ(CStaticLink::g_hCursorLink, ::GetCursor());
-}
 
-TEST_F(StaticsTest, LinkMadeToDeleteItselfGoesWithItsWindow)
-{
+    // One made to delete itself goes with its window.
+    struct CCountedLink : CStaticLink {
+        bool* m_pDeleted;
+        explicit CCountedLink(bool* deleted) : CStaticLink("x", 1), m_pDeleted(deleted) {}
+        ~CCountedLink() override { *m_pDeleted = true; }
+    };
     bool deleted = false;
-    CCountedLink* link = new CCountedLink("x", &deleted);
-    ASSERT_TRUE(link->Create("x", WS_CHILD | WS_VISIBLE, CRect(0, 0, 50, 20), m_pFrame, 3));
+    CCountedLink* link = new CCountedLink(&deleted);
+    ASSERT_TRUE(link->Create("x", WS_CHILD | WS_VISIBLE, CRect(0, 70, 50, 90), m_pFrame, 3));
     link->DestroyWindow();
     EXPECT_TRUE(deleted);
 }

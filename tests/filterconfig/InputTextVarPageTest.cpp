@@ -1,13 +1,9 @@
-// The delimited text page and the input previews on real windows, over real
-// files that the tests write: the page driven as a user drives it (typing,
-// picking from the combos, ticking, pressing, real Enter and Escape), its
-// messages answered as a user answers them, and the previews checked by their
-// item counts, cell texts, column widths and the pixels of a capture.
+// The delimited text page and the input previews on real windows over files the
+// tests write: the page driven as a user drives it (typing, picking, ticking,
+// pressing, real Enter and Escape), its messages answered, and the previews
+// checked by their rows, cell texts, column order and the pixels of a capture.
 #include <gtest/gtest.h>
 
-#include <afxcmn.h>
-
-#include <fstream>
 #include <string>
 #include <vector>
 
@@ -19,156 +15,53 @@
 #include "CQoException.h"
 #include "CQoFile.h"
 #include "CQoInputFilterTextVar.h"
-#include "Capture.h"
-#include "DialogDriver.h"
-#include "Input.h"
+#include "MfcTestHost.h"
 #include "resource.h"
 
 namespace {
 
-// The delimited filter, telling the test how often it was opened and whether its
-// row count was still known when it was (SetNumRows(0) drops it).
-class CProbeFilter : public CQoInputFilterTextVar {
-public:
-    int m_nInits = 0;
-    bool m_bCountKnownAtInit = false;
-    void Init(CQoString const& name) override
-    {
-        ++m_nInits;
-        m_bCountKnownAtInit = m_bNumRowsKnown;
-        CQoInputFilterTextVar::Init(name);
-    }
-};
+using qotest::ColumnTitle;
+using qotest::WriteTempFile;
 
-// A filter that only reports a type.
-class CTypedFilter : public CQoInputFilter {
-public:
-    explicit CTypedFilter(int type) { m_fileType = type; }
-};
-
-class CRecordingListener : public CModifiedListener {
-public:
-    std::vector<int> m_ids;
-    int ModifiedListenerSetModified(int bModified, int nNotifierId) override
-    {
-        EXPECT_EQ(1, bModified);
-        m_ids.push_back(nNotifierId);
-        return 1;
-    }
-};
-
-CString ColumnTitle(const CListCtrl& list, int col)
+CString Cell(CColoredInputFilterListCtrl& list, int item, int col)
 {
-    char buf[64] = "";
-    LVCOLUMN column = {};
-    column.mask = LVCF_TEXT;
-    column.pszText = buf;
-    column.cchTextMax = sizeof(buf);
-    list.GetColumn(col, &column);
-    return buf;
+    CString text;
+    DWORD clr = 0, clrSel = 0;
+    bool bold = false;
+    list.GetColoredItem(item, col, text, clr, clrSel, bold);
+    return text;
 }
 
-std::string TempFolder()
-{
-    char path[MAX_PATH];
-    GetTempPathA(MAX_PATH, path);
-    std::string folder = std::string(path) + "qo_textvar_page";
-    CreateDirectoryA(folder.c_str(), NULL);
-    return folder;
-}
-
-std::string WriteFile(const std::string& name, const std::string& content)
-{
-    const std::string path = TempFolder() + "\\" + name;
-    std::ofstream out(path, std::ios::binary);
-    out << content;
-    return path;
-}
-
-// `rows` lines of `cols` fields "r<row>c<col>", joined by `delim`.
-std::string Rows(int rows, int cols, char delim = ';')
+// `rows` lines of `cols` fields "r<row>c<col>", joined by ';'.
+std::string Rows(int rows, int cols)
 {
     std::string s;
     for (int r = 0; r < rows; ++r) {
-        for (int c = 0; c < cols; ++c) {
-            if (c) s += delim;
-            s += "r" + std::to_string(r) + "c" + std::to_string(c);
-        }
+        for (int c = 0; c < cols; ++c) s += (c ? ";r" : "r") + std::to_string(r) + "c" + std::to_string(c);
         s += "\r\n";
     }
     return s;
 }
 
-// The application's loop in small: PreTranslateMessage first, so that the page
-// sees Enter and Escape as it does in a host.
-void PumpApp(DWORD ms)
-{
-    const DWORD start = GetTickCount();
-    for (;;) {
-        MSG msg;
-        while (PeekMessageA(&msg, NULL, 0, 0, PM_REMOVE)) {
-            if (!AfxPreTranslateMessage(&msg)) {
-                TranslateMessage(&msg);
-                DispatchMessageA(&msg);
-            }
-        }
-        const DWORD elapsed = GetTickCount() - start;
-        if (elapsed >= ms) return;
-        MsgWaitForMultipleObjects(0, NULL, FALSE, ms - elapsed, QS_ALLINPUT);
-    }
-}
-
-class FrameTest : public ::testing::Test {
-protected:
-    void SetUp() override
-    {
-        m_pFrame = new CFrameWnd;
-        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW),
-                                                              (HBRUSH)(COLOR_BTNFACE + 1)),
-                                       "Eingabe", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 20, 20, 720, 520, NULL,
-                                       NULL));
-    }
-    void TearDown() override
-    {
-        if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();  // deletes it
-        qotest::PumpFor(30);
-    }
-    // Answers the boxes a test expects; one it does not expect is closed and fails it.
-    qotest::DialogDriver m_driver;
-    CFrameWnd* m_pFrame = nullptr;
-};
-
 // ---------------------------------------------------------------------------
 // The previews
 
-class PreviewTest : public FrameTest {
+class PreviewTest : public qotest::HostFrameTest {
 protected:
+    PreviewTest() : HostFrameTest("Vorschau", 720, 520) {}
     void SetUp() override
     {
-        FrameTest::SetUp();
-        ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | WS_BORDER | LVS_REPORT | LVS_OWNERDRAWFIXED |
-                                      LVS_OWNERDATA,
+        HostFrameTest::SetUp();
+        ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | WS_BORDER | LVS_REPORT | LVS_OWNERDRAWFIXED | LVS_OWNERDATA,
                                   CRect(5, 5, 605, 405), m_pFrame, 100));
         m_list.Init();
         m_list.SetInputFilter(&m_filter);
     }
-    void TearDown() override
+    void Load(const std::string& content)
     {
-        m_list.DestroyWindow();
-        FrameTest::TearDown();
+        m_filter.Init(WriteTempFile("qo_preview.csv", content).c_str());
+        m_list.Update();
     }
-    CString Cell(int item, int col)
-    {
-        CString text;
-        DWORD clr = 0, clrSel = 0;
-        bool bold = true;
-        m_list.GetColoredItem(item, col, text, clr, clrSel, bold);
-        EXPECT_FALSE(bold);
-        return text;
-    }
-    int HeaderCount() { return m_list.GetHeaderCtrl()->GetItemCount(); }
-    CString Title(int col) { return ColumnTitle(m_list, col); }
-
     CColoredInputFilterListCtrl m_list;
     CQoInputFilterTextVar m_filter;
 };
@@ -182,18 +75,18 @@ TEST_F(PreviewTest, ShowsAtMostAThousandRowsWithOrWithoutTheCaptionRow)
     } cases[] = {{25, false, 25}, {25, true, 26}, {5000, false, 1000}, {5000, true, 1001}};
     for (const Case& c : cases) {
         SCOPED_TRACE(std::to_string(c.rows) + (c.caption ? " with caption" : ""));
-        m_filter.Init(WriteFile("rows.csv", Rows(c.rows, 3)).c_str());
         m_list.SetSpecialFirstRow(c.caption, RGB(200, 0, 0), RGB(255, 255, 0));
-        m_list.Update();
+        Load(Rows(c.rows, 3));
         EXPECT_EQ(c.items, m_list.GetItemCount());
         const int first = c.caption ? 1 : 0;
-        EXPECT_EQ("r0c0", Cell(first, 0));
-        EXPECT_EQ("r0c2", Cell(first, 2));
-        EXPECT_EQ(CString(("r" + std::to_string(c.items - first - 1) + "c1").c_str()), Cell(c.items - 1, 1));
-        if (c.rows < 1000) EXPECT_EQ("", Cell(c.items, 1)) << "a row the filter does not have is empty";
+        EXPECT_EQ("r0c2", Cell(m_list, first, 2));
+        EXPECT_EQ(CString(("r" + std::to_string(c.items - first - 1) + "c1").c_str()), Cell(m_list, c.items - 1, 1));
+        if (c.rows < 1000) {
+            EXPECT_EQ("", Cell(m_list, c.items, 1)) << "a row the filter does not have is empty";
+        }
     }
 
-    // The plain list copies rows up to its limit.
+    // The plain list copies rows up to its limit, or all of them.
     CInputFilterListCtrl plain;
     ASSERT_TRUE(plain.Create(WS_CHILD | WS_VISIBLE | LVS_REPORT, CRect(5, 5, 605, 205), m_pFrame, 101));
     plain.SetInputFilter(&m_filter);
@@ -201,100 +94,64 @@ TEST_F(PreviewTest, ShowsAtMostAThousandRowsWithOrWithoutTheCaptionRow)
     plain.Update();
     EXPECT_EQ(1000, plain.GetItemCount());
     EXPECT_EQ("r999c2", plain.GetItemText(999, 2));
-    m_filter.Init(WriteFile("rows.csv", Rows(25, 3)).c_str());
+    Load(Rows(25, 3));
     plain.SetMaxRows(0);
     plain.Update();
     EXPECT_EQ(25, plain.GetItemCount());
-    EXPECT_EQ(3, plain.GetHeaderCtrl()->GetItemCount());
     plain.DestroyWindow();
 }
 
-TEST_F(PreviewTest, WithoutRowsEveryColumnGetsEightyAndAnEqualShare)
+TEST_F(PreviewTest, AnUpdateKeepsTheColumnOrderTheUserDraggedAndFollowsTheFile)
 {
-    m_filter.SetFirstRowHasNames(true);
-    m_filter.Init(WriteFile("names.csv", "Name;Ort;PLZ\r\n").c_str());
-    m_list.Update();
-    EXPECT_EQ(0, m_list.GetItemCount());
-    ASSERT_EQ(3, HeaderCount());
-    CRect rc;
-    m_list.GetWindowRect(&rc);
-    const int share = (rc.Width() - (3 * 80 + 16)) / 3;
-    for (int col = 0; col < 3; ++col) EXPECT_EQ(80 + share, m_list.GetColumnWidth(col)) << col;
-    EXPECT_EQ("Ort", Title(1));
-}
-
-TEST_F(PreviewTest, ASecondUpdateKeepsTheColumnsItHasAndFollowsTheFilter)
-{
-    m_filter.Init(WriteFile("cols.csv", Rows(5, 3)).c_str());
-    m_list.Update();
-    int order[3] = {2, 0, 1};  // the user dragged the columns
+    Load(Rows(5, 3));
+    int order[3] = {2, 0, 1};
     m_list.SetColumnOrderArray(3, order);
-
     m_filter.SetFirstRowHasNames(true);
-    m_filter.Init(WriteFile("cols.csv", "A;B;C;D\r\n" + Rows(5, 4)).c_str());
-    m_list.Update();
-    ASSERT_EQ(4, HeaderCount());
-    int now[4] = {};
-    m_list.GetColumnOrderArray(now, 4);
-    EXPECT_EQ(2, now[0]);
-    EXPECT_EQ(0, now[1]);
-    EXPECT_EQ(1, now[2]);
-    EXPECT_EQ(3, now[3]);
-    EXPECT_EQ("A", Title(0));
-    EXPECT_EQ("D", Title(3));
+    Load("A;B;C;D\r\n" + Rows(5, 4));
+    std::vector<int> now(4);
+    m_list.GetColumnOrderArray(now.data(), 4);
+    EXPECT_EQ((std::vector<int>{2, 0, 1, 3}), now);
+    EXPECT_EQ("D", ColumnTitle(m_list, 3));
 
-    m_filter.Init(WriteFile("cols.csv", "A;B\r\n" + Rows(5, 2)).c_str());
-    m_list.Update();
-    EXPECT_EQ(2, HeaderCount());
-    EXPECT_EQ("B", Title(1));
+    Load("Name;Ort\r\n");  // names only
+    EXPECT_EQ(0, m_list.GetItemCount());
+    EXPECT_EQ(2, m_list.GetHeaderCtrl()->GetItemCount());
+    EXPECT_EQ("Ort", ColumnTitle(m_list, 1));
 }
 
 TEST_F(PreviewTest, TheCaptionRowShowsItsTextsInItsColoursOnTheButtonFace)
 {
     const COLORREF kCaption = RGB(200, 0, 0);
-    m_filter.Init(WriteFile("caption.csv", Rows(10, 3)).c_str());
     m_list.SetSpecialFirstRow(true, kCaption, RGB(255, 255, 0));
-    m_list.Update();
+    Load(Rows(10, 3));
     m_list.SetSpecialText(0, "Kopf");
-    m_list.SetSpecialText(3, "zu weit");  // one beyond the columns: ignored
+    m_list.SetSpecialText(3, "zu weit");  // beyond the columns: ignored
     m_list.SetSpecialText(-1, "davor");
-    EXPECT_EQ("Kopf", Cell(0, 0));
-    EXPECT_EQ("", Cell(0, 2));
-    EXPECT_EQ("r0c0", Cell(1, 0));
+    EXPECT_EQ((std::vector<CString>{"Kopf", "", "r0c0"}),
+              (std::vector<CString>{Cell(m_list, 0, 0), Cell(m_list, 0, 2), Cell(m_list, 1, 0)}));
 
-    qotest::BringToFront(m_pFrame->m_hWnd);
-    m_list.Invalidate();
-    m_list.UpdateWindow();
-    qotest::Image img;
-    ASSERT_TRUE(qotest::CaptureImage(m_list.m_hWnd, img, true));
+    const qotest::Image img = qotest::Screen(m_list.m_hWnd);
     CRect caption, data;
     m_list.GetItemRect(0, &caption, LVIR_BOUNDS);
     m_list.GetItemRect(1, &data, LVIR_BOUNDS);
-    const int cellRight = m_list.GetColumnWidth(0) - 10;
-    EXPECT_EQ(::GetSysColor(COLOR_BTNFACE), img.Pixel(cellRight, caption.top + 1));
-    EXPECT_EQ(m_list.GetBkColor(), img.Pixel(cellRight, data.top + 1));
-    bool red = false, black = false;
-    for (int x = 0; x < cellRight; ++x)
-        for (int y = caption.top; y < data.bottom; ++y) {
-            red |= y < caption.bottom && img.Pixel(x, y) == kCaption;
-            black |= y >= data.top && img.Pixel(x, y) == RGB(0, 0, 0);
-        }
-    EXPECT_TRUE(red) << "caption text in its colour";
-    EXPECT_TRUE(black) << "data text in black";
+    caption.right = data.right = m_list.GetColumnWidth(0) - 10;
+    EXPECT_EQ(::GetSysColor(COLOR_BTNFACE), img.Pixel(caption.right, caption.top + 1));
+    EXPECT_EQ(m_list.GetBkColor(), img.Pixel(data.right, data.top + 1));
+    EXPECT_GT(qotest::CountPixels(img, caption, kCaption), 0);
+    EXPECT_GT(qotest::CountPixels(img, data, RGB(0, 0, 0)), 0);
 }
 
 TEST(InputFilterConfigTest, PicksThePageByTheFiltersType)
 {
     CQoInputFilterTextVar textVar;
     CInputFilterConfig* page = CInputFilterConfig::GetAppropriateConfig(&textVar, 12);
-    ASSERT_NE(nullptr, page);
-    EXPECT_TRUE(page->IsKindOf(RUNTIME_CLASS(CInputFilterConfigTextVar)));
-    EXPECT_EQ(&textVar, page->GetInputFilter());
+    EXPECT_TRUE(page != nullptr && page->IsKindOf(RUNTIME_CLASS(CInputFilterConfigTextVar)));
     delete page;
-
     EXPECT_EQ(nullptr, CInputFilterConfig::GetAppropriateConfig(nullptr, 12));
-    // Types whose pages do not exist here, unknown types, and a filter that
-    // claims to be delimited text without being one.
+    // Types without a page here, unknown types, and one claiming delimited text without being it.
+    struct CTypedFilter : CQoInputFilter {
+        explicit CTypedFilter(int type) { m_fileType = type; }
+    };
     for (int type : {0, 1, 2, 3, 4, 5, 6, 7, 8, -1}) {
         CTypedFilter other(type);
         EXPECT_EQ(nullptr, CInputFilterConfig::GetAppropriateConfig(&other, 12)) << type;
@@ -306,67 +163,56 @@ TEST(InputFilterConfigTest, PicksThePageByTheFiltersType)
 
 const int kPageId = 77;
 
-class TextVarPageTest : public FrameTest {
+class TextVarPageTest : public qotest::HostFrameTest, public CModifiedListener {
 protected:
+    TextVarPageTest() : HostFrameTest("Eingabe", 720, 520) {}
     void SetUp() override
     {
-        FrameTest::SetUp();
-        AfxGetApp()->m_pMainWnd = m_pFrame;
-        m_strFile = WriteFile("page.csv", "Name\tOrt\tPLZ\r\n" "Meier\tKöln\t50667\r\n" "Huber\tMünchen\t80331\r\n"
-                                          "Schulz\tHamburg\t20095\r\n");
+        HostFrameTest::SetUp();
+        // The second record's town, enclosed in ', runs over two lines.
+        m_strFile = WriteTempFile("qo_page.csv", "Name\tOrt\tPLZ\r\nMeier\t'K\xF6ln\r\nDeutz'\t50667\r\n"
+                                                 "Huber\tM\xFCnchen\t80331\r\nSchulz\tHamburg\t20095\r\n");
     }
     void TearDown() override
     {
-        if (m_pPage != nullptr) {
-            m_pPage->RemoveModifiedListener(&m_listener);
-            m_pPage->DestroyWindow();
-            delete m_pPage;
-        }
-        AfxGetApp()->m_pMainWnd = NULL;
-        FrameTest::TearDown();
+        Close();
+        HostFrameTest::TearDown();
+    }
+    int ModifiedListenerSetModified(int, int nNotifierId) override
+    {
+        m_notified.push_back(nNotifierId);
+        return 1;
     }
     void Open()
     {
         m_pPage = new CInputFilterConfigTextVar(&m_filter, kPageId);
-        m_pPage->AddModifiedListener(&m_listener);
+        m_pPage->AddModifiedListener(this);
         ASSERT_TRUE(m_pPage->Create(m_pFrame));
-        EXPECT_FALSE(m_pPage->IsWindowVisible());
-        m_pPage->SetWindowPos(NULL, 0, 0, 0, 0, SWP_NOSIZE | SWP_NOZORDER);
-        m_pPage->ShowWindow(SW_SHOW);
-        qotest::BringToFront(m_pFrame->m_hWnd);
+        EXPECT_FALSE(m_pPage->IsWindowVisible()) << "the host shows it";
+        qotest::ShowChild(*m_pPage);
+    }
+    void Close()
+    {
+        if (m_pPage != nullptr) m_pPage->DestroyWindow();
+        delete m_pPage;
+        m_pPage = nullptr;
     }
     qotest::Dialog Page() { return qotest::Dialog(m_pPage->m_hWnd); }
-    CString Cell(int item, int col)
-    {
-        CString text;
-        DWORD clr, clrSel;
-        bool bold;
-        m_pPage->m_preview.GetColoredItem(item, col, text, clr, clrSel, bold);
-        return text;
-    }
-    // A real key, read by the host's loop (the helpers' own pumping would give the
-    // page no PreTranslateMessage).
-    void Key(WORD vk)
-    {
-        qotest::InjectKey(vk, true);
-        qotest::InjectKey(vk, false);
-        PumpApp(250);
-    }
+    CString PageCell(int item, int col) { return Cell(m_pPage->m_preview, item, col); }
     void Press(int id)
     {
         Page().Press(id);
-        PumpApp(100);
+        qotest::PumpApp(100);
     }
     // The filter's settings in one line, to see that nothing changed.
     std::string State()
     {
-        return std::to_string(static_cast<int>(m_filter.Delimiter())) + "/" +
-               std::to_string(static_cast<int>(m_filter.Encloser())) + "/" + std::to_string(m_filter.Skip()) +
+        return std::string{m_filter.Delimiter(), '/', m_filter.Encloser(), '/'} + std::to_string(m_filter.Skip()) +
                "/" + std::to_string(m_filter.GetFirstRowHasNames()) + "/" + std::to_string(m_filter.CharSet());
     }
 
-    CProbeFilter m_filter;
-    CRecordingListener m_listener;
+    CQoInputFilterTextVar m_filter;
+    std::vector<int> m_notified;  // the notifier ids the page told
     CInputFilterConfigTextVar* m_pPage = nullptr;
     std::string m_strFile;
 };
@@ -379,29 +225,24 @@ TEST_F(TextVarPageTest, ShowsTheFiltersSettingsAndRecords)
     m_filter.Skip(1);
     m_filter.CharSet(CQoFile::ansimix);
     m_filter.SetFirstRowHasNames(true);
-    m_filter.Init(WriteFile("adressen.txt", "Adressen, Stand Mai\r\nName\tOrt\tPLZ\tStra\xDF" "e\r\n"
-                                            "Meier\tK\xF6ln\t50667\tHohe Stra\xDF" "e 12\r\n"
-                                            "Huber\tM\xFCnchen\t80331\tMarienplatz 1\r\n"
-                                            "Schulz\tHamburg\t20095\tJungfernstieg 7\r\n")
+    m_filter.Init(WriteTempFile("qo_adressen.txt", "Adressen, Stand Mai\r\nName\tOrt\tPLZ\tStra\xDF" "e\r\n"
+                                                   "Meier\tK\xF6ln\t50667\tHohe Stra\xDF" "e 12\r\n"
+                                                   "Huber\tM\xFCnchen\t80331\tMarienplatz 1\r\n")
                       .c_str());
     Open();
     qotest::Dialog page = Page();
-    EXPECT_EQ("[TAB]", page.Text(IDC_TEXTVAR_DELIMITER));
-    EXPECT_EQ("", page.Text(IDC_TEXTVAR_ENCLOSER));
-    EXPECT_EQ("\\", page.Text(IDC_TEXTVAR_ESCAPE));
-    EXPECT_EQ("1", page.Text(IDC_TEXTVAR_SKIP));
-    EXPECT_EQ(2, page.Selection(IDC_TEXTVAR_CHARSET));
+    EXPECT_EQ((std::vector<std::string>{"[TAB]", "", "\\", "1"}),
+              (std::vector<std::string>{page.Text(IDC_TEXTVAR_DELIMITER), page.Text(IDC_TEXTVAR_ENCLOSER),
+                                        page.Text(IDC_TEXTVAR_ESCAPE), page.Text(IDC_TEXTVAR_SKIP)}));
     EXPECT_EQ((std::vector<std::string>{"Windows Ansi", "DOS Ascii", "Ansi/Ascii"}),
               page.ComboItems(IDC_TEXTVAR_CHARSET));
+    EXPECT_EQ(2, page.Selection(IDC_TEXTVAR_CHARSET));
     EXPECT_EQ((std::vector<std::string>{"[TAB]", ";", ",", "~", "|"}), page.ComboItems(IDC_TEXTVAR_DELIMITER));
     EXPECT_TRUE(page.IsChecked(IDC_TEXTVAR_FIRST_NAMES));
-    EXPECT_FALSE(page.IsVisible(IDOK));
-    EXPECT_FALSE(page.IsVisible(IDCANCEL));
-    EXPECT_EQ(3, m_pPage->m_preview.GetItemCount());
-    EXPECT_EQ("Meier", Cell(0, 0));
-    EXPECT_EQ("K\xF6ln", Cell(0, 1));
-    EXPECT_EQ("80331", Cell(1, 2));
-
+    EXPECT_FALSE(page.IsVisible(IDOK) || page.IsVisible(IDCANCEL));
+    EXPECT_EQ(2, m_pPage->m_preview.GetItemCount());
+    EXPECT_EQ("K\xF6ln", PageCell(0, 1));
+    EXPECT_EQ("80331", PageCell(1, 2));
     qotest::CaptureWindow(m_pPage->m_hWnd, qotest::CapturePath("input-textvar-4007.png").c_str());
 
     m_pPage->Enable(FALSE);
@@ -414,37 +255,35 @@ TEST_F(TextVarPageTest, ShowsTheFiltersSettingsAndRecords)
 
 TEST_F(TextVarPageTest, AppliesWhatTheUserSetAndTellsTheListenersOnce)
 {
-    m_filter.Init(m_strFile.c_str());  // ';', which does not split these lines
+    m_filter.Init(m_strFile.c_str());  // ';' and '"': five records of one field
     Open();
     qotest::Dialog page = Page();
-    ASSERT_EQ(1, m_pPage->m_preview.GetHeaderCtrl()->GetItemCount());
+    ASSERT_EQ(5, m_pPage->m_preview.GetItemCount());
 
-    // Picking "[TAB]" and applying: the record boundaries move, the count is dropped.
+    // Tab and ' move the record boundaries: the row count is read anew.
     page.SelectText(IDC_TEXTVAR_DELIMITER, "[TAB]");
-    page.SetText(IDC_TEXTVAR_ENCLOSER, "");
+    page.SetText(IDC_TEXTVAR_ENCLOSER, "'");
     Press(IDC_TEXTVAR_APPLY);
     EXPECT_EQ('\t', m_filter.Delimiter());
-    EXPECT_EQ(0, m_filter.Encloser());
-    EXPECT_FALSE(m_filter.m_bCountKnownAtInit);
-    EXPECT_EQ(3, m_pPage->m_preview.GetHeaderCtrl()->GetItemCount());
-    EXPECT_EQ("Ort", Cell(0, 1));
-    EXPECT_EQ(std::vector<int>{kPageId}, m_listener.m_ids);
+    EXPECT_EQ('\'', m_filter.Encloser());
+    EXPECT_EQ(4, m_pPage->m_preview.GetItemCount());
+    EXPECT_EQ("K\xF6ln\r\nDeutz", PageCell(1, 1));
+    EXPECT_EQ(std::vector<int>{kPageId}, m_notified);
 
-    // Only the skip, by Enter: the known count stays.
+    // Only the skip, by Enter.
     qotest::Focus(page.Item(IDC_TEXTVAR_SKIP));
     page.SetText(IDC_TEXTVAR_SKIP, "1");
-    Key(VK_RETURN);
+    qotest::PressKey(VK_RETURN);
     EXPECT_EQ(1, m_filter.Skip());
-    EXPECT_TRUE(m_filter.m_bCountKnownAtInit);
-    EXPECT_EQ("Meier", Cell(0, 0));
-    EXPECT_EQ(2u, m_listener.m_ids.size());
+    EXPECT_EQ("Meier", PageCell(0, 0));
+    EXPECT_EQ(2u, m_notified.size());
 
     // Escape changes nothing and the page stays.
     page.SelectText(IDC_TEXTVAR_DELIMITER, ";");
-    Key(VK_ESCAPE);
+    qotest::PressKey(VK_ESCAPE);
     EXPECT_TRUE(m_pPage->IsWindowVisible());
     EXPECT_EQ('\t', m_filter.Delimiter());
-    EXPECT_EQ(2u, m_listener.m_ids.size());
+    EXPECT_EQ(2u, m_notified.size());
 
     // Ticking the first-line box applies the pending edits with it; the names
     // are read under the new settings.
@@ -452,35 +291,34 @@ TEST_F(TextVarPageTest, AppliesWhatTheUserSetAndTellsTheListenersOnce)
     page.SetText(IDC_TEXTVAR_SKIP, "-3");  // becomes 0, and is shown so
     page.Select(IDC_TEXTVAR_CHARSET, 2);
     page.Check(IDC_TEXTVAR_FIRST_NAMES, true);
-    PumpApp(100);
+    qotest::PumpApp(100);
     EXPECT_TRUE(m_filter.GetFirstRowHasNames());
     EXPECT_EQ(0, m_filter.Skip());
     EXPECT_EQ("0", page.Text(IDC_TEXTVAR_SKIP));
     EXPECT_EQ(CQoFile::ansimix, m_filter.CharSet());
     EXPECT_EQ(3, m_pPage->m_preview.GetItemCount());
-    EXPECT_EQ("Meier", Cell(0, 0));
+    EXPECT_EQ("Meier", PageCell(0, 0));
     EXPECT_EQ("Ort", ColumnTitle(m_pPage->m_preview, 1));
-    EXPECT_EQ(3u, m_listener.m_ids.size());
+    EXPECT_EQ(3u, m_notified.size());
 }
 
 TEST_F(TextVarPageTest, RefusesBadSettingsWithAMessageAndLeavesTheFilterAsItWas)
 {
-    const std::string binary = WriteFile("bild.png", std::string("\x89PNG\r\n\x1a\n\0\0\0\rIHDR\0\0\0\x10", 20));
-    const std::string open = WriteFile("offen.csv", "a;b\r\nc;'d\r\n");
+    const std::string binary = WriteTempFile("qo_bild.png", std::string("\x89PNG\r\n\x1a\n\0\0\0\rIHDR\0\0\0\x10", 20));
+    const std::string open = WriteTempFile("qo_offen.csv", "a;b\r\nc;'d\r\n");
+    const std::string gone = qotest::TempPath("qo_weg.csv");
     struct Case {
         const char* what;
         std::string file;  // "" : the page's file
         int control;
         const char* typed;
         std::string message;  // the start of the message shown
-        int opens;            // times the filter was opened: only to put it back
     } cases[] = {
-        {"empty delimiter", "", IDC_TEXTVAR_DELIMITER, "", "Bitte geben Sie ein Trennzeichen an", 0},
-        {"skip not a number", "", IDC_TEXTVAR_SKIP, "zwei", "Geben Sie eine ganze Zahl ein.", 0},
-        {"file vanished", TempFolder() + "\\weg.csv", IDC_TEXTVAR_SKIP, "1",
-         "Die Datei '" + TempFolder() + "\\weg.csv' konnte nicht ge\xF6""ffnet werden.", 0},
-        {"not text", binary, IDC_TEXTVAR_SKIP, "1", "Die Datei '" + binary + "' ist keine Textdatei.", 0},
-        {"filter cannot read it", open, IDC_TEXTVAR_ENCLOSER, "'", "", 2},
+        {"empty delimiter", "", IDC_TEXTVAR_DELIMITER, "", "Bitte geben Sie ein Trennzeichen an"},
+        {"skip not a number", "", IDC_TEXTVAR_SKIP, "zwei", "Geben Sie eine ganze Zahl ein."},
+        {"file vanished", gone, IDC_TEXTVAR_SKIP, "1", "Die Datei '" + gone + "' konnte nicht ge\xF6" "ffnet werden."},
+        {"not text", binary, IDC_TEXTVAR_SKIP, "1", "Die Datei '" + binary + "' ist keine Textdatei."},
+        {"filter cannot read it", open, IDC_TEXTVAR_ENCLOSER, "'", ""},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.what);
@@ -492,48 +330,32 @@ TEST_F(TextVarPageTest, RefusesBadSettingsWithAMessageAndLeavesTheFilterAsItWas)
         }
         Open();
         const std::string before = State();
-        const int opens = m_filter.m_nInits;
-        std::string shown;
-        m_driver.Expect([&](qotest::Dialog& box) {
-            shown = box.MessageText();
-            box.Press(IDOK);
-        });
         Page().SetText(c.control, c.typed);
-        Press(IDC_TEXTVAR_APPLY);
-        EXPECT_TRUE(qotest::WaitFor([&] { return m_driver.Done(); }, 2000));
-        EXPECT_EQ(0u, shown.find(c.message)) << shown;
-        EXPECT_FALSE(shown.empty());
+        const std::string shown = qotest::MessageOf([&] { Press(IDC_TEXTVAR_APPLY); });
+        EXPECT_TRUE(!shown.empty() && shown.find(c.message) == 0) << shown;
         EXPECT_EQ(before, State()) << "the settings are the filter's as before";
-        EXPECT_EQ(c.opens, m_filter.m_nInits - opens);
-        EXPECT_TRUE(m_listener.m_ids.empty());
+        EXPECT_TRUE(m_notified.empty());
         EXPECT_EQ(c.typed, Page().Text(c.control)) << "the page keeps what the user typed";
-        m_pPage->RemoveModifiedListener(&m_listener);
-        m_pPage->DestroyWindow();
-        delete m_pPage;
-        m_pPage = nullptr;
+        Close();
     }
-    // After the refused encloser the filter reads its file as before.
-    EXPECT_EQ(0, m_filter.Encloser());
-    EXPECT_EQ(2, m_filter.NumRows());
+    EXPECT_EQ(2, m_filter.NumRows()) << "after the refused encloser the filter reads its file as before";
 }
 
 TEST_F(TextVarPageTest, InfoExplainsTheFields)
 {
     m_filter.Init(m_strFile.c_str());
     Open();
-    // The button is hidden in the template; a host that wants it shows it.
-    m_pPage->GetDlgItem(IDC_TEXTVAR_INFO)->ShowWindow(SW_SHOW);
+    m_pPage->GetDlgItem(IDC_TEXTVAR_INFO)->ShowWindow(SW_SHOW);  // off unless the host wants it
     m_pPage->Enable(TRUE);
     std::string text;
-    m_driver.Expect([&](qotest::Dialog& box) {
-        text = box.Text(IDC_INFO_TEXT);
-        box.Press(IDOK);
-    });
-    Press(IDC_TEXTVAR_INFO);
-    EXPECT_TRUE(qotest::WaitFor([&] { return m_driver.Done(); }, 3000));
+    qotest::Answering({[&](qotest::Dialog& box) {
+                          text = box.Text(IDC_INFO_TEXT);
+                          box.Press(IDOK);
+                      }},
+                      [&] { Press(IDC_TEXTVAR_INFO); });
     EXPECT_EQ(0u, text.find("Das Trennzeichen ist das Zeichen")) << text;
-    EXPECT_NE(std::string::npos, text.find("backslash \\ verwendet.\r\n\r\nIm Feld überlesen"));
-    EXPECT_NE(std::string::npos, text.find("(dort werden maximal 50 Sätze angezeigt)."));
+    EXPECT_NE(std::string::npos, text.find("backslash \\ verwendet.\r\n\r\nIm Feld \xFC" "berlesen"));
+    EXPECT_NE(std::string::npos, text.find("(dort werden maximal 50 S\xE4tze angezeigt)."));
 }
 
 }  // namespace

@@ -5,41 +5,38 @@
 #include <afxdlgs.h>
 
 #include <cstring>
+#include <fstream>
 #include <string>
 
 #include "dialog_script.h"
 
 namespace {
 
-std::string TempFile(const char* name)
-{
-    char dir[MAX_PATH];
-    ::GetTempPathA(MAX_PATH, dir);
-    return std::string(dir) + name;
-}
-
-// The file name field of the explorer-style dialog.
+// The explorer-style dialog's file name field: a combo box, or an edit in older layouts.
 int NameField(HWND hDlg)
 {
     return ::GetDlgItem(hDlg, 0x47c) != NULL ? 0x47c : 0x480;
+}
+
+std::string TempFolder()
+{
+    char dir[MAX_PATH] = "";
+    ::GetTempPathA(MAX_PATH, dir);
+    return dir;
 }
 
 }  // namespace
 
 TEST(FileDialog, OpenHandsBackTheChosenFileInItsParts)
 {
-    std::string path = TempFile("Kunden Liste.2024.txt");
-    FILE* f = fopen(path.c_str(), "wb");
-    ASSERT_NE(nullptr, f);
-    fclose(f);
-
+    const std::string path = TempFolder() + "Kunden Liste.2024.txt";
+    std::ofstream(path).close();
     CFileDialog dlg(TRUE, NULL, "vorschlag.txt", OFN_FILEMUSTEXIST | OFN_HIDEREADONLY,
                     "Textdateien (*.txt)|*.txt|Alle Dateien (*.*)|*.*||");
     // The filter reaches the system as NUL-separated pairs ending in two NULs.
     const char* p = dlg.m_ofn.lpstrFilter;
     ASSERT_NE(nullptr, p);
-    const char* parts[] = {"Textdateien (*.txt)", "*.txt", "Alle Dateien (*.*)", "*.*"};
-    for (const char* part : parts) {
+    for (const char* part : {"Textdateien (*.txt)", "*.txt", "Alle Dateien (*.*)", "*.*"}) {
         EXPECT_STREQ(part, p);
         p += strlen(p) + 1;
     }
@@ -64,15 +61,14 @@ TEST(FileDialog, OpenHandsBackTheChosenFileInItsParts)
 
 TEST(FileDialog, SaveAddsTheDefaultExtensionAndCancelAnswersCancel)
 {
-    std::string folder = TempFile("");
     CFileDialog save(FALSE, "csv", NULL, OFN_HIDEREADONLY | OFN_OVERWRITEPROMPT, "CSV (*.csv)|*.csv");
     CDialogScript script;
     script.Then([&](HWND hDlg) {
-        ::SetDlgItemTextA(hDlg, NameField(hDlg), (folder + "bericht").c_str());
+        ::SetDlgItemTextA(hDlg, NameField(hDlg), (TempFolder() + "bericht").c_str());
         CDialogScript::Click(hDlg, IDOK);
     });
     EXPECT_EQ(IDOK, save.DoModal());
-    EXPECT_STRCASEEQ((folder + "bericht.csv").c_str(), save.GetPathName());
+    EXPECT_STRCASEEQ((TempFolder() + "bericht.csv").c_str(), save.GetPathName());
 
     CFileDialog cancelled(TRUE);
     script.Then([&](HWND hDlg) { CDialogScript::Click(hDlg, IDCANCEL); });
