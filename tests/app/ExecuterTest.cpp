@@ -8,14 +8,18 @@
 
 #include <atomic>
 #include <cstdlib>
-#include <fstream>
 #include <string>
 #include <vector>
 
 #include "CExecuter.h"
 #include "CQoLog.h"
+#include "ThreadTestSupport.h"
 
 namespace {
+
+using apptest::BinDir;
+using apptest::ReadLines;
+using apptest::TempFile;
 
 const UINT WM_JOB_DONE = WM_APP + 31;
 
@@ -28,33 +32,7 @@ public:
     ~CCountedExecuter() override { ++g_nDeleted; }
 };
 
-std::string BinDir()
-{
-    char szPath[MAX_PATH];
-    DWORD n = ::GetModuleFileNameA(NULL, szPath, MAX_PATH);
-    std::string strPath(szPath, n);
-    return strPath.substr(0, strPath.rfind('\\'));
-}
-
 std::string ModuleDir() { return BinDir() + "\\modules"; }
-
-std::string TempFile(const char* pszName)
-{
-    char szDir[MAX_PATH];
-    ::GetTempPathA(MAX_PATH, szDir);
-    std::string strPath = std::string(szDir) + pszName;
-    ::DeleteFileA(strPath.c_str());
-    return strPath;
-}
-
-std::vector<std::string> ReadLines(const std::string& strPath)
-{
-    std::vector<std::string> lines;
-    std::ifstream in(strPath);
-    for (std::string line; std::getline(in, line);)
-        lines.push_back(line);
-    return lines;
-}
 
 std::string Path()
 {
