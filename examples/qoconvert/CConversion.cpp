@@ -352,8 +352,12 @@ long CConversion::RunRecords()
     CConversionInput* logged = dynamic_cast<CConversionInput*>(input.get());
     if (input->NumCols() == 0)
         CQoException::Throw("Die Eingabe hat keine Spalten.", "CConversion::Run");
+    // One pass from the first record to the last: no row index is needed,
+    // so memory stays flat whatever the input's size.
+    input->NoCache(true);
     CInputRecords records(input.get());
     int const columns = records.GetNumColumns();
+    records.FreezeView();
 
     CQoFile file;
     std::string temp;

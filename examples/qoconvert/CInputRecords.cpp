@@ -3,14 +3,43 @@
 #include <CQoString.h>
 
 CInputRecords::CInputRecords(CQoInputFilter* filter)
-    : m_pFilter(filter), m_lRow(-1)
+    : m_pFilter(filter), m_lRow(-1), m_bFrozen(false)
 {
+}
+
+void CInputRecords::FreezeView()
+{
+    m_frozen.clear();
+    m_bFrozen = false;
+    // Capitals and umlaut folding change the text: those go the long way.
+    if (GetUseCapitals() || GetNoUmlaute())
+        return;
+    for (int i = 0, n = GetEntryCount(); i < n; ++i) {
+        CEntry entry;
+        GetEntry(i, entry);
+        if (entry.GetSelected())
+            m_frozen.push_back(entry.GetColumn());
+    }
+    m_bFrozen = true;
+}
+
+void CInputRecords::GetValue(long row, int col, CQoString& value)
+{
+    if (!m_bFrozen) {
+        COutputFilterSource::GetValue(row, col, value);
+        return;
+    }
+    value.Empty();
+    if (col < 0 || col >= static_cast<int>(m_frozen.size()) || !MoveTo(row))
+        return;
+    m_pFilter->Value(m_frozen[col], value);
 }
 
 void CInputRecords::SetInputFilter(CQoInputFilter* filter)
 {
     m_pFilter = filter;
     m_lRow = -1;
+    ThawView();
     InitArray();
 }
 

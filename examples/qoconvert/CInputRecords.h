@@ -13,6 +13,8 @@
 #include <COutputFilterSource.h>
 #include <CQoInputFilter.h>
 
+#include <vector>
+
 class CInputRecords : public COutputFilterSource
 {
 public:
@@ -24,6 +26,14 @@ public:
     CQoInputFilter* GetInputFilter() const { return m_pFilter; }
     // The filter stands on `row` (-1: on no known row).
     void StandsOn(long row) { m_lRow = row; }
+    // For a run that leaves the column view alone: the view is taken once,
+    // and a value then goes from the filter straight into the caller's text
+    // (no text in between, no walk over the view per value). Any change of
+    // the view afterwards needs FreezeView again, or ThawView.
+    void FreezeView();
+    void ThawView() { m_frozen.clear(); m_bFrozen = false; }
+
+    void GetValue(long row, int col, CQoString& value) override;
 
     void GetSourceValue(long row, int column, CString& value) override;
     void GetSourceName(int column, CString& name, int flag) override;
@@ -35,4 +45,6 @@ private:
 
     CQoInputFilter* m_pFilter;
     long m_lRow;
+    std::vector<int> m_frozen;   // the filter's column of each output column
+    bool m_bFrozen;
 };

@@ -27,8 +27,8 @@ BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
 END_MESSAGE_MAP()
 
 CMainDlg::CMainDlg(CWnd* pParent)
-    : CDialog(IDD, pParent), m_outputFormat(CConversion::formatDelimited), m_records(&m_outputRows),
-      m_hCancel(NULL), m_llInputSize(-1), m_bCloseWhenDone(false)
+    : CDialog(IDD, pParent), m_hCancel(NULL), m_llInputSize(-1), m_bCloseWhenDone(false),
+      m_outputFormat(CConversion::formatDelimited), m_records(&m_outputRows)
 {
 }
 
@@ -358,8 +358,6 @@ void CMainDlg::EnableForRun(bool running)
         m_outputPage->EnableWindow(!running);
     GetDlgItem(IDC_ABORT)->EnableWindow(running);
     GetDlgItem(IDC_PROGRESS)->ShowWindow(running ? SW_SHOW : SW_HIDE);
-    if (running)
-        GotoDlgCtrl(GetDlgItem(IDC_ABORT));
 }
 
 void CMainDlg::OnAbort()

@@ -18,6 +18,19 @@ BEGIN_MESSAGE_MAP(CQoConvertApp, CSingleWinApp)
     ON_THREAD_MESSAGE(WM_QOCONVERT_DONE, OnConversionDone)
 END_MESSAGE_MAP()
 
+namespace {
+// Defective input records are repaired by the user while the module converts
+// (on the executer thread, in a dialog without parent). The pages' previews on
+// the window's thread read the same files: they keep showing a defective
+// record as an error instead of opening the dialog whenever they paint.
+int RepairDuringConversion(CQoString const& file, CQoString& data, int& pos)
+{
+    if (GetCurrentThreadId() == theApp.m_nThreadID)
+        return CQoInterActive::repairNoHandler;
+    return CRepairRecordDlgDoIt(file, data, pos);
+}
+}
+
 CQoString CQoConvertApp::InProject(const CQoString& file) const
 {
     return CConversion::InFolder(m_projectFolder, file);
@@ -72,9 +85,7 @@ BOOL CQoConvertApp::InitInstance()
         return FALSE;  // no window, no message loop
     }
 
-    // Defective input records are repaired by the user, in a dialog that the
-    // conversion opens on its own thread.
-    CQoInterActive::SetRepairRecord(CRepairRecordDlgDoIt);
+    CQoInterActive::SetRepairRecord(RepairDuringConversion);
     CMainDlg dlg;
     m_pMainWnd = &dlg;
     dlg.DoModal();

@@ -248,8 +248,11 @@ int Run(const RunArguments& args)
         // message (answered at once, into the log).
         if (args.batch)
             QoBatchMessageBox(1001, IDOK, done, MB_OK | MB_ICONINFORMATION, 0);
-        else
-            _theLog << "H:1001 " << (const char*)done << CQoLog::endl;
+        else {
+            CString line = done;
+            line.Replace("\n", " ");
+            _theLog << "H:1001 " << (const char*)line << CQoLog::endl;
+        }
         result = qoConvertDone;
         if (job.SkippedRecords() > 0) {
             _theLog << "W: " << job.SkippedRecords() << " fehlerhafte S\xE4tze ausgelassen" << CQoLog::endl;
