@@ -143,3 +143,8 @@
 #define IDC_REPAIR_DATA             4121
 #define IDC_REPAIR_IGNORE           4124
 #define IDC_REPAIR_SPIN             4160
+
+// The column-mapping dialogs and pages, one header per group
+#include "ids_outputsource.h"
+#include "ids_functions.h"
+#include "ids_multicolumn.h"

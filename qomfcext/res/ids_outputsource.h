@@ -1,0 +1,2 @@
+// Resource ids of the output source page (4030) and the separator prompt (4041).
+#pragma once
