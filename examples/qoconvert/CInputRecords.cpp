@@ -83,5 +83,13 @@ int CInputRecords::NumSourceColumns()
 
 long CInputRecords::NumSourceRows()
 {
-    return m_pFilter != nullptr ? m_pFilter->NumRows() : 0;
+    if (m_pFilter == nullptr)
+        return 0;
+    if (m_lRowLimit > 0) {
+        bool reached = m_pFilter->AbsoluteRow(m_lRowLimit - 1);
+        m_lRow = reached ? m_lRowLimit - 1 : -1;
+        if (reached)
+            return m_lRowLimit;
+    }
+    return m_pFilter->NumRows();
 }

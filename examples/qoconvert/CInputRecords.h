@@ -32,6 +32,10 @@ public:
     // the view afterwards needs FreezeView again, or ThawView.
     void FreezeView();
     void ThawView() { m_frozen.clear(); m_bFrozen = false; }
+    // A preview needs only the first rows: with a limit the source counts no
+    // further (a large file is not read to its end, and a defective record
+    // beyond the limit is not met). 0: every row.
+    void SetRowLimit(long limit) { m_lRowLimit = limit > 0 ? limit : 0; }
 
     void GetValue(long row, int col, CQoString& value) override;
 
@@ -45,6 +49,7 @@ private:
 
     CQoInputFilter* m_pFilter;
     long m_lRow;
+    long m_lRowLimit = 0;
     std::vector<int> m_frozen;   // the filter's column of each output column
     bool m_bFrozen;
 };

@@ -30,6 +30,8 @@ CMainDlg::CMainDlg(CWnd* pParent)
     : CDialog(IDD, pParent), m_hCancel(NULL), m_llInputSize(-1), m_bCloseWhenDone(false),
       m_outputFormat(CConversion::formatDelimited), m_records(&m_outputRows)
 {
+    // The output page previews the first rows; it need not read the whole input.
+    m_records.SetRowLimit(1000);
 }
 
 CMainDlg::~CMainDlg() = default;
