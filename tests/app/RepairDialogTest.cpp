@@ -39,7 +39,12 @@ void ClickSpin(Dialog& d, bool up)
     HWND spin = d.Item(IDC_REPAIR_SPIN);
     RECT rc;
     GetClientRect(spin, &rc);
-    qotest::Click(spin, rc.right / 2, up ? 2 : rc.bottom - 3);
+    // Press and release queued together: a busy machine must not hold the
+    // button long enough for the control's own repeat to step once more.
+    qotest::MoveMouse(spin, rc.right / 2, up ? 2 : rc.bottom - 3);
+    qotest::InjectButton(qotest::MouseButton::Left, true);
+    qotest::InjectButton(qotest::MouseButton::Left, false);
+    qotest::PumpFor(40);
 }
 
 // Presses a button whose refusal opens a message box, answered by the next
