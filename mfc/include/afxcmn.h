@@ -52,6 +52,14 @@ public:
   BOOL SetItemText(int nItem, int nSubItem, LPCTSTR lpszText);
   CString GetItemText(int nItem, int nSubItem) const;
   BOOL DeleteAllItems();
+  BOOL DeleteItem(int nItem);
+  BOOL SetItemData(int nItem, DWORD_PTR dwData);
+  DWORD_PTR GetItemData(int nItem) const;
+  // The next item after nItem (-1: from the start) with the LVNI_ flags, -1 if none.
+  int GetNextItem(int nItem, int nFlags) const;
+  // LVS_EX_ styles; SetExtendedStyle answers the previous ones.
+  DWORD GetExtendedStyle() const;
+  DWORD SetExtendedStyle(DWORD dwNewStyle);
   BOOL EnsureVisible(int nItem, BOOL bPartialOK);
   int GetTopIndex() const;
   int GetCountPerPage() const;

@@ -115,6 +115,26 @@ CString CListCtrl::GetItemText(int nItem, int nSubItem) const {
   }
 }
 BOOL CListCtrl::DeleteAllItems() { return (BOOL)SEND(LVM_DELETEALLITEMS, 0, 0); }
+BOOL CListCtrl::DeleteItem(int nItem) { return (BOOL)SEND(LVM_DELETEITEM, nItem, 0); }
+BOOL CListCtrl::SetItemData(int nItem, DWORD_PTR dwData) {
+  LVITEMA item;
+  memset(&item, 0, sizeof(item));
+  item.mask = LVIF_PARAM;
+  item.iItem = nItem;
+  item.lParam = (LPARAM)dwData;
+  return (BOOL)SEND(LVM_SETITEMA, 0, &item);
+}
+DWORD_PTR CListCtrl::GetItemData(int nItem) const {
+  LVITEMA item;
+  memset(&item, 0, sizeof(item));
+  item.mask = LVIF_PARAM;
+  item.iItem = nItem;
+  if (!SEND(LVM_GETITEMA, 0, &item)) return 0;
+  return (DWORD_PTR)item.lParam;
+}
+int CListCtrl::GetNextItem(int nItem, int nFlags) const { return (int)SEND(LVM_GETNEXTITEM, nItem, MAKELPARAM(nFlags, 0)); }
+DWORD CListCtrl::GetExtendedStyle() const { return (DWORD)SEND(LVM_GETEXTENDEDLISTVIEWSTYLE, 0, 0); }
+DWORD CListCtrl::SetExtendedStyle(DWORD dwNewStyle) { return (DWORD)SEND(LVM_SETEXTENDEDLISTVIEWSTYLE, 0, dwNewStyle); }
 BOOL CListCtrl::EnsureVisible(int nItem, BOOL bPartialOK) { return (BOOL)SEND(LVM_ENSUREVISIBLE, nItem, bPartialOK); }
 int CListCtrl::GetTopIndex() const { return (int)SEND(LVM_GETTOPINDEX, 0, 0); }
 int CListCtrl::GetCountPerPage() const { return (int)SEND(LVM_GETCOUNTPERPAGE, 0, 0); }
