@@ -4,13 +4,12 @@
 // random rows after the first pass.
 //
 //   bench_textvar [rows] [file] [probes]   defaults: 1000000 rows, a new file in the
-//                                          temp folder, 200000 AbsoluteRow calls
+//                                          temp folder, 200000 AbsoluteRow calls;
+//                                          a named file that exists is read as found
 #include "CQoFile.h"
 #include "CQoInputFilterTextVar.h"
-#include "PeakMemory.h"
+#include "BenchMeasure.h"
 
-#include <chrono>
-#include <ctime>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
@@ -18,12 +17,7 @@
 #include <string>
 
 namespace {
-typedef std::chrono::steady_clock Clock;
-
-double Seconds(Clock::time_point since)
-{
-    return std::chrono::duration<double>(Clock::now() - since).count();
-}
+using qobench::Stopwatch;
 
 // 10 columns: a number, an enclosed name holding the delimiter, and eight
 // short fields; about 80 bytes per row.
@@ -48,10 +42,14 @@ void MakeFile(std::string const &path, long rows)
 }
 
 #if !defined(_WIN32)
-double TimeCommand(std::string const &command, std::string &output)
+// Runs a host program through the shell and prints its wall time (from the
+// start of the shell to its end) and the CPU time of the shell and the
+// program, with the program's output.
+void TimeCommand(char const *label, std::string const &command, double mb)
 {
-    Clock::time_point start = Clock::now();
-    output.clear();
+    std::string output;
+    double childCpu = qobench::ChildCpuSeconds();
+    Stopwatch watch;
     if (std::FILE *pipe = popen(command.c_str(), "r")) {
         char chunk[256];
         std::size_t n;
@@ -59,22 +57,33 @@ double TimeCommand(std::string const &command, std::string &output)
             output.append(chunk, n);
         pclose(pipe);
     }
+    double wall = watch.Wall();
+    childCpu = qobench::ChildCpuSeconds() - childCpu;
     while (!output.empty() && (output.back() == '\n' || output.back() == ' '))
         output.pop_back();
-    return Seconds(start);
+    std::printf("%s: %.3f s = %.0f MB/s (CPU %.3f s; %s)\n", label, wall, mb / wall, childCpu, output.c_str());
 }
 #endif
 } // namespace
 
 int main(int argc, char **argv)
 {
-    long rows = argc > 1 ? std::atol(argv[1]) : 1000000;
+    long const rows = qobench::CountArgument(argc, argv, 1, 1000000, 100000000);
+    long const probes = qobench::CountArgument(argc, argv, 3, 200000, 100000000);
     std::string path = argc > 2 ? argv[2]
                                 : (std::filesystem::temp_directory_path() / "bench_textvar.csv").string();
-    if (!CQoFile::Exists(path.c_str()) || argc <= 2)
+    // A named file that exists is read as it is: the rows are the ones counted.
+    bool const made = !CQoFile::Exists(path.c_str()) || argc <= 2;
+    if (made)
         MakeFile(path, rows);
-    double mb = static_cast<double>(std::filesystem::file_size(path)) / 1e6;
-    std::printf("file %s: %ld rows, %.1f MB\n", path.c_str(), rows, mb);
+    auto const size = std::filesystem::file_size(path);
+    double mb = static_cast<double>(size) / 1e6;
+    if (made)
+        std::printf("file %s: %.1f MB (%llu bytes), made with %ld rows\n", path.c_str(), mb,
+                    static_cast<unsigned long long>(size), rows);
+    else
+        std::printf("file %s: %.1f MB (%llu bytes), as found\n", path.c_str(), mb,
+                    static_cast<unsigned long long>(size));
 
     CQoInputFilterTextVar filter;
     filter.Init(path.c_str());
@@ -86,8 +95,7 @@ int main(int argc, char **argv)
         }
     }
 
-    Clock::time_point start = Clock::now();
-    std::clock_t cpu = std::clock();
+    Stopwatch watch;
     long read = 0;
     std::size_t bytes = 0;
     CQoString value;
@@ -99,46 +107,44 @@ int main(int argc, char **argv)
         }
         ++read;
     }
-    double t = Seconds(start);
-    double tc = static_cast<double>(std::clock() - cpu) / CLOCKS_PER_SEC;
+    double t = watch.Wall();
+    double tc = watch.Cpu();
     std::printf("CQoInputFilterTextVar: %ld rows x %d fields in %.3f s = %.0f MB/s"
-                " (CPU %.3f s = %.0f MB/s; %zu value bytes)\n",
-                read, cols, t, mb / t, tc, mb / tc, bytes);
+                " (CPU %.3f s; %zu value bytes)\n",
+                read, cols, t, mb / t, tc, bytes);
 
 #if !defined(_WIN32)
-    std::string out;
-    double tw = TimeCommand("wc -l '" + path + "'", out);
-    std::printf("wc -l: %.3f s = %.0f MB/s (%s)\n", tw, mb / tw, out.c_str());
-    double tp = TimeCommand("/usr/bin/python3 -c \"import csv,sys\n"
+    TimeCommand("wc -l", "wc -l '" + path + "'", mb);
+    TimeCommand("python3 csv", "/usr/bin/python3 -c \"import csv,sys\n"
                             "n=0\n"
                             "with open(sys.argv[1], encoding='latin-1', newline='') as f:\n"
                             "    for row in csv.reader(f, delimiter=';'):\n"
                             "        n+=1\n"
-                            "print(n)\" '" + path + "'",
-                            out);
-    std::printf("python3 csv: %.3f s = %.0f MB/s (%s rows)\n", tp, mb / tp, out.c_str());
+                            "print(n, 'rows')\" '" + path + "'",
+                mb);
 #else
     std::printf("wc -l, python3 csv: not started under Wine (host programs); see the native run\n");
 #endif
 
     long total = filter.NumRows();
+    if (total <= 0) {
+        std::printf("AbsoluteRow: the file has no rows to jump to\n");
+        return 1;
+    }
     std::mt19937 random(5);
-    int const probes = argc > 3 ? std::atoi(argv[3]) : 200000;
-    start = Clock::now();
-    cpu = std::clock();
+    watch.Restart();
     long hits = 0;
-    for (int k = 0; k < probes; ++k) {
+    for (long k = 0; k < probes; ++k) {
         if (filter.AbsoluteRow(static_cast<long>(random() % total)))
             ++hits;
         filter.Value(cols - 1, value);
     }
-    double ta = Seconds(start);
-    double tac = static_cast<double>(std::clock() - cpu) / CLOCKS_PER_SEC;
-    std::printf("AbsoluteRow at random rows: %.2f us per call (CPU %.2f us; %ld of %d found),"
-                " index %.2f bytes per row\n",
-                ta * 1e6 / probes, tac * 1e6 / probes, hits, probes,
-                static_cast<double>(filter.IndexBytes()) / static_cast<double>(total));
+    double ta = watch.Wall();
+    double tac = watch.Cpu();
+    std::printf("AbsoluteRow at random rows: %ld calls in %.3f s = %.2f us per call (CPU %.3f s; %ld found),"
+                " index %zu bytes for %ld rows\n",
+                probes, ta, ta * 1e6 / probes, tac, hits, filter.IndexBytes(), total);
     // The file is far larger: the reader keeps the current record and the index.
-    PrintPeakMemory("reading the whole file and jumping");
+    qobench::PrintPeakMemory("reading the whole file and jumping");
     return 0;
 }

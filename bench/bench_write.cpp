@@ -8,8 +8,8 @@
 #include "CQoOutputFilterDbase.h"
 #include "CQoOutputFilterTextFix.h"
 #include "CQoOutputFilterTextVar.h"
+#include "BenchMeasure.h"
 
-#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
@@ -43,11 +43,6 @@ void MakeRow(long row, std::vector<CQoString> &values)
     values[9] = row % 7 ? "Bemerkung; mit Trenner" : "";
 }
 
-double Seconds(std::chrono::steady_clock::time_point start)
-{
-    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
-}
-
 void Run(char const *label, CQoOutputFilter &out, std::string const &path, long rows, bool binary)
 {
     std::vector<std::vector<CQoString>> sample(1000, std::vector<CQoString>(kCols));
@@ -58,7 +53,7 @@ void Run(char const *label, CQoOutputFilter &out, std::string const &path, long 
         std::printf("%s: cannot create %s\n", label, path.c_str());
         return;
     }
-    auto start = std::chrono::steady_clock::now();
+    qobench::Stopwatch watch;
     out.UseFile(&file, true);
     out.Init();
     out.WriteHeader();
@@ -70,10 +65,11 @@ void Run(char const *label, CQoOutputFilter &out, std::string const &path, long 
         out.WriteRow();
     }
     out.ReleaseFile();
-    double seconds = Seconds(start);
+    double seconds = watch.Wall();
+    double cpu = watch.Cpu();
     double mb = double(std::filesystem::file_size(path)) / 1e6;
-    std::printf("%-22s %9ld rows  %8.1f MB  %7.3f s  %8.1f MB/s  %6.2f Mrows/s\n", label, rows, mb, seconds,
-                mb / seconds, double(rows) / seconds / 1e6);
+    std::printf("%-22s %9ld rows  %8.1f MB  %7.3f s  CPU %7.3f s  %8.1f MB/s  %6.2f Mrows/s\n", label, rows, mb,
+                seconds, cpu, mb / seconds, double(rows) / seconds / 1e6);
     std::filesystem::remove(path);
 }
 
@@ -81,7 +77,7 @@ void Run(char const *label, CQoOutputFilter &out, std::string const &path, long 
 
 int main(int argc, char **argv)
 {
-    long rows = argc > 1 ? std::atol(argv[1]) : 1000000;
+    long const rows = qobench::CountArgument(argc, argv, 1, 1000000, 100000000);
     std::string folder = argc > 2 ? argv[2] : std::filesystem::temp_directory_path().string();
     std::printf("bench_write: %ld rows, %d columns, files in %s\n", rows, kCols, folder.c_str());
 
@@ -117,5 +113,6 @@ int main(int argc, char **argv)
     Run("dBase (DOS 850)", dbf, folder + "/bench_write.dbf", rows, true);
     dbf.FileCharSet(CQoFile::ansi);
     Run("dBase (ansi)", dbf, folder + "/bench_write.dbf", rows, true);
+    qobench::PrintPeakMemory("writing");
     return 0;
 }

@@ -2,16 +2,16 @@
 // (text, shared and repeated text, numbers, dates, booleans) read row by
 // row with every cell touched, beside python3-openpyxl reading the same file
 // in read-only mode. The workbook is written by python3-xlsxwriter when it
-// is missing (natively; under Wine, run the native benchmark first or pass
-// a file).
+// is missing (natively, with `rows` rows; under Wine, run the native
+// benchmark first or pass a file).
 //
-//   bench_xlsx [file.xlsx]
-// Build without sanitizers for figures (-DQO_SANITIZE=OFF -DCMAKE_BUILD_TYPE=Release).
+//   bench_xlsx [file.xlsx] [rows]      default rows 100000
+// Build without sanitizers for figures (-DQO_SANITIZE=OFF), or run
+// bench/run-native-and-wine.sh.
 #include "CQoException.h"
 #include "CQoXlsxReader.h"
-#include "PeakMemory.h"
+#include "BenchMeasure.h"
 
-#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
@@ -20,11 +20,7 @@
 #include <vector>
 
 namespace {
-
-double Seconds(std::chrono::steady_clock::time_point start)
-{
-    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
-}
+using qobench::Stopwatch;
 
 #ifdef _WIN32
 char const defaultPath[] = "Z:\\tmp\\qo_bench_xlsx.xlsx";
@@ -75,29 +71,30 @@ int RunPython(char const *script, std::string const &args)
 int main(int argc, char **argv)
 {
     std::string path = argc > 1 ? argv[1] : defaultPath;
+    long const rows = qobench::CountArgument(argc, argv, 2, 100000, 10000000);
     if (!std::filesystem::exists(path)) {
 #ifdef _WIN32
+        (void)rows;
         std::printf("%s is missing: run the native bench_xlsx first, or pass a workbook\n", path.c_str());
         return 1;
 #else
-        long const rows = 100000;
-        auto start = std::chrono::steady_clock::now();
+        Stopwatch watch;
         if (RunPython(writer, path + " " + std::to_string(rows)) != 0) {
             std::printf("python3-xlsxwriter could not write %s\n", path.c_str());
             return 1;
         }
-        std::printf("wrote %s (%ld rows x 10 columns) with xlsxwriter in %.2f s\n", path.c_str(), rows, Seconds(start));
+        std::printf("wrote %s (%ld rows x 10 columns) with xlsxwriter in %.2f s\n", path.c_str(), rows, watch.Wall());
 #endif
     }
     std::printf("workbook: %s, %.1f MB\n", path.c_str(), double(std::filesystem::file_size(path)) / 1e6);
 
     try {
         for (int round = 0; round < 3; ++round) {
-            auto start = std::chrono::steady_clock::now();
+            Stopwatch watch;
             CQoXlsxReader xlsx;
             xlsx.Open(path.c_str());
             xlsx.OpenSheet(0);
-            double opened = Seconds(start);
+            double opened = watch.Wall();
             std::vector<CQoXlsxReader::Cell> row;
             long count = 0;
             double sum = 0;
@@ -109,20 +106,23 @@ int main(int argc, char **argv)
                     textBytes += std::size_t(cell.text.GetLength());
                 }
             }
-            std::printf("CQoXlsxReader: %ld rows x %d columns in %.2f s (open and range pass %.2f s; check %.0f/%zu)\n",
-                        count, xlsx.ColumnCount(), Seconds(start), opened, sum, textBytes);
+            double seconds = watch.Wall();
+            std::printf("CQoXlsxReader: %ld rows x %d columns in %.2f s (CPU %.2f s; open and range pass %.2f s;"
+                        " check %.0f/%zu)\n",
+                        count, xlsx.ColumnCount(), seconds, watch.Cpu(), opened, sum, textBytes);
         }
     } catch (CQoException const &e) {
         std::printf("error: %s\n", e.Message());
         return 1;
     }
-    PrintPeakMemory("reading");
+    qobench::PrintPeakMemory("reading");
 #ifndef _WIN32
     for (int round = 0; round < 2; ++round) {
-        auto start = std::chrono::steady_clock::now();
+        Stopwatch watch;
+        double childCpu = qobench::ChildCpuSeconds();
         if (RunPython(reader, path) != 0)
             std::printf("python3-openpyxl did not run\n");
-        std::printf("  (process %.2f s)\n", Seconds(start));
+        std::printf("  (process %.2f s, CPU %.2f s)\n", watch.Wall(), qobench::ChildCpuSeconds() - childCpu);
     }
 #endif
     return 0;

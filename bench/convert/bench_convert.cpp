@@ -1,12 +1,14 @@
 // The whole conversion of the sample program under Wine: the module
 // qoconvert_run.dll converts a project in batch mode (delimited input filter,
 // output source, delimited output filter, Windows-1252 to code page 850) as
-// qoconvert.exe /batch runs it. Prints the input's size, the time, MB/s and
-// the process's peak working set (bench/convert/run.sh runs it).
+// qoconvert.exe /batch runs it. Prints the input's size, the wall and CPU
+// time (of the whole process: the module's threads run in it), MB/s and the
+// process's peak memory (bench/convert/run.sh runs it).
 //
 //     bench_convert.exe <module> <project folder>
 #include <windows.h>
-#include <psapi.h>
+
+#include "BenchMeasure.h"
 
 #include <cstdio>
 
@@ -34,18 +36,13 @@ int main(int argc, char** argv)
 
     char batch[] = "/batch";
     char* args[] = {argv[1], argv[2], batch};
-    LARGE_INTEGER frequency, start, end;
-    QueryPerformanceFrequency(&frequency);
-    QueryPerformanceCounter(&start);
+    qobench::Stopwatch watch;
     int result = entry(3, args);
-    QueryPerformanceCounter(&end);
-    double seconds = (double)(end.QuadPart - start.QuadPart) / (double)frequency.QuadPart;
+    double seconds = watch.Wall(), cpu = watch.Cpu();
 
-    PROCESS_MEMORY_COUNTERS memory = {};
-    memory.cb = sizeof memory;
-    GetProcessMemoryInfo(GetCurrentProcess(), &memory, sizeof memory);
-    std::printf("qoconvert module (Wine): %.1f MB in %.2f s = %.1f MB/s, result %d, peak working set %.1f MB\n", mb,
-                seconds, mb / seconds, result, memory.PeakWorkingSetSize / 1048576.0);
+    std::printf("qoconvert module (%s): %.1f MB in %.2f s = %.1f MB/s (CPU %.2f s), result %d, peak memory %s\n",
+                qobench::UnderWine() ? "Wine" : "Windows", mb, seconds, mb / seconds, cpu, result,
+                qobench::DescribePeakMemory().c_str());
     FreeLibrary(module);
     return result == 0 ? 0 : 1;
 }

@@ -1,17 +1,16 @@
 // Appending through the DAO engine: N rows of ten fields (a number, eight
 // texts, a double) into a new Access-type database with AddNew/SetFieldValue/
-// Update, as an import does. Prints the seconds; bench/dao/run.sh puts them
-// beside sqlite3 .import of the same rows.
+// Update, as an import does. Prints the wall and CPU seconds (the CPU time
+// of the whole process: the engine and the SQLite driver run in it);
+// bench/dao/run.sh puts them beside sqlite3 .import of the same rows.
 //   bench_dao.exe <database file> <rows> [<csv file to write the same rows to>]
 #include "afxdao.h"
 #include "afxdb.h"
 
-#include <psapi.h>
+#include "BenchMeasure.h"
 
 #include <stdio.h>
 #include <stdlib.h>
-
-#include <chrono>
 
 namespace {
 
@@ -42,11 +41,7 @@ int main(int argc, char** argv) {
     fprintf(stderr, "usage: bench_dao <database file> <rows> [<csv file>]\n");
     return 2;
   }
-  long lRows = atol(argv[2]);
-  if (lRows <= 0 || lRows > 100000000) {
-    fprintf(stderr, "rows: 1 to 100000000\n");
-    return 2;
-  }
+  long lRows = qobench::CountArgument(argc, argv, 2, 0, 100000000);
   DeleteFileA(argv[1]);
   if (argc > 3) {
     // The same rows as CSV (Windows-1252 turned UTF-8 as sqlite3 stores it).
@@ -75,13 +70,13 @@ int main(int argc, char** argv) {
     td.CreateField("F9", dbDouble, 8);
     td.Append();
     // What making the values costs alone, so that it can be told apart.
-    auto startValues = std::chrono::steady_clock::now();
+    qobench::Stopwatch values;
     size_t nBytes = 0;
     for (long i = 0; i < lRows; ++i)
       for (int f = 0; f < 10; ++f) nBytes += (size_t)Value(i, f).GetLength();
-    double dValues = std::chrono::duration<double>(std::chrono::steady_clock::now() - startValues).count();
-    printf("making_values rows=%ld seconds=%.2f bytes=%zu\n", lRows, dValues, nBytes);
-    auto start = std::chrono::steady_clock::now();
+    printf("making_values rows=%ld seconds=%.2f cpu_seconds=%.2f bytes=%zu\n", lRows, values.Wall(), values.Cpu(),
+           nBytes);
+    qobench::Stopwatch append;
     CDaoRecordset rs(&db);
     rs.Open(&td);
     for (long i = 0; i < lRows; ++i) {
@@ -90,14 +85,14 @@ int main(int argc, char** argv) {
       rs.Update();
     }
     rs.Close();
-    double dSeconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    double dSeconds = append.Wall(), dCpu = append.Cpu();
     CDaoTableDef check(&db);
     check.Open("T");
     if (getenv("QO_BENCH_ODBC") != NULL) {
       CDatabase odbc;
       odbc.OpenEx(CString("Driver=SQLite3;Database=") + argv[1], CDatabase::noOdbcDialog);
       odbc.ExecuteSQL("delete from T");
-      auto startOdbc = std::chrono::steady_clock::now();
+      qobench::Stopwatch odbcAppend;
       CTenSet set(&odbc);
       set.Open(CRecordset::snapshot, "select * from T", CRecordset::appendOnly | CRecordset::optimizeBulkAdd);
       for (long i = 0; i < lRows; ++i) {
@@ -106,14 +101,14 @@ int main(int argc, char** argv) {
         set.Update();
       }
       set.Close();
-      printf("odbc_append rows=%ld seconds=%.2f\n", lRows,
-             std::chrono::duration<double>(std::chrono::steady_clock::now() - startOdbc).count());
+      printf("odbc_append rows=%ld seconds=%.2f cpu_seconds=%.2f\n", lRows, odbcAppend.Wall(), odbcAppend.Cpu());
     }
-    printf("dao_append rows=%ld seconds=%.2f stored=%ld\n", lRows, dSeconds, check.GetRecordCount());
+    printf("dao_append rows=%ld seconds=%.2f cpu_seconds=%.2f stored=%ld\n", lRows, dSeconds, dCpu,
+           check.GetRecordCount());
 
     // Reading every row forward, then jumping back to the first and to the
     // middle: the peak memory shows whether rows are held.
-    auto startRead = std::chrono::steady_clock::now();
+    qobench::Stopwatch read;
     CDaoRecordset reader(&db);
     reader.Open(dbOpenDynaset, "select * from T");
     double dSum = 0;
@@ -121,12 +116,12 @@ int main(int argc, char** argv) {
     reader.MoveFirst();
     reader.SetAbsolutePosition(lRows / 2);
     long lMiddle = reader.GetFieldValue(0).lVal;
-    double dRead = std::chrono::duration<double>(std::chrono::steady_clock::now() - startRead).count();
-    PROCESS_MEMORY_COUNTERS counters = {};
-    counters.cb = sizeof(counters);
-    GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof(counters));
-    printf("dao_read rows=%ld seconds=%.2f middle=%ld sum=%.0f peak_working_set_mb=%.1f\n", reader.GetRecordCount(),
-           dRead, lMiddle, dSum, counters.PeakWorkingSetSize / 1048576.0);
+    double dRead = read.Wall(), dReadCpu = read.Cpu();
+    qobench::Memory const memory = qobench::ReadMemory();
+    printf("dao_read rows=%ld seconds=%.2f cpu_seconds=%.2f middle=%ld sum=%.0f peak_working_set_mib=%.1f"
+           " start_working_set_mib=%.1f\n",
+           reader.GetRecordCount(), dRead, dReadCpu, lMiddle, dSum, qobench::MiB(memory.peakResident),
+           qobench::MiB(qobench::MemoryAtStart().resident));
   } catch (CDaoException* e) {
     fprintf(stderr, "failed: %s\n", e->m_pErrorInfo != NULL ? (LPCSTR)e->m_pErrorInfo->m_strDescription : "?");
     e->Delete();

@@ -3,7 +3,8 @@
 // QO_PG_CONNECT names a server) PostgreSQL, and the same through the file
 // database filters (CQoOutputFilterDao, CQoInputFilterDao) into an
 // Access-type database. bench/odbc/run.sh runs it beside sqlite3's .import
-// and psql's \copy of the same file.
+// and psql's \copy of the same file. CPU time is this process's: the SQLite
+// driver runs in it, the PostgreSQL server does not.
 //
 //   bench_odbc <delimited file> <folder for the SQLite file>
 #include <CQoException.h>
@@ -14,28 +15,19 @@
 #include <CQoOutputFilterODBC.h>
 
 #include <windows.h>
-#include <psapi.h>
 
-#include <chrono>
+#include "BenchMeasure.h"
+
 #include <cstdio>
 #include <cstdlib>
 #include <string>
 
 namespace {
-typedef std::chrono::steady_clock Clock;
+using qobench::Stopwatch;
 
-double Seconds(Clock::time_point since)
+double WorkingSetMiB()
 {
-    return std::chrono::duration<double>(Clock::now() - since).count();
-}
-
-double WorkingSetMB()
-{
-    PROCESS_MEMORY_COUNTERS counters;
-    counters.cb = sizeof counters;
-    if (!GetProcessMemoryInfo(GetCurrentProcess(), &counters, sizeof counters))
-        return 0;
-    return static_cast<double>(counters.WorkingSetSize) / 1e6;
+    return qobench::MiB(qobench::ReadMemory().resident);
 }
 
 // Copies the delimited file into table "bench" of `out` (text columns of 60),
@@ -56,7 +48,7 @@ void Write(const char* what, Output& out, const char* file, Open open, Close clo
         out.ColumnName(c, name);
         out.SetLength(c, 60);
     }
-    Clock::time_point start = Clock::now();
+    Stopwatch watch;
     open();
     out.Init();
     long rows = 0;
@@ -71,16 +63,17 @@ void Write(const char* what, Output& out, const char* file, Open open, Close clo
         ++rows;
     }
     close();
-    double t = Seconds(start);
-    std::printf("%s wrote %ld rows x %d columns in %.2f s = %.0f rows/s\n", what, rows, cols, t, rows / t);
+    double t = watch.Wall();
+    std::printf("%s wrote %ld rows x %d columns in %.2f s = %.0f rows/s (CPU %.2f s)\n", what, rows, cols, t,
+                rows / t, watch.Cpu());
 }
 
 // Reads every value of the table `in` stands on; prints the rate and the
 // working set, which must not grow with the rows.
 void ReadAll(const char* what, CQoInputFilter& in)
 {
-    double before = WorkingSetMB();
-    Clock::time_point start = Clock::now();
+    double before = WorkingSetMiB();
+    Stopwatch watch;
     long rows = 0;
     std::size_t bytes = 0;
     double at100k = 0;
@@ -91,12 +84,16 @@ void ReadAll(const char* what, CQoInputFilter& in)
             bytes += static_cast<std::size_t>(value.GetLength());
         }
         if (++rows == 100000)
-            at100k = WorkingSetMB();
+            at100k = WorkingSetMiB();
     }
-    double t = Seconds(start);
-    std::printf("%s read %ld rows in %.2f s = %.0f rows/s (%zu value bytes); working set "
-                "%.1f MB before, %.1f MB after 100,000 rows, %.1f MB at the end\n",
-                what, rows, t, rows / t, bytes, before, at100k, WorkingSetMB());
+    double t = watch.Wall();
+    double cpu = watch.Cpu();
+    char after100k[64] = "no 100,000th row";
+    if (rows >= 100000)
+        std::snprintf(after100k, sizeof after100k, "%.1f MiB after 100,000 rows", at100k);
+    std::printf("%s read %ld rows in %.2f s = %.0f rows/s (CPU %.2f s; %zu value bytes); working set "
+                "%.1f MiB before, %s, %.1f MiB at the end\n",
+                what, rows, t, rows / t, cpu, bytes, before, after100k, WorkingSetMiB());
 }
 
 void Odbc(const char* what, const std::string& connect, const char* file)
@@ -143,13 +140,14 @@ int main(int argc, char** argv)
             DeleteFileA(mdb.c_str());
             Dao(mdb, argv[1]);
         }
-        if (only && std::string(only) != "postgres")
-            return 0;
-        if (const char* pg = std::getenv("QO_PG_CONNECT")) {
-            Odbc("PostgreSQL", pg, argv[1]);
-        } else {
-            std::printf("PostgreSQL: QO_PG_CONNECT is not set\n");
+        if (!only || std::string(only) == "postgres") {
+            if (const char* pg = std::getenv("QO_PG_CONNECT")) {
+                Odbc("PostgreSQL", pg, argv[1]);
+            } else {
+                std::printf("PostgreSQL: QO_PG_CONNECT is not set\n");
+            }
         }
+        qobench::PrintPeakMemory("writing and reading the tables");
     } catch (const CQoException& e) {
         std::fprintf(stderr, "bench_odbc: %s\n", e.Message());
         return 1;

@@ -3,13 +3,14 @@
 # file of ROWS rows x 10 columns goes into SQLite and PostgreSQL through the
 # library's ODBC output filter and is read back through its input filter
 # (bench_odbc.exe under Wine), then the same file through `sqlite3 .import`
-# and `psql \copy`. Needs the Windows build (build/win).
+# and `psql \copy`. Needs the Windows build (default build/win).
 #
-#   bench/odbc/run.sh [ROWS]        default 1000000
+#   bench/odbc/run.sh [ROWS] [build folder]        default 1000000 build/win
 set -e
 here=$(cd "$(dirname "$0")" && pwd)
 repo=$(cd "$here/../.." && pwd)
 rows=${1:-1000000}
+build=$(cd "${2:-$repo/build/win}" && pwd)
 work=$(mktemp -d /tmp/qo_bench_odbc.XXXXXX)
 chmod 755 "$work"   # the server runs as postgres
 trap '"$repo/tools/pg-test-server" stop "$work/pg" >/dev/null 2>&1 || true; rm -rf "$work"' EXIT
@@ -34,7 +35,7 @@ connect=$(QO_PG_LOG_STATEMENTS=none "$repo/tools/pg-test-server" start "$work/pg
 port=$(echo "$connect" | sed -n 's/.*Port=\([0-9]*\).*/\1/p')
 
 echo "--- the library (under Wine)"
-QO_PG_CONNECT="$connect" "$repo/tools/session" wine "$repo/build/win/bin/bench_odbc.exe" \
+QO_PG_CONNECT="$connect" "$repo/tools/session" wine "$build/bin/bench_odbc.exe" \
   "Z:$work/bench.csv" "Z:$work" 2>&1 | grep -v '^wine: '
 
 echo "--- native bulk loaders"

@@ -1,14 +1,14 @@
 // The delimited text page on large files: how long from opening the file until
 // the page with its preview has painted for the first time, and how long a jump
 // to the preview's last row takes until that row is painted, beside the file's
-// size and the process's memory before and after. Run by bench/preview/run.sh.
+// size, the CPU time of the runs and the process's memory before and after.
+// Run by bench/preview/run.sh.
 //
 //   bench_preview.exe <folder> [rows ...]        (default: 1000000 10000000)
 //
 // The files (<folder>\preview_<rows>.csv, five fields a row) are made when they
 // are missing or of another size, and kept for the next run.
 #include <afxwin.h>
-#include <psapi.h>
 
 #include <algorithm>
 #include <cstdio>
@@ -19,35 +19,16 @@
 #include "CInputFilterConfigTextVar.h"
 #include "CQoException.h"
 #include "CQoInputFilterTextVar.h"
+#include "BenchMeasure.h"
 
 CWinApp theApp;
 
 namespace {
 
+// Milliseconds on the monotonic clock.
 double Now()
 {
-    static LARGE_INTEGER freq = [] {
-        LARGE_INTEGER f;
-        QueryPerformanceFrequency(&f);
-        return f;
-    }();
-    LARGE_INTEGER t;
-    QueryPerformanceCounter(&t);
-    return 1000.0 * static_cast<double>(t.QuadPart) / static_cast<double>(freq.QuadPart);
-}
-
-struct Memory {
-    double workingMB, privateMB;
-};
-
-Memory ReadMemory()
-{
-    PROCESS_MEMORY_COUNTERS_EX pmc = {};
-    pmc.cb = sizeof(pmc);
-    GetProcessMemoryInfo(GetCurrentProcess(), reinterpret_cast<PROCESS_MEMORY_COUNTERS*>(&pmc), sizeof(pmc));
-    // Wine leaves PrivateUsage at 0; the page-file usage is the same figure there.
-    const SIZE_T privateBytes = pmc.PrivateUsage != 0 ? pmc.PrivateUsage : pmc.PagefileUsage;
-    return {pmc.WorkingSetSize / 1048576.0, privateBytes / 1048576.0};
+    return 1000.0 * qobench::WallSeconds();
 }
 
 // One row: "<n>;Name <n>;Straße <n % 997>;<5-digit code>;<n * 7 % 100000>,<cents>".
@@ -161,7 +142,8 @@ double Median(std::vector<double> v)
 
 void Measure(CFrameWnd* pFrame, const std::string& path, int runs)
 {
-    const Memory before = ReadMemory();
+    const qobench::Memory before = qobench::ReadMemory();
+    const qobench::Stopwatch watch;
     std::vector<double> open, create, paint, total, update, jump, read;
     bool lastShown = true;
     for (int i = 0; i < runs; ++i) {
@@ -175,16 +157,18 @@ void Measure(CFrameWnd* pFrame, const std::string& path, int runs)
         read.push_back(f.read);
         lastShown = lastShown && f.lastShown;
     }
-    const Memory after = ReadMemory();
-    std::printf("%s: %.1f MB, median of %d runs\n", path.c_str(), FileSize(path) / 1048576.0, runs);
+    const double cpu = watch.Cpu(), wall = watch.Wall();
+    const qobench::Memory after = qobench::ReadMemory();
+    std::printf("%s: %.1f MiB, median of %d runs (the %d runs: %.2f s, CPU %.2f s)\n", path.c_str(),
+                qobench::MiB(FileSize(path)), runs, runs, wall, cpu);
     std::printf("  (a) open+create+first paint %.1f ms (open %.1f, page created %.1f, painted %.1f; "
                 "preview Update alone %.1f, of it reading rows 0-999 %.1f); best %.1f\n",
                 Median(total), Median(open), Median(create), Median(paint), Median(update), Median(read),
                 *std::min_element(total.begin(), total.end()));
     std::printf("  (b) jump to the last item until painted %.1f ms; best %.1f; last row shown: %s\n",
                 Median(jump), *std::min_element(jump.begin(), jump.end()), lastShown ? "yes" : "no");
-    std::printf("  memory: working set %.1f -> %.1f MB, private %.1f -> %.1f MB\n", before.workingMB,
-                after.workingMB, before.privateMB, after.privateMB);
+    std::printf("  memory: working set %.1f -> %.1f MiB, private %.1f -> %.1f MiB\n", qobench::MiB(before.resident),
+                qobench::MiB(after.resident), qobench::MiB(before.committed), qobench::MiB(after.committed));
     // What the preview avoids: counting every row of the file.
     CQoInputFilterTextVar counted;
     counted.Init(path.c_str());
@@ -205,7 +189,7 @@ int main(int argc, char** argv)
     }
     const std::string folder = argv[1];
     std::vector<long long> sizes;
-    for (int i = 2; i < argc; ++i) sizes.push_back(std::atoll(argv[i]));
+    for (int i = 2; i < argc; ++i) sizes.push_back(qobench::CountArgument(argc, argv, i, 0, 100000000));
     if (sizes.empty()) sizes = {1000000, 10000000};
 
     CFrameWnd* pFrame = new CFrameWnd;
@@ -224,5 +208,6 @@ int main(int argc, char** argv)
         return 1;
     }
     pFrame->DestroyWindow();
+    qobench::PrintPeakMemory("every file");
     return 0;
 }
