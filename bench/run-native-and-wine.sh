@@ -24,7 +24,9 @@ repo=$(cd "$here/.." && pwd)
 rows=
 case "${1:-}" in
   '' | bench_*) ;;
-  *[!0-9]* | 0*) echo "ROWS must be a whole number from 1 on, not '$1'" >&2; exit 2 ;;
+  *[!0-9]* | 0*)
+    echo "'$1' is neither a row count (a whole number from 1 on) nor a benchmark (bench_...)" >&2
+    exit 2 ;;
   *) rows=$1; shift ;;
 esac
 benches=${*:-bench_textvar bench_dbase bench_write bench_xlsx}
