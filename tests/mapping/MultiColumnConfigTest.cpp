@@ -1,0 +1,492 @@
+// The combination field page on real windows over a delimited file: in read mode
+// the file's columns are split by their functions' combinations, in write mode
+// output columns are made, named, given functions (lists and the preview's popup
+// menu), reordered by dragging a header with the real mouse and replaced by all
+// functions; the split and composed values are read through the page's filter and
+// source, the dialogs it opens answered as a user would.
+#include <gtest/gtest.h>
+
+#include <CQoInputFilterTextVar.h>
+#include <CQoOutputSource.h>
+
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "CMultiColumnConfig.h"
+#include "MenuDriver.h"
+#include "MfcTestHost.h"
+#include "resource.h"
+
+namespace {
+
+const int kNotifierId = 11;
+enum { kName = 1, kFirst = 2, kZip = 3, kTown = 4, kPhone = 5, kNameFirst = 20000, kZipTown = 20001 };
+
+// The application's display order: by name.
+class CByName : public CFunctionManager::CSorter {
+public:
+    void Sort(std::vector<CFunctionManager::CFunction>& functions) override
+    {
+        std::sort(functions.begin(), functions.end(),
+                  [](const CFunctionManager::CFunction& a, const CFunctionManager::CFunction& b) {
+                      return a.GetName().Compare(b.GetName()) < 0;
+                  });
+    }
+};
+
+class CCountingListener : public CModifiedListener {
+public:
+    int m_nCalls = 0;
+    int ModifiedListenerSetModified(int, int nNotifierId) override
+    {
+        EXPECT_EQ(kNotifierId, nNotifierId);
+        ++m_nCalls;
+        return 1;
+    }
+};
+
+// The application's output source: one column per plain function, read from a file.
+class CFileSource : public CQoOutputSource {
+public:
+    explicit CFileSource(CQoInputFilter& file) : m_file(file) {}
+    int GetNumColumns() override { return m_file.NumCols(); }
+    long GetNumRows() override { return m_file.NumRows(); }
+    void GetValue(long row, int col, CQoString& value) override
+    {
+        value.Empty();
+        if (m_file.AbsoluteRow(row)) m_file.Value(col, value);
+    }
+    void GetColumnName(int col, CQoString& name) override { m_file.ColName(col, name); }
+
+private:
+    CQoInputFilter& m_file;
+};
+
+class CTestPage : public CMultiColumnConfig {
+public:
+    CTestPage(CFunctionManager& manager, CFunctionManager::CSorter& sorter, bool bRead)
+        : CMultiColumnConfig(manager, sorter, bRead, kNotifierId, NULL)
+    {
+    }
+    CComboBox& Functions() { return m_cbFunctions; }
+    CComboBox& Names() { return m_cbNames; }
+    CColoredInputFilterListCtrl& Preview() { return m_list; }
+    CString Caption(int col)
+    {
+        CString text;
+        DWORD clr = 0, clrSel = 0;
+        bool bold = false;
+        m_list.GetColoredItem(0, col, text, clr, clrSel, bold);
+        return text;
+    }
+};
+
+std::vector<std::string> Items(CComboBox& combo)
+{
+    std::vector<std::string> items;
+    for (int i = 0; i < combo.GetCount(); ++i) {
+        CString text;
+        combo.GetLBText(i, text);
+        items.push_back(text.GetString());
+    }
+    return items;
+}
+
+class MultiColumnConfigTest : public qotest::HostFrameTest {
+protected:
+    MultiColumnConfigTest() : HostFrameTest("Kombifelder", 700, 560) {}
+
+    void SetUp() override
+    {
+        HostFrameTest::SetUp();
+        const char* plain[] = {"Name", "Vorname", "PLZ", "Ort", "Telefon"};
+        for (long id = kName; id <= kPhone; ++id) {
+            CFunctionManager::CFunction f(id, plain[id - 1]);
+            m_manager.AddFunction(f);
+        }
+        AddCombination(kNameFirst, "Name, Vorname", {{kName, ""}, {kFirst, ", "}});
+        AddCombination(kZipTown, "PLZ Ort", {{kZip, ""}, {kTown, " "}});
+    }
+    void TearDown() override
+    {
+        if (m_page != NULL && ::IsWindow(m_page->m_hWnd)) m_page->DestroyWindow();
+        delete m_page;
+        HostFrameTest::TearDown();
+    }
+    void AddCombination(long id, const char* name, std::vector<std::pair<long, const char*>> parts)
+    {
+        std::vector<CFunctionManager::CCombiPart> combination;
+        for (const auto& p : parts) combination.push_back(CFunctionManager::CCombiPart(p.first, p.second, false));
+        CFunctionManager::CFunction f(id, name);
+        f.SetCombination(combination);
+        m_manager.AddFunction(f);
+    }
+
+    // Read mode over the customer file (names in the first row).
+    void OpenReader(std::vector<long> functions)
+    {
+        m_file.Delimiter(';');
+        m_file.SetFirstRowHasNames(true);
+        m_file.Init(qotest::WriteTempFile("qo_multi_read.csv", "Kunde;Anschrift;Telefon\r\n"
+                                                               "Meier, Hans;50667 K\xf6ln;0221 12345\r\n"
+                                                               "Wei\xdf, Eva;89073 Ulm;0731 5555\r\n")
+                        .c_str());
+        m_page = new CTestPage(m_manager, m_sorter, true);
+        m_page->SetOuterColumnFunctions(functions);
+        Show();
+        m_page->SetInputFilter(&m_file);
+    }
+    // Write mode over a file holding one column per plain function, in id order.
+    void OpenWriter()
+    {
+        m_file.Delimiter(';');
+        m_file.SetFirstRowHasNames(true);
+        m_file.Init(qotest::WriteTempFile("qo_multi_write.csv", "Name;Vorname;PLZ;Ort;Telefon\r\n"
+                                                                "Meier;Hans;50667;K\xf6ln;0221 12345\r\n"
+                                                                "Wei\xdf;;89073;Ulm;0731 5555\r\n")
+                        .c_str());
+        m_page = new CTestPage(m_manager, m_sorter, false);
+        m_page->SetOutputSource(&m_source);  // before the window: the page start applies it again
+        Show();
+    }
+    void Show()
+    {
+        ASSERT_TRUE(m_page->Create(m_pFrame));
+        m_page->AddModifiedListener(&m_listener);
+        qotest::ShowChild(*m_page, 5, 5);
+    }
+    // Output columns made in code, as an application restoring its project does.
+    void Columns(std::vector<std::pair<const char*, long>> columns)
+    {
+        for (const auto& c : columns) {
+            m_page->AddOuterColumn(c.first);
+            m_page->SetOuterColumnFunction(m_page->GetNumOuterColumns() - 1, c.second);
+        }
+        m_page->RebuildNameList();
+        m_page->DisplayWriteList();
+        m_listener.m_nCalls = 0;
+    }
+
+    void Choose(CComboBox& combo, const char* text)
+    {
+        const int index = combo.FindStringExact(-1, text);
+        ASSERT_GE(index, 0) << text;
+        combo.SetCurSel(index);
+        m_page->SendMessage(WM_COMMAND, MAKEWPARAM(combo.GetDlgCtrlID(), CBN_SELCHANGE), (LPARAM)combo.m_hWnd);
+    }
+    void Click(int id) { qotest::ClickMiddle(m_page->GetDlgItem(id)->m_hWnd); }
+    // The rename dialog, answered with `name`.
+    qotest::DialogScript Rename(const char* name, std::string* proposed = NULL)
+    {
+        return [=](qotest::Dialog& d) {
+            EXPECT_EQ("Feldbezeichnung bearbeiten...", d.Title());
+            EXPECT_EQ("Feldbezeichnung", d.Text(IDC_INPUT_PROMPT));
+            if (proposed != NULL) *proposed = d.Text(IDC_INPUT_VALUE);
+            d.SetText(IDC_INPUT_VALUE, name);
+            d.Press(IDOK);
+        };
+    }
+    static qotest::DialogScript Message(std::string* text, int answer = IDOK)
+    {
+        return [=](qotest::Dialog& d) {
+            *text = d.MessageText();
+            d.Press(answer);
+        };
+    }
+
+    // Row `row` of the page's composed output (write mode), joined by '|'.
+    std::string OutputRow(long row)
+    {
+        CQoOutputSource* out = m_page->GetOutputSource();
+        std::string line;
+        for (int c = 0; c < out->GetNumColumns(); ++c) {
+            CQoString value;
+            out->GetValue(row, c, value);
+            line += (c ? "|" : "") + std::string(value.GetString());
+        }
+        return line;
+    }
+    std::string OutputNames()
+    {
+        CQoOutputSource* out = m_page->GetOutputSource();
+        std::string line;
+        for (int c = 0; c < out->GetNumColumns(); ++c) {
+            CQoString name;
+            out->GetColumnName(c, name);
+            line += (c ? "|" : "") + std::string(name.GetString());
+        }
+        return line;
+    }
+    // Row `row` of the split file (read mode).
+    std::string InnerRow(long row)
+    {
+        CQoInputFilter* in = m_page->GetInnerInputFilter();
+        std::string line;
+        EXPECT_TRUE(in->AbsoluteRow(row));
+        for (int c = 0; c < in->NumCols(); ++c) {
+            CQoString value;
+            in->Value(c, value);
+            line += (c ? "|" : "") + std::string(value.GetString());
+        }
+        return line;
+    }
+    std::string Captions()
+    {
+        std::string line;
+        for (int c = 0; c < m_page->Preview().GetHeaderCtrl()->GetItemCount(); ++c)
+            line += (c ? "|" : "") + std::string(m_page->Caption(c).GetString());
+        return line;
+    }
+    std::string FunctionName(long id)
+    {
+        CFunctionManager::CFunction f(0, "");
+        return m_manager.GetFunction(id, f) ? f.GetName().GetString() : "?";
+    }
+    // A point in the preview's data rows under column `col`.
+    CPoint PreviewPoint(int col)
+    {
+        CRect row, head;
+        m_page->Preview().GetItemRect(1, &row, LVIR_BOUNDS);
+        m_page->Preview().GetHeaderCtrl()->GetItemRect(col, &head);
+        return CPoint(head.CenterPoint().x, row.CenterPoint().y);
+    }
+    // A right click whose release is queued with the press (the list view waits in
+    // a loop of its own for the release).
+    void RightClick(int col)
+    {
+        const CPoint at = PreviewPoint(col);
+        qotest::MoveMouse(m_page->Preview().m_hWnd, at.x, at.y);
+        qotest::InjectButton(qotest::MouseButton::Right, true);
+        qotest::InjectButton(qotest::MouseButton::Right, false);
+        qotest::PumpFor(200);
+    }
+
+    CFunctionManager m_manager;
+    CByName m_sorter;
+    CQoInputFilterTextVar m_file;
+    CFileSource m_source{m_file};
+    CCountingListener m_listener;
+    CTestPage* m_page = NULL;
+};
+
+TEST_F(MultiColumnConfigTest, ReadModeSplitsEachColumnIntoTheParts)
+{
+    // Kunde holds a combination of two, Anschrift one of two, Telefon nothing
+    // (the manager has no function 0).
+    OpenReader({kNameFirst, kZipTown});
+    EXPECT_EQ((std::vector<std::string>{"Kunde", "Anschrift", "Telefon"}), Items(m_page->Names()));
+    EXPECT_EQ((std::vector<std::string>{"Name", "Name, Vorname", "Ort", "PLZ", "PLZ Ort", "Telefon", "Vorname"}),
+              Items(m_page->Functions()));
+    EXPECT_EQ("Name, Vorname", qotest::WindowText(m_page->Functions().m_hWnd));
+    EXPECT_EQ("Meier|Hans|50667|K\xf6ln", InnerRow(0));
+    EXPECT_EQ("Wei\xdf|Eva|89073|Ulm", InnerRow(1));
+    EXPECT_EQ("Name|Vorname|PLZ|Ort", Captions());
+    EXPECT_STREQ("Kunde", qotest::ColumnTitle(m_page->Preview(), 1)) << "the parts carry the file's name";
+    EXPECT_EQ((std::vector<long>{kName, kFirst, kZip, kTown}),
+              (std::vector<long>{m_page->GetInnerFunction(0), m_page->GetInnerFunction(1), m_page->GetInnerFunction(2),
+                                 m_page->GetInnerFunction(3)}));
+    for (int id : {IDC_MULTI_NEW, IDC_MULTI_DELETE, IDC_MULTI_SELECT_ALL})
+        EXPECT_FALSE(m_page->GetDlgItem(id)->IsWindowVisible()) << id;
+    for (int id : {IDC_MULTI_FUNC_TO_NAMES, IDC_MULTI_EDIT_NAME})
+        EXPECT_FALSE(m_page->GetDlgItem(id)->IsWindowEnabled()) << id << ": the file names its columns";
+
+    // Telefon takes a function from the list; a click on a part's header selects its column.
+    Choose(m_page->Names(), "Telefon");
+    EXPECT_EQ(-1, m_page->Functions().GetCurSel()) << "a column without a function shows none";
+    Choose(m_page->Functions(), "Telefon");
+    EXPECT_EQ(1, m_listener.m_nCalls);
+    EXPECT_EQ(kPhone, m_page->GetOuterFunction(2));
+    EXPECT_EQ(-1, m_page->GetOuterFunction(3));
+    EXPECT_EQ("Meier|Hans|50667|K\xf6ln|0221 12345", InnerRow(0));
+    CRect head;
+    m_page->Preview().GetHeaderCtrl()->GetItemRect(3, &head);
+    qotest::Click(m_page->Preview().GetHeaderCtrl()->m_hWnd, head.CenterPoint().x, head.CenterPoint().y);
+    EXPECT_EQ(1, m_page->Names().GetCurSel()) << "Ort is a part of Anschrift";
+    EXPECT_EQ("PLZ Ort", qotest::WindowText(m_page->Functions().m_hWnd));
+    qotest::CaptureWindow(m_page->m_hWnd, qotest::CapturePath("multicolumn-4038-read.png").c_str());
+}
+
+TEST_F(MultiColumnConfigTest, PopupMenuOfAPartOffersTheFunctionsOfItsColumn)
+{
+    OpenReader({kNameFirst, kZipTown, kPhone});
+    m_page->SetDontShowLimit(kZipTown);  // PLZ Ort is not offered
+    m_page->InitFunctionList();
+    qotest::MenuDriver menus;
+    menus.Expect([&](qotest::Menu& m) {
+        const std::vector<qotest::MenuItem> items = m.Items();
+        EXPECT_EQ((std::vector<std::string>{"Kunde", "", "Feldbezeichnung bearbeiten...", "Funktionalit\xe4ten bearbeiten...",
+                                            "", "Name", "Name, Vorname", "Ort", "PLZ", "Telefon", "Vorname"}),
+                  m.Labels());
+        EXPECT_TRUE(items[0].isDefault);
+        EXPECT_FALSE(items[0].enabled);
+        EXPECT_TRUE(items[2].grayed) << "the file names its columns";
+        m.ChooseLabel("Name");
+    });
+    RightClick(1);  // Vorname, the second part of Kunde
+    EXPECT_TRUE(menus.Done());
+    EXPECT_EQ(kName, m_page->GetOuterFunction(0));
+    EXPECT_EQ("Meier, Hans|50667|K\xf6ln|0221 12345", InnerRow(0)) << "Kunde is taken whole";
+    EXPECT_EQ(1, m_listener.m_nCalls);
+
+    // The editing of the functions from the menu; cancelled, it changes nothing.
+    std::string title;
+    menus.Expect([&](qotest::Menu& m) { m.Choose(CMultiColumnConfig::kEditFunctionsCmd); });
+    qotest::Answering({[&](qotest::Dialog& d) {
+                          title = d.Title();
+                          d.Press(IDCANCEL);
+                      }},
+                      [&] { RightClick(0); });
+    EXPECT_EQ("Definitionen bearbeiten...", title);
+    EXPECT_EQ(7, m_manager.GetNumFunctions());
+    EXPECT_EQ(1, m_listener.m_nCalls);
+}
+
+TEST_F(MultiColumnConfigTest, WriteModeComposesTheOutputColumnsAsTheUserNamesThem)
+{
+    OpenWriter();
+    EXPECT_EQ(0, m_page->GetOutputSource()->GetNumColumns());
+    for (const char* name : {"Kunde", "Anschrift"}) {
+        std::string proposed;
+        qotest::Answering({Rename(name, &proposed)}, [&] { Click(IDC_MULTI_NEW); });
+        EXPECT_EQ("Neue_Spalte", proposed);
+    }
+    EXPECT_EQ("Kunde|Anschrift", OutputNames());
+    EXPECT_EQ(-1, m_page->Functions().GetCurSel());
+    Choose(m_page->Names(), "Kunde");
+    Choose(m_page->Functions(), "Name, Vorname");
+    Choose(m_page->Names(), "Anschrift");
+    Choose(m_page->Functions(), "PLZ Ort");
+    EXPECT_EQ("Meier, Hans|50667 K\xf6ln", OutputRow(0));
+    EXPECT_EQ("Wei\xdf|89073 Ulm", OutputRow(1)) << "no separator before an empty part";
+    EXPECT_EQ("Name, Vorname|PLZ Ort", Captions());
+    EXPECT_STREQ("Anschrift", qotest::ColumnTitle(m_page->Preview(), 1));
+    qotest::CaptureWindow(m_page->m_hWnd, qotest::CapturePath("multicolumn-4038.png").c_str());
+
+    // Deleting the selected column.
+    Choose(m_page->Names(), "Kunde");
+    Click(IDC_MULTI_DELETE);
+    EXPECT_EQ("Anschrift", OutputNames());
+    EXPECT_EQ("50667 K\xf6ln", OutputRow(0));
+}
+
+TEST_F(MultiColumnConfigTest, ARenameThatClashesInAnyCaseChangesNothing)
+{
+    OpenWriter();
+    Columns({{"Kunde", kNameFirst}, {"Anschrift", kZipTown}});
+    struct Case {
+        const char* typed;
+        const char* message;  // empty: accepted
+        const char* column;   // the second column's name afterwards
+        const char* function; // the name of its function afterwards
+    } cases[] = {
+        {"KUNDE", "Diese Bezeichnung ist schon vergeben!", "Anschrift", "PLZ Ort"},
+        {"telefon", "Diese Bezeichnung ist schon vergeben!", "Anschrift", "PLZ Ort"},
+        {"", "Bitte geben Sie eine Bezeichnung ein!", "Anschrift", "PLZ Ort"},
+        {"anschrift", "", "anschrift", "anschrift"},
+        {"Wohnort", "", "Wohnort", "Wohnort"},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.typed);
+        m_listener.m_nCalls = 0;
+        m_page->Names().SetCurSel(1);
+        std::string message;
+        std::vector<qotest::DialogScript> scripts{Rename(c.typed)};
+        if (*c.message) scripts.push_back(Message(&message));
+        qotest::Answering(scripts, [&] { Click(IDC_MULTI_EDIT_NAME); });
+        EXPECT_EQ(c.message, message);
+        EXPECT_EQ(std::string("Kunde|") + c.column, OutputNames());
+        EXPECT_EQ(c.function, FunctionName(kZipTown));
+        EXPECT_EQ(*c.message ? 0 : 1, m_listener.m_nCalls);
+        EXPECT_EQ((std::vector<std::string>{"Kunde", c.column}), Items(m_page->Names()));
+    }
+    EXPECT_EQ("Name, Vorname|PLZ Ort", Captions()) << "a combination is captioned by its parts";
+    EXPECT_EQ("Meier, Hans|50667 K\xf6ln", OutputRow(0));
+}
+
+TEST_F(MultiColumnConfigTest, FunctionNamesBecomeColumnNamesUnlessTwoWouldClash)
+{
+    OpenWriter();
+    struct Case {
+        const char* what;
+        std::vector<std::pair<const char*, long>> columns;
+        bool all;
+        const char* message;
+        const char* names;
+    } cases[] = {
+        {"the current field", {{"Feld 1", kName}, {"Feld 2", kZipTown}}, false, "", "Name|Feld 2"},
+        {"all fields", {{"Feld 1", kName}, {"Feld 2", kZipTown}, {"Feld 3", 0}}, true, "", "Name|PLZ Ort|Feld 3"},
+        {"two would be called Name", {{"Feld 1", kName}, {"Feld 2", kFirst}, {"Feld 3", kName}}, true,
+         "Diese Bezeichnung ist schon vergeben!", "Feld 1|Feld 2|Feld 3"},
+        {"the current one would be called like another", {{"Feld 1", kName}, {"name", kFirst}}, false,
+         "Diese Bezeichnung ist schon vergeben!", "Feld 1|name"},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        while (m_page->GetNumOuterColumns() > 0) m_page->RemoveOuterColumn(0);
+        Columns(c.columns);
+        std::string message;
+        std::vector<qotest::DialogScript> scripts{[&](qotest::Dialog& d) {
+            EXPECT_EQ("Feldbezeichnungen...", d.Title());
+            d.Check(c.all ? IDC_FUNC_TO_NAMES_ALL : IDC_FUNC_TO_NAMES_CURRENT);
+            d.Press(IDOK);
+        }};
+        if (*c.message) scripts.push_back(Message(&message));
+        qotest::Answering(scripts, [&] { Click(IDC_MULTI_FUNC_TO_NAMES); });
+        EXPECT_EQ(c.message, message);
+        EXPECT_EQ(c.names, OutputNames());
+    }
+}
+
+TEST_F(MultiColumnConfigTest, AllColumnsReplaceTheUsersOnlyAfterYes)
+{
+    OpenWriter();
+    Columns({{"Kunde", kNameFirst}});
+    for (int answer : {IDNO, IDYES}) {
+        SCOPED_TRACE(answer);
+        std::string message;
+        qotest::Answering({Message(&message, answer)}, [&] { Click(IDC_MULTI_SELECT_ALL); });
+        EXPECT_EQ("Das Ausw\xe4hlen aller vorhandenen Spalten \xfc"
+                  "berschreibt Ihre bisherigen Einstellungen.\nSind Sie sicher?",
+                  message);
+    }
+    EXPECT_EQ("Feld 1|Feld 2|Feld 3|Feld 4|Feld 5|Feld 6|Feld 7", OutputNames());
+    EXPECT_EQ("Meier|Hans|50667|K\xf6ln|0221 12345|Meier, Hans|50667 K\xf6ln", OutputRow(0));
+    std::vector<long> functions;
+    for (int i = 0; i < m_page->GetNumOuterColumns(); ++i) functions.push_back(m_page->GetOuterFunction(i));
+    EXPECT_EQ((std::vector<long>{kName, kFirst, kZip, kTown, kPhone, kNameFirst, kZipTown}), functions);
+    EXPECT_EQ(1 + 7, m_listener.m_nCalls) << "one removal and seven additions";
+}
+
+TEST_F(MultiColumnConfigTest, DraggingAHeaderToTheFrontMovesTheColumnWithItsFunction)
+{
+    OpenWriter();
+    Columns({{"Nachname", kName}, {"Vorname", kFirst}, {"Anschrift", kZipTown}});
+    qotest::PumpApp(200);  // the first paint learns the order
+    CHeaderCtrl* header = m_page->Preview().GetHeaderCtrl();
+    CRect first, third;
+    header->GetItemRect(0, &first);
+    header->GetItemRect(2, &third);
+    const int y = first.CenterPoint().y;
+    qotest::Drag(header->m_hWnd, {third.CenterPoint().x, y}, {first.left + 3, y});
+    ASSERT_TRUE(qotest::WaitFor(
+        [&] {
+            qotest::PumpApp(50);
+            return m_listener.m_nCalls > 0;
+        },
+        3000))
+        << "the drag was not noticed";
+    qotest::PumpApp(300);  // the order put back is painted and noticed too
+
+    EXPECT_EQ("Anschrift|Nachname|Vorname", OutputNames());
+    EXPECT_EQ("50667 K\xf6ln|Meier|Hans", OutputRow(0));
+    EXPECT_EQ((std::vector<long>{kZipTown, kName, kFirst}),
+              (std::vector<long>{m_page->GetOuterFunction(0), m_page->GetOuterFunction(1), m_page->GetOuterFunction(2)}));
+    int order[3] = {-1, -1, -1};
+    m_page->Preview().GetColumnOrderArray(order, 3);
+    EXPECT_EQ((std::vector<int>{0, 1, 2}), std::vector<int>(order, order + 3));
+    EXPECT_EQ("PLZ Ort|Name|Vorname", Captions());
+    EXPECT_EQ(1, m_listener.m_nCalls);
+}
+
+}  // namespace
