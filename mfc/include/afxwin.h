@@ -690,6 +690,9 @@ public:
   BOOL DrawIcon(POINT point, HICON hIcon);
   BOOL BitBlt(int x, int y, int nWidth, int nHeight, CDC* pSrcDC, int xSrc, int ySrc, DWORD dwRop);
   int IntersectClipRect(LPCRECT lpRect);
+  BOOL PatBlt(int x, int y, int nWidth, int nHeight, DWORD dwRop);
+  // A brush of alternating pixels, for drawing with PATINVERT (drag marks); shared, never deleted.
+  static CBrush* PASCAL GetHalftoneBrush();
 
   // Text
   virtual int DrawText(LPCTSTR lpszString, int nCount, LPRECT lpRect, UINT nFormat);
@@ -1235,6 +1238,77 @@ public:
 
 protected:
   virtual BOOL OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* pResult);
+};
+
+// Sent to the parent (WM_COMMAND) when the user ticked or unticked an item of a check list box.
+#define CLBN_CHKCHANGE 40
+
+struct AFX_CHECK_DATA;
+struct AFX_CHECKLIST_STATE;
+
+// An owner-drawn list box (LBS_OWNERDRAWFIXED or LBS_OWNERDRAWVARIABLE, with
+// LBS_HASSTRINGS) with a check box before every item. The check state (0, 1,
+// or 2 for indeterminate) and an item's enabled state live beside the item;
+// SetItemData/GetItemData keep the caller's own data untouched. A click in the
+// box or the space bar toggles the check of an enabled item (auto styles) and
+// tells the parent with CLBN_CHKCHANGE; a disabled item takes no clicks.
+class AFX_API CCheckListBox : public CListBox {
+  DECLARE_DYNAMIC(CCheckListBox)
+public:
+  CCheckListBox();
+  virtual ~CCheckListBox();
+  virtual BOOL Create(DWORD dwStyle, const RECT& rect, CWnd* pParentWnd, UINT nID);
+
+  // BS_CHECKBOX, BS_AUTOCHECKBOX (the default), BS_3STATE or BS_AUTO3STATE.
+  void SetCheckStyle(UINT nStyle);
+  UINT GetCheckStyle() const;
+  void SetCheck(int nIndex, int nCheck);
+  // 0 for an item that was never ticked and for an index outside the list.
+  int GetCheck(int nIndex);
+  void Enable(int nIndex, BOOL bEnabled = TRUE);
+  BOOL IsEnabled(int nIndex);
+
+  // Where the box of an item is drawn; rectCheckBox comes centred at the item's left.
+  virtual CRect OnGetCheckPosition(CRect rectItem, CRect rectCheckBox);
+  // Draws the item's text right of its box (lpDrawItemStruct->rcItem starts there).
+  virtual void DrawItem(LPDRAWITEMSTRUCT lpDrawItemStruct);
+  virtual void MeasureItem(LPMEASUREITEMSTRUCT lpMeasureItemStruct);
+
+protected:
+  virtual void PreSubclassWindow();
+  virtual BOOL OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* pResult);
+  void PreDrawItem(LPDRAWITEMSTRUCT lpDrawItemStruct);
+  void PreMeasureItem(LPMEASUREITEMSTRUCT lpMeasureItemStruct);
+  int PreCompareItem(LPCOMPAREITEMSTRUCT lpCompareItemStruct);
+  void PreDeleteItem(LPDELETEITEMSTRUCT lpDeleteItemStruct);
+  // The item at point (-1 for none) and whether point lies in its box.
+  int CheckFromPoint(CPoint point, BOOL& bInCheck);
+  void InvalidateCheck(int nIndex);
+  // Gives every selected item of a multiple-selection list the check nCheck.
+  void SetSelectionCheck(int nCheck);
+  int CalcMinimumItemHeight();
+
+  afx_msg void OnLButtonDown(UINT nFlags, CPoint point);
+  afx_msg void OnLButtonDblClk(UINT nFlags, CPoint point);
+  afx_msg void OnKeyDown(UINT nChar, UINT nRepCnt, UINT nFlags);
+  afx_msg int OnCreate(LPCREATESTRUCT lpCreateStruct);
+  afx_msg void OnDestroy();
+  afx_msg LRESULT OnSetFont(WPARAM wParam, LPARAM lParam);
+  afx_msg LRESULT OnLBGetItemData(WPARAM wParam, LPARAM lParam);
+  afx_msg LRESULT OnLBSetItemData(WPARAM wParam, LPARAM lParam);
+  DECLARE_MESSAGE_MAP()
+
+  UINT m_nStyle;
+  AFX_CHECKLIST_STATE* m_pState;
+
+private:
+  // The item's check data, made on first need when bCreate; NULL for no such item.
+  AFX_CHECK_DATA* CheckData(int nIndex, BOOL bCreate);
+  // The check data that d points to, NULL when d is the user's own value.
+  AFX_CHECK_DATA* Known(DWORD_PTR d) const;
+  // The user's toggle of nIndex in the current check style; false when it is not toggled.
+  bool Toggle(int nIndex);
+  void NotifyCheckChange();
 };
 
 class AFX_API CComboBox : public CWnd {

@@ -1,0 +1,210 @@
+// The check list box on a real window: the caller's item data kept apart from
+// the check and enabled state (also in WM_DELETEITEM), real clicks in the box
+// and on the text, the space bar in each check style, the parent's
+// CLBN_CHKCHANGE, and the boxes as the screen shows them.
+#include <gtest/gtest.h>
+
+#include <afxwin.h>
+
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "Capture.h"
+#include "DialogDriver.h"
+#include "Input.h"
+
+namespace {
+
+const UINT kListId = 7;
+
+class CCheckParent : public CFrameWnd {
+public:
+    int m_nChanges = 0;
+
+protected:
+    void OnCheckChange() { ++m_nChanges; }
+    DECLARE_MESSAGE_MAP()
+};
+
+BEGIN_MESSAGE_MAP(CCheckParent, CFrameWnd)
+    ON_CONTROL(CLBN_CHKCHANGE, kListId, OnCheckChange)
+END_MESSAGE_MAP()
+
+// Remembers the item data that each WM_DELETEITEM carried back to the list.
+class CRecordingCheckList : public CCheckListBox {
+public:
+    std::vector<DWORD_PTR> m_deleted;
+    void DeleteItem(LPDELETEITEMSTRUCT lpDeleteItemStruct) override { m_deleted.push_back(lpDeleteItemStruct->itemData); }
+};
+
+class CheckListTest : public ::testing::Test {
+protected:
+    void SetUp() override
+    {
+        m_pFrame = new CCheckParent;
+        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW)), "Haken",
+                                       WS_OVERLAPPEDWINDOW | WS_VISIBLE, 20, 20, 320, 260, NULL, NULL));
+        ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | WS_BORDER | WS_VSCROLL | LBS_NOTIFY | LBS_OWNERDRAWFIXED |
+                                      LBS_HASSTRINGS | LBS_NOINTEGRALHEIGHT,
+                                  CRect(10, 10, 230, 190), m_pFrame, kListId));
+        m_list.SetFont(CFont::FromHandle((HFONT)::GetStockObject(DEFAULT_GUI_FONT)));
+        for (const char* text : {"Alpha", "Beta", "Gamma", "Delta"}) m_list.AddString(text);
+        qotest::BringToFront(m_pFrame->m_hWnd);
+    }
+    void TearDown() override
+    {
+        if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();
+        qotest::PumpFor(30);
+    }
+
+    CRect Item(int i)
+    {
+        CRect rc;
+        m_list.GetItemRect(i, &rc);
+        return rc;
+    }
+    void ClickBox(int i) { qotest::Click(m_list.m_hWnd, Item(i).left + 8, Item(i).CenterPoint().y); }
+    void ClickText(int i) { qotest::Click(m_list.m_hWnd, Item(i).left + 60, Item(i).CenterPoint().y); }
+    std::vector<int> Checks()
+    {
+        std::vector<int> checks;
+        for (int i = 0; i < m_list.GetCount(); ++i) checks.push_back(m_list.GetCheck(i));
+        return checks;
+    }
+
+    CCheckParent* m_pFrame = nullptr;
+    CRecordingCheckList m_list;
+};
+
+}  // namespace
+
+TEST_F(CheckListTest, ItemDataStaysTheCallersBesideCheckAndEnabledState)
+{
+    EXPECT_EQ(1, m_list.GetItemHeight(0) >= 15);  // room for the box
+    ASSERT_EQ(0, m_list.SetItemData(0, 1000));
+    m_list.SetCheck(0, 1);
+    m_list.SetCheck(1, 2);
+    m_list.SetItemData(1, (DWORD_PTR)-7);
+    m_list.Enable(2, FALSE);
+
+    struct {
+        int index;
+        DWORD_PTR data;
+        int check;
+        BOOL enabled;
+    } const cases[] = {
+        {0, 1000, 1, TRUE}, {1, (DWORD_PTR)-7, 2, TRUE}, {2, 0, 0, FALSE}, {3, 0, 0, TRUE}, {99, (DWORD_PTR)LB_ERR, 0, TRUE},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.index);
+        EXPECT_EQ(c.data, m_list.GetItemData(c.index));
+        // Whoever asks the window itself gets the same answer.
+        EXPECT_EQ((LRESULT)c.data, ::SendMessageA(m_list.m_hWnd, LB_GETITEMDATA, c.index, 0));
+        EXPECT_EQ(c.check, m_list.GetCheck(c.index));
+        EXPECT_EQ(c.enabled, m_list.IsEnabled(c.index));
+    }
+    EXPECT_EQ(LB_ERR, m_list.SetItemData(99, 5));
+
+    // A deleted item and the items that go with the window hand back the caller's data.
+    m_list.DeleteString(1);
+    EXPECT_EQ(std::vector<DWORD_PTR>{(DWORD_PTR)-7}, m_list.m_deleted);
+    EXPECT_EQ(0, m_list.GetCheck(1));  // Gamma moved up, with its own state
+    EXPECT_FALSE(m_list.IsEnabled(1));
+    m_list.DestroyWindow();
+    std::vector<DWORD_PTR> rest(m_list.m_deleted.begin() + 1, m_list.m_deleted.end());
+    std::sort(rest.begin(), rest.end());
+    EXPECT_EQ((std::vector<DWORD_PTR>{0, 0, 1000}), rest);
+}
+
+TEST_F(CheckListTest, AClickInTheBoxTogglesAndTellsTheParentAClickOnTheTextSelects)
+{
+    m_list.Enable(3, FALSE);
+    struct {
+        const char* what;
+        int item;
+        bool inBox;
+        std::vector<int> checks;
+        int changes;
+        int selected;
+    } const steps[] = {
+        {"box of Beta", 1, true, {0, 1, 0, 0}, 1, 1},
+        {"text of Gamma", 2, false, {0, 1, 0, 0}, 1, 2},
+        {"box of Beta again", 1, true, {0, 0, 0, 0}, 2, 1},
+        {"box of disabled Delta", 3, true, {0, 0, 0, 0}, 2, 1},
+        {"text of disabled Delta", 3, false, {0, 0, 0, 0}, 2, 1},
+        {"box of Alpha", 0, true, {1, 0, 0, 0}, 3, 0},
+    };
+    for (const auto& s : steps) {
+        SCOPED_TRACE(s.what);
+        ::Sleep(600);  // no double click with the step before
+        s.inBox ? ClickBox(s.item) : ClickText(s.item);
+        EXPECT_EQ(s.checks, Checks());
+        EXPECT_EQ(s.changes, m_pFrame->m_nChanges);
+        EXPECT_EQ(s.selected, m_list.GetCurSel());
+    }
+    // Both clicks of a double click on a box count.
+    qotest::DoubleClick(m_list.m_hWnd, Item(2).left + 8, Item(2).CenterPoint().y);
+    EXPECT_EQ(0, m_list.GetCheck(2));
+    EXPECT_EQ(5, m_pFrame->m_nChanges);
+}
+
+TEST_F(CheckListTest, TheSpaceBarTogglesTheSelectedItemInTheAutoStylesOnly)
+{
+    struct {
+        UINT style;
+        std::vector<int> afterEachPress;
+    } const cases[] = {
+        {BS_AUTOCHECKBOX, {1, 0, 1}},
+        {BS_AUTO3STATE, {1, 2, 0}},
+        {BS_CHECKBOX, {0, 0, 0}},  // the program decides; it still hears of each press
+    };
+    int changes = 0;
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.style);
+        m_list.SetCheckStyle(c.style);
+        m_list.SetCheck(2, 0);
+        m_list.SetCurSel(2);
+        qotest::Focus(m_list.m_hWnd);
+        for (int expected : c.afterEachPress) {
+            qotest::KeyPress(VK_SPACE);
+            qotest::PumpFor(30);
+            EXPECT_EQ(expected, m_list.GetCheck(2));
+            EXPECT_EQ(++changes, m_pFrame->m_nChanges);
+        }
+    }
+    // Other keys move the selection as in any list box.
+    qotest::KeyPress(VK_DOWN);
+    qotest::PumpFor(30);
+    EXPECT_EQ(3, m_list.GetCurSel());
+    EXPECT_EQ(changes, m_pFrame->m_nChanges);
+}
+
+TEST_F(CheckListTest, TheScreenShowsTickedBoxesAndGreyTextForDisabledItems)
+{
+    m_list.SetCheck(0, 1);
+    m_list.Enable(2, FALSE);
+    ::RedrawWindow(m_list.m_hWnd, NULL, NULL, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
+    qotest::PumpFor(50);
+    qotest::Image img;
+    ASSERT_TRUE(qotest::CaptureImage(m_list.m_hWnd, img, true));
+    // Pixels of an item between x0 and x1 (from its left), over its middle rows or its whole height.
+    auto count = [&](int item, int x0, int x1, bool middle, auto pred) {
+        const CRect rc = Item(item);
+        const int cy = rc.CenterPoint().y;
+        int n = 0;
+        for (int y = middle ? cy - 3 : rc.top; y < (middle ? cy + 4 : rc.bottom); ++y)
+            for (int x = rc.left + x0; x < rc.left + x1; ++x) n += pred(img.Pixel(x, y));
+        return n;
+    };
+    auto dark = [](COLORREF c) { return GetRValue(c) + GetGValue(c) + GetBValue(c) < 200; };
+    const COLORREF grey = ::GetSysColor(COLOR_GRAYTEXT);
+    auto isGrey = [&](COLORREF c) { return c == grey; };
+    // Inside the box (its dark upper and left edges left out): a tick, or nothing.
+    EXPECT_GT(count(0, 5, 13, true, dark), 5);
+    EXPECT_EQ(0, count(1, 5, 13, true, dark));
+    // Text: black for enabled items, grey for the disabled one.
+    EXPECT_GT(count(1, 18, 120, false, dark), 5);
+    EXPECT_EQ(0, count(1, 18, 120, false, isGrey));
+    EXPECT_GT(count(2, 18, 120, false, isGrey), 5);
+}
