@@ -148,3 +148,8 @@
 #include "ids_outputsource.h"
 #include "ids_functions.h"
 #include "ids_multicolumn.h"
+// Pages and controls of the fixed-length, dBase and file-database filters
+#include "ids_textfix.h"
+#include "ids_dbinput.h"
+#include "ids_dboutput.h"
+#include "ids_directory.h"

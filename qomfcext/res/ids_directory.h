@@ -1,0 +1,2 @@
+// Resource ids of the directory chooser (4006).
+#pragma once
