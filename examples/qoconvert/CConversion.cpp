@@ -114,6 +114,7 @@ void CConversion::ReadConfig(CQoConfigFile& config)
         CQoException::Throw("Zur Datenbank-Eingabe fehlt die Tabelle (Tabelle=) oder die Abfrage (SQL=).", "Eingabe");
     if (OutputIsDatabase() && m_outputTable.IsEmpty())
         CQoException::Throw("Zur Datenbank-Ausgabe fehlt die Tabelle (Tabelle=).", "Ausgabe");
+    m_columns.ReadConfig(config);
 }
 
 void CConversion::ReadCharset(CQoConfigFile& config, const char* section, int& charset)
@@ -148,6 +149,7 @@ void CConversion::WriteConfig(CQoConfigFile& config) const
         config.CopySection(m_filterSettings, kInputFilter);
         config.CopySection(m_filterSettings, kOutputFilter);
     }
+    m_columns.WriteConfig(config);
 }
 
 CQoString CConversion::InFolder(const CQoString& folder, const CQoString& file)
@@ -206,7 +208,8 @@ int CConversion::FileMode(int charset)
 
 long CConversion::Run()
 {
-    return InputIsDatabase() || OutputIsDatabase() || m_bTextFilters ? RunRecords() : RunLines();
+    return InputIsDatabase() || OutputIsDatabase() || m_bTextFilters || m_columns.IsDefined() ? RunRecords()
+                                                                                             : RunLines();
 }
 
 namespace {
@@ -356,12 +359,18 @@ long CConversion::RunRecords()
     // so memory stays flat whatever the input's size.
     input->NoCache(true);
     CInputRecords records(input.get());
-    int const columns = records.GetNumColumns();
     records.FreezeView();
+    // The output columns: composed of the input's, chosen and ordered.
+    m_columns.Build(records);
+    CColumnView& view = m_columns.View();
+    int const columns = view.GetNumColumns();
+    if (columns == 0)
+        CQoException::Throw("Im Projekt ist keine Ausgabespalte ausgew\xE4hlt.", "Spaltenauswahl");
+    view.FreezeView();
 
     CQoFile file;
     std::string temp;
-    std::unique_ptr<CQoOutputFilter> output(NewOutput(records, file, temp));
+    std::unique_ptr<CQoOutputFilter> output(NewOutput(view, file, temp));
     long written = 0;
     try {
         if (!output->Init())
@@ -373,7 +382,7 @@ long CConversion::RunRecords()
             records.StandsOn(row);
             output->InitRow();
             for (int c = 0; c < columns; ++c) {
-                records.GetValue(row, c, value);
+                view.GetValue(row, c, value);
                 output->Value(c, value);
             }
             if (!output->WriteRow())

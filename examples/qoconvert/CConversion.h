@@ -29,8 +29,10 @@
 //     Format=1                  0 delimited text, 1 fixed-length text
 //     [Ausgabefilter]           the output filter's settings (lengths, ...)
 //
-// A project with neither filter section nor Format copies the lines of the
-// input from one character set into the other.
+// The output columns (which input columns, combined how, chosen and ordered
+// how) live in the sections of CColumnMapping. A project with neither filter
+// section nor Format nor those sections copies the lines of the input from one
+// character set into the other.
 #pragma once
 
 #include <CQoConfigFile.h>
@@ -38,6 +40,8 @@
 #include <CQoString.h>
 
 #include <string>
+
+#include "CColumnMapping.h"
 
 class CQoInputFilter;
 class CQoInputFilterTextVar;
@@ -116,6 +120,9 @@ public:
     int m_outputFormat;
 
     bool UsesTextFilters() const { return m_bTextFilters; }
+    // The output columns; the window builds them over its preview's records,
+    // a run over the records it converts.
+    CColumnMapping& Columns() { return m_columns; }
 
     // A file name of a project, relative to its folder unless absolute.
     static CQoString InFolder(const CQoString& folder, const CQoString& file);
@@ -143,6 +150,7 @@ private:
     bool m_bTextFilters;
     CConversionProgress* m_pProgress;
     long m_lSkipped;
+    CColumnMapping m_columns;
 
     friend class CConversionInput;
 };

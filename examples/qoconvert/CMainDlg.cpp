@@ -9,6 +9,7 @@
 #include <CQoException.h>
 #include <CQoLog.h>
 
+#include "CColumnsDlg.h"
 #include "QoConvertApp.h"
 #include "QoConvertRun.h"
 
@@ -20,6 +21,7 @@ BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
     ON_BN_CLICKED(IDC_OUTPUT_BROWSE, OnBrowseOutput)
     ON_EN_KILLFOCUS(IDC_INPUT_FILE, OnInputFileChanged)
     ON_CBN_SELCHANGE(IDC_OUTPUT_FORMAT, OnFormatChanged)
+    ON_BN_CLICKED(IDC_COLUMNS, OnColumns)
     ON_WM_DESTROY()
     ON_BN_CLICKED(IDC_ABORT, OnAbort)
     ON_MESSAGE(WM_QOCONVERT_START, OnRunStart)
@@ -137,6 +139,8 @@ void CMainDlg::FollowInput()
         // the input page shows why the file cannot be read
     }
     m_records.SetInputFilter(&m_outputRows);
+    // The output columns follow the input's.
+    m_job.Columns().Build(m_records);
     if (m_outputPage && ::IsWindow(m_outputPage->m_hWnd))
         m_outputPage->RefreshDisplay();
 }
@@ -152,7 +156,7 @@ void CMainDlg::MakeOutputPage()
         m_outputPage.reset(new COutputFilterConfigTextFix(idOutputPage, this));
     else
         m_outputPage.reset(new COutputFilterConfigTextVar(idOutputPage, this));
-    m_outputPage->SetSourceAndFilter(&m_records, m_output.get());
+    m_outputPage->SetSourceAndFilter(&m_job.Columns().View(), m_output.get());
     m_outputPage->Create(this);
     m_outputPage->UpdateOutputFilter(0);
     m_outputPage->RefreshDisplay();
@@ -296,6 +300,16 @@ void CMainDlg::OnFormatChanged()
     MakeOutputPage();
 }
 
+void CMainDlg::OnColumns()
+{
+    CColumnsDlg dialog(m_job.Columns(), m_records, this);
+    if (dialog.DoModal() != IDOK)
+        return;
+    // The output filter takes the new columns as the page shows them.
+    m_outputPage->RefreshDisplay();
+    m_outputPage->UpdateOutputFilter(1);
+}
+
 void CMainDlg::OnConvert()
 {
     if (!UpdateData(TRUE))
@@ -351,7 +365,7 @@ void CMainDlg::EnableForRun(bool running)
 {
     const int controls[] = {IDC_INPUT_FILE, IDC_INPUT_BROWSE, IDC_INPUT_DATABASE, IDC_INPUT_TABLE,
                             IDC_OUTPUT_FILE, IDC_OUTPUT_BROWSE, IDC_OUTPUT_FORMAT, IDC_OUTPUT_DATABASE,
-                            IDC_OUTPUT_TABLE, IDC_CONVERT};
+                            IDC_OUTPUT_TABLE, IDC_COLUMNS, IDC_CONVERT};
     for (int id : controls)
         GetDlgItem(id)->EnableWindow(!running);
     if (m_inputPage && ::IsWindow(m_inputPage->m_hWnd))

@@ -2,7 +2,9 @@
 // and configures how it is read on the delimited-text page with its live
 // preview, picks the output file and its format (delimited or fixed-length
 // text) and configures it on its output page, whose preview shows the records
-// as they will be written, and converts. The project keeps the filters'
+// as they will be written, and converts. "Spalten..." opens the output
+// columns: composed of the input's columns (combinations such as street and
+// town in one column), chosen and ordered. The project keeps the filters'
 // settings, so that the same project converts from the command line.
 // A file database (Access-type, .mdb, .xlsx) and its table may be named
 // instead of a file; a project's ODBC settings are kept and used, though not
@@ -50,6 +52,7 @@ protected:
     afx_msg void OnBrowseOutput();
     afx_msg void OnInputFileChanged();
     afx_msg void OnFormatChanged();
+    afx_msg void OnColumns();
     afx_msg void OnDestroy();
     afx_msg void OnAbort();
     virtual void OnCancel();

@@ -4,6 +4,7 @@
 
 #define IDR_MAINFRAME        128
 #define IDD_MAIN             130
+#define IDD_COLUMNS          131
 
 #define IDC_PROJECT          1000
 #define IDC_INPUT_FILE       1001
@@ -23,6 +24,9 @@
 #define IDC_OUTPUT_GROUP     1017
 #define IDC_PROGRESS         1018
 #define IDC_ABORT            1019
+#define IDC_COLUMNS          1020
+#define IDC_COMPOSE_PAGE     1021
+#define IDC_SELECT_PAGE      1022
 
 #define IDS_APP_TITLE        5000
 #define IDS_DONE             5001

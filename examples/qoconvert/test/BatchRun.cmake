@@ -60,7 +60,9 @@ set(cases
     "dot-dot path|Datei=./sub/../kunden.txt\nZeichensatz=1|ist die Eingabedatei"
     "unknown charset|Datei=kunden-neu.txt\nZeichensatz=7|Unbekannter Zeichensatz '7'"
     "charset not a number|Datei=kunden-neu.txt\nZeichensatz=dos|Unbekannter Zeichensatz 'dos'"
-    "unknown format|Datei=kunden-neu.txt\nFormat=3|Unbekanntes Ausgabeformat '3'")
+    "unknown format|Datei=kunden-neu.txt\nFormat=3|Unbekanntes Ausgabeformat '3'"
+    "columns of no kind|Datei=kunden-neu.txt\n[Spalten]\nOuterColumns=1|keine Zusammensetzung der Ausgabespalten"
+    "column count out of range|Datei=kunden-neu.txt\n[Spaltenauswahl]\nSpalten=99999|Der Wert 99999 von 'Spalten'")
 foreach(case IN LISTS cases)
   string(REPLACE "|" ";" parts "${case}")
   list(GET parts 0 what)
@@ -105,6 +107,36 @@ execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/kunden.fix 
 if(NOT rc EQUAL 0 OR NOT differs EQUAL 0)
   file(READ ${project}/qoconvert.log log)
   message(FATAL_ERROR "through the text filters: exit ${rc}, differs ${differs}\n${err}\nlog:\n${log}")
+endif()
+
+# Output columns as the window's column dialog stores them: a combination
+# "Adresse" of street and town with ", " between them, the columns ordered
+# Adresse, Name, and Nr left out.
+file(WRITE ${project}/expected-columns.sh [=[
+tr -d '\r' < kunden.txt | awk -F';' 'NR==1{printf "Adresse;Name\r\n"} NR>1{printf "%s, %s;%s\r\n",$3,$4,$2}' > expected-columns.txt
+]=])
+execute_process(COMMAND sh expected-columns.sh WORKING_DIRECTORY ${project} RESULT_VARIABLE rc)
+file(WRITE ${project}/qoconvert.ini
+     "[Eingabe]\nDatei=kunden.txt\nZeichensatz=0\n[Ausgabe]\nDatei=spalten.txt\nZeichensatz=0\n"
+     "[Funktionen]\nFunktionen=1\nFunktion0Id=20000\nFunktion0Name=Adresse\nFunktion0Teile=2\n"
+     "Funktion0Teil0Id=3\nFunktion0Teil0Trenner=\nFunktion0Teil1Id=4\nFunktion0Teil1Trenner=,\\s\n"
+     "[Spalten]\nMultiColumnType=1\nInnerColumns=4\n"
+     "Inner0Id=1\nInner0Function=1\nInner0Name=Nr\nInner0Source=0\n"
+     "Inner1Id=2\nInner1Function=2\nInner1Name=Name\nInner1Source=1\n"
+     "Inner2Id=3\nInner2Function=3\nInner2Name=Stra\\xDFe\nInner2Source=2\n"
+     "Inner3Id=4\nInner3Function=4\nInner3Name=Ort\nInner3Source=3\n"
+     "OuterColumns=3\nOuter0Id=0\nOuter0Name=Nr\nOuter1Id=1\nOuter1Name=Name\nOuter2Id=2\nOuter2Name=Adresse\n"
+     "Assignments=4\nAssign0Outer=0\nAssign0Inner=1\nAssign1Outer=1\nAssign1Inner=2\n"
+     "Assign2Outer=2\nAssign2Inner=3\nAssign3Outer=2\nAssign3Inner=4\nAssign3Separator=,\\s\n"
+     "[Spaltenauswahl]\nSpalten=3\nSpalte0Name=Adresse\nSpalte0Ausgabe=1\nSpalte1Name=Name\nSpalte1Ausgabe=1\n"
+     "Spalte2Name=Nr\nSpalte2Ausgabe=0\n")
+execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/spalten.txt ${project}/expected-columns.txt
+                RESULT_VARIABLE differs)
+if(NOT rc EQUAL 0 OR NOT differs EQUAL 0)
+  file(READ ${project}/qoconvert.log log)
+  message(FATAL_ERROR "composed and chosen columns: exit ${rc}, differs ${differs}\n${err}\nlog:\n${log}")
 endif()
 
 # A project folder that does not exist: exit code 1 and the reason on the console.

@@ -1,0 +1,303 @@
+#include "CColumnMapping.h"
+
+#include <COutputFilterSource.h>
+#include <CQoConfigFile.h>
+#include <CQoException.h>
+#include <CQoOutputSource.h>
+#include <CQoString.h>
+#include <QoLimits.h>
+
+#include <algorithm>
+
+namespace {
+const char kFunctions[] = "Funktionen";
+const char kComposition[] = "Spalten";
+const char kSelection[] = "Spaltenauswahl";
+
+CQoString Key(const char* prefix, int n, const char* suffix)
+{
+    CQoString key;
+    key.Format("%s%d%s", prefix, n, suffix);
+    return key;
+}
+
+CQoString PartKey(int function, int part, const char* suffix)
+{
+    CQoString key;
+    key.Format("Funktion%dTeil%d%s", function, part, suffix);
+    return key;
+}
+
+bool SameParts(const std::vector<CFunctionManager::CCombiPart>& a, const std::vector<CFunctionManager::CCombiPart>& b)
+{
+    if (a.size() != b.size())
+        return false;
+    for (size_t i = 0; i < a.size(); ++i)
+        if (a[i].GetFunctionId() != b[i].GetFunctionId() || a[i].GetSeparator() != b[i].GetSeparator()
+            || a[i].GetAlwaysSeparate() != b[i].GetAlwaysSeparate())
+            return false;
+    return true;
+}
+}  // namespace
+
+CColumnMapping::CColumnMapping()
+    : m_handler(CMultiColumnHandler::composeOutput), m_pComposed(nullptr), m_pRecords(nullptr), m_nInputColumns(0),
+      m_bDefined(false), m_bComposition(false), m_bSelectionPending(false)
+{
+    m_pComposed = m_handler.CreateMultiColumnOutputSource();
+    m_view.SetComposed(m_pComposed);
+}
+
+CColumnMapping::~CColumnMapping()
+{
+    m_view.SetComposed(nullptr);
+    if (m_pComposed != nullptr)
+        m_pComposed->Delete();
+}
+
+void CColumnMapping::ReadConfig(const CQoConfigFile& config)
+{
+    // Read completely before anything is taken over: a project refused for
+    // one bad value leaves the columns as they were.
+    CFunctionManager functions;
+    if (config.HasSection(kFunctions)) {
+        int count = 0;
+        config.GetValue(kFunctions, "Funktionen", count, 0, qolimits::maxColumns);
+        for (int k = 0; k < count; ++k) {
+            long id = 0;
+            if (!config.GetValue(kFunctions, Key("Funktion", k, "Id"), id))
+                continue;
+            CQoString name;
+            config.GetValue(kFunctions, Key("Funktion", k, "Name"), name);
+            int parts = 0;
+            config.GetValue(kFunctions, Key("Funktion", k, "Teile"), parts, 0, qolimits::maxColumns);
+            std::vector<CFunctionManager::CCombiPart> combination;
+            for (int j = 0; j < parts; ++j) {
+                long part = 0;
+                if (!config.GetValue(kFunctions, PartKey(k, j, "Id"), part))
+                    continue;
+                CQoString separator;
+                config.GetValue(kFunctions, PartKey(k, j, "Trenner"), separator);
+                int always = 0;
+                config.GetValue(kFunctions, PartKey(k, j, "Immer"), always);
+                combination.push_back(CFunctionManager::CCombiPart(part, separator.GetString(), always != 0));
+            }
+            CFunctionManager::CFunction function(id, name.GetString());
+            function.SetCombination(combination);
+            functions.AddFunction(function);
+        }
+    }
+
+    CMultiColumnHandler composition(CMultiColumnHandler::composeOutput);
+    const bool hasComposition = config.HasSection(kComposition);
+    if (hasComposition && !composition.ReadConfig(config, kComposition))
+        CQoException::Throw("Der Abschnitt [Spalten] beschreibt keine Zusammensetzung der Ausgabespalten "
+                            "(MultiColumnType=1 fehlt).",
+                            kComposition);
+
+    CColumnView::Selection selection;
+    const bool hasSelection = config.HasSection(kSelection);
+    if (hasSelection) {
+        int count = 0;
+        config.GetValue(kSelection, "Spalten", count, 0, qolimits::maxColumns);
+        for (int k = 0; k < count; ++k) {
+            CQoString name;
+            if (!config.GetValue(kSelection, Key("Spalte", k, "Name"), name))
+                continue;
+            int written = 1;
+            config.GetValue(kSelection, Key("Spalte", k, "Ausgabe"), written);
+            selection.push_back(std::make_pair(CString(name.GetString()), written != 0));
+        }
+    }
+
+    m_functions = functions;
+    if (hasComposition) {
+        m_handler = composition;   // the composed source follows the handler
+        m_handler.SetWriteOutputSource(m_pRecords);
+    }
+    m_bComposition = hasComposition;
+    m_selection = selection;
+    m_bSelectionPending = hasSelection;
+    m_bDefined = config.HasSection(kFunctions) || hasComposition || hasSelection;
+}
+
+void CColumnMapping::WriteConfig(CQoConfigFile& config) const
+{
+    config.DeleteSection(kFunctions);
+    config.DeleteSection(kComposition);
+    config.DeleteSection(kSelection);
+    if (!m_bDefined)
+        return;
+
+    const int count = m_functions.GetNumFunctions();
+    config.SetValue(kFunctions, "Funktionen", count);
+    for (int k = 0; k < count; ++k) {
+        CFunctionManager::CFunction function(CFunctionManager::unusedFunction, CString());
+        m_functions.GetFunctionAt(k, function);
+        config.SetValue(kFunctions, Key("Funktion", k, "Id"), function.GetId());
+        config.SetValue(kFunctions, Key("Funktion", k, "Name"), (const char*)function.GetName());
+        const std::vector<CFunctionManager::CCombiPart> parts = function.GetCombination();
+        if (parts.empty())
+            continue;
+        config.SetValue(kFunctions, Key("Funktion", k, "Teile"), static_cast<int>(parts.size()));
+        for (size_t j = 0; j < parts.size(); ++j) {
+            const int part = static_cast<int>(j);
+            config.SetValue(kFunctions, PartKey(k, part, "Id"), parts[j].GetFunctionId());
+            config.SetValue(kFunctions, PartKey(k, part, "Trenner"), (const char*)parts[j].GetSeparator());
+            config.SetValue(kFunctions, PartKey(k, part, "Immer"), parts[j].GetAlwaysSeparate() ? 1 : 0);
+        }
+    }
+
+    // Without a composition of its own the project follows the input's columns.
+    if (m_bComposition)
+        m_handler.WriteConfig(config, kComposition);
+
+    const CColumnView::Selection selection =
+        m_bSelectionPending ? m_selection : const_cast<CColumnView&>(m_view).GetSelection();
+    config.SetValue(kSelection, "Spalten", static_cast<int>(selection.size()));
+    for (size_t k = 0; k < selection.size(); ++k) {
+        config.SetValue(kSelection, Key("Spalte", static_cast<int>(k), "Name"), (const char*)selection[k].first);
+        config.SetValue(kSelection, Key("Spalte", static_cast<int>(k), "Ausgabe"), selection[k].second ? 1 : 0);
+    }
+}
+
+void CColumnMapping::Build(COutputFilterSource& records)
+{
+    // Keep the choice made for the columns as they were.
+    const CColumnView::Selection wanted = m_bSelectionPending ? m_selection : m_view.GetSelection();
+    m_bSelectionPending = false;
+
+    m_pRecords = &records;
+    m_handler.SetWriteOutputSource(&records);
+    // Input column i is function i + 1: the predefined range bounds the count.
+    m_nInputColumns = std::max(0, std::min(records.GetNumColumns(), static_cast<int>(m_functions.GetMaxPredefinedId())));
+    BuildFunctions();
+    if (!m_bComposition) {
+        BuildDefaultComposition();
+    } else {
+        // Every input column can be composed, also one the input has gained.
+        for (int i = 0; i < m_nInputColumns; ++i) {
+            if (m_handler.FindInnerColumn(i + 1) >= 0)
+                continue;
+            CFunctionManager::CFunction function(i + 1, CString());
+            m_functions.GetFunction(i + 1, function);
+            m_handler.AddInnerColumn(i + 1, i + 1, function.GetName(), i);
+        }
+    }
+    m_view.Sync(wanted);
+}
+
+void CColumnMapping::BuildFunctions()
+{
+    // The input's columns are the plain functions; what else the project
+    // defines (combinations) stays as it is. Functions of columns the input no
+    // longer has are dropped, combinations then skip those parts.
+    CFunctionManager rebuilt;
+    for (int i = 0; i < m_nInputColumns; ++i) {
+        CString name;
+        m_pRecords->GetName(i, name, 0);
+        CFunctionManager::CFunction stored(i + 1, CString());
+        if (m_bDefined && m_functions.GetFunction(i + 1, stored) && !stored.GetName().IsEmpty())
+            name = stored.GetName();
+        CFunctionManager::CFunction function(i + 1, name);
+        rebuilt.AddFunction(function);
+    }
+    long nextCombi = rebuilt.GetMinCombiId();
+    long nextUser = rebuilt.GetMinUserdefinedId();
+    for (int k = 0; k < m_functions.GetNumFunctions(); ++k) {
+        CFunctionManager::CFunction function(CFunctionManager::unusedFunction, CString());
+        if (!m_functions.GetFunctionAt(k, function))
+            continue;
+        const CFunctionManager::type kind = rebuilt.Id2Type(function.GetId());
+        if (kind == CFunctionManager::predefinedType)
+            continue;
+        if (kind == CFunctionManager::combiType)
+            nextCombi = std::max(nextCombi, function.GetId() + 1);
+        if (kind == CFunctionManager::userdefinedType)
+            nextUser = std::max(nextUser, function.GetId() + 1);
+        rebuilt.AddFunction(function);
+    }
+    rebuilt.SetNextPredefinedId(m_nInputColumns + 1);
+    rebuilt.SetNextCombiId(nextCombi);
+    rebuilt.SetNextUserdefinedId(nextUser);
+    m_functions = rebuilt;
+}
+
+void CColumnMapping::BuildDefaultComposition()
+{
+    m_handler.ClearAssignments();
+    m_handler.DeleteColumns(true);
+    m_handler.DeleteColumns(false);
+    for (int i = 0; i < m_nInputColumns; ++i) {
+        CString name;
+        m_pRecords->GetName(i, name, 0);
+        CFunctionManager::CFunction function(i + 1, name);
+        m_functions.GetFunction(i + 1, function);
+        m_handler.AddInnerColumn(i + 1, i + 1, function.GetName(), i);
+        m_handler.AddOuterColumn(i, name);
+        m_handler.AddAssignment(i, i + 1, "", false);
+    }
+}
+
+std::vector<long> CColumnMapping::OuterFunctions()
+{
+    std::vector<long> result;
+    for (int i = 0; i < m_handler.NumOuterColumns(); ++i) {
+        const int outerId = m_handler.GetOuterColumnId(i);
+        std::vector<CFunctionManager::CCombiPart> parts;
+        for (int a = 0; a < m_handler.NumAssignments(); ++a) {
+            int outer = -1, inner = -1;
+            bool always = false;
+            CQoString separator;
+            if (!m_handler.GetAssignment(a, outer, inner, separator, always) || outer != outerId)
+                continue;
+            const long function = m_handler.GetInnerFunction(m_handler.FindInnerColumn(inner));
+            if (function >= 0)
+                parts.push_back(CFunctionManager::CCombiPart(function, separator.GetString(), always));
+        }
+        if (parts.empty()) {
+            result.push_back(CFunctionManager::unusedFunction);
+            continue;
+        }
+        if (parts.size() == 1 && parts[0].GetSeparator().IsEmpty() && !parts[0].GetAlwaysSeparate()) {
+            result.push_back(parts[0].GetFunctionId());
+            continue;
+        }
+        long found = -1;
+        for (int k = 0; k < m_functions.GetNumFunctions() && found < 0; ++k) {
+            CFunctionManager::CFunction function(CFunctionManager::unusedFunction, CString());
+            if (m_functions.GetFunctionAt(k, function) && SameParts(function.GetCombination(), parts))
+                found = function.GetId();
+        }
+        if (found < 0) {
+            // Named as the combination dialog names one: each part's separator
+            // and function.
+            CString name;
+            for (const CFunctionManager::CCombiPart& part : parts) {
+                CFunctionManager::CFunction function(part.GetFunctionId(), CString());
+                m_functions.GetFunction(part.GetFunctionId(), function);
+                name += part.GetSeparator() + function.GetName();
+            }
+            CString unique = name;
+            for (int n = 2; m_functions.ExistsFunction(unique); ++n)
+                unique.Format("%s (%d)", (const char*)name, n);
+            CFunctionManager::CFunction combination(m_functions.GetNextCombiId(true), unique);
+            combination.SetCombination(parts);
+            m_functions.AddFunction(combination);
+            found = combination.GetId();
+        }
+        result.push_back(found);
+    }
+    return result;
+}
+
+void CColumnMapping::TakeComposition(const CMultiColumnHandler& edited)
+{
+    const CColumnView::Selection keep = m_view.GetSelection();
+    m_handler = edited;
+    m_handler.SetWriteOutputSource(m_pRecords);
+    m_bComposition = true;
+    m_bDefined = true;
+    m_bSelectionPending = false;
+    m_view.Sync(keep);
+}
