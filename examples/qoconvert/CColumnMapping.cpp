@@ -123,11 +123,12 @@ void CColumnMapping::ReadConfig(const CQoConfigFile& config)
 
 void CColumnMapping::WriteConfig(CQoConfigFile& config) const
 {
+    // Sections this program could not read stay for the user to mend.
+    if (!m_bDefined)
+        return;
     config.DeleteSection(kFunctions);
     config.DeleteSection(kComposition);
     config.DeleteSection(kSelection);
-    if (!m_bDefined)
-        return;
 
     const int count = m_functions.GetNumFunctions();
     config.SetValue(kFunctions, "Funktionen", count);
@@ -291,11 +292,33 @@ std::vector<long> CColumnMapping::OuterFunctions()
     return result;
 }
 
-void CColumnMapping::TakeComposition(const CMultiColumnHandler& edited)
+void CColumnMapping::TakeComposition(const CMultiColumnHandler& edited, bool sameIds)
 {
-    const CColumnView::Selection keep = m_view.GetSelection();
+    // The choice made for each column, under the name the column carries in
+    // the new composition: a renamed column keeps its place and tick.
+    CColumnView::Selection keep;
+    std::vector<int> ids;
+    for (int i = 0, n = m_view.GetEntryCount(); i < n; ++i) {
+        COutputFilterSource::CEntry entry;
+        if (!m_view.GetEntry(i, entry))
+            continue;
+        keep.push_back(std::make_pair(entry.GetName(), entry.GetSelected()));
+        ids.push_back(m_handler.GetOuterColumnId(entry.GetColumn()));
+    }
     m_handler = edited;
     m_handler.SetWriteOutputSource(m_pRecords);
+    if (sameIds) {
+        CColumnView::Selection renamed;
+        for (size_t i = 0; i < keep.size(); ++i) {
+            const int index = m_handler.FindOuterColumn(ids[i]);
+            if (index < 0)
+                continue;   // the column was deleted
+            CString name;
+            m_view.GetSourceName(index, name, 0);
+            renamed.push_back(std::make_pair(name, keep[i].second));
+        }
+        keep.swap(renamed);
+    }
     m_bComposition = true;
     m_bDefined = true;
     m_bSelectionPending = false;

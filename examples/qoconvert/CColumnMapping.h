@@ -49,8 +49,8 @@ public:
     // Raises CQoException for a section that cannot be used (a count out of
     // range, a composition of the wrong kind). Takes effect with Build.
     void ReadConfig(const CQoConfigFile& config);
-    // Writes the three sections once the columns were defined; removes them
-    // otherwise.
+    // Writes the three sections once the columns were defined; leaves the
+    // file's own otherwise (sections that could not be read are not lost).
     void WriteConfig(CQoConfigFile& config) const;
     // Whether the project defines the columns (else every input column is
     // written as it is).
@@ -76,8 +76,10 @@ public:
     std::vector<long> OuterFunctions();
 
     // The composition as the user left it on the page: the view keeps the
-    // choice for the columns it knows. The columns count as defined.
-    void TakeComposition(const CMultiColumnHandler& edited);
+    // choice for the columns it knows, by name, or with `sameIds` (the
+    // composition was taken from that page before) by the column's id, so
+    // that a renamed column keeps its place. The columns count as defined.
+    void TakeComposition(const CMultiColumnHandler& edited, bool sameIds);
 
 private:
     void BuildFunctions();

@@ -46,8 +46,13 @@ BOOL CColumnsDlg::OnInitDialog()
     }
     m_compose->SetOutputSource(&m_records);
     m_compose->Create(this);
+    // The page fills its function list after choosing the first column:
+    // show that column's function.
+    m_compose->UpdateListSelections();
     Place(m_compose.get(), IDC_COMPOSE_PAGE, false);
     m_compose->AddModifiedListener(this);
+    // From here on the columns are known by the page's ids.
+    m_work.TakeComposition(m_compose->GetHandler(), false);
 
     m_select.reset(new COutputFilterSourceConfig(idSelection, this));
     m_select->SetSource(&m_work.View());
@@ -76,7 +81,7 @@ void CColumnsDlg::Place(CWnd* page, UINT marker, bool fitHeight)
 int CColumnsDlg::ModifiedListenerSetModified(int /*bModified*/, int nNotifierId)
 {
     if (nNotifierId == idCompose && m_compose) {
-        m_work.TakeComposition(m_compose->GetHandler());
+        m_work.TakeComposition(m_compose->GetHandler(), true);
         if (m_select && ::IsWindow(m_select->m_hWnd))
             m_select->InitList();
     }
@@ -87,7 +92,7 @@ void CColumnsDlg::OnOK()
 {
     // The page tells not every last step of its changes: take it as it is.
     if (m_compose)
-        m_work.TakeComposition(m_compose->GetHandler());
+        m_work.TakeComposition(m_compose->GetHandler(), true);
     if (m_work.View().GetNumColumns() == 0) {
         AfxMessageBox("W\xE4hlen Sie mindestens eine Spalte f\xFCr die Ausgabe aus.", MB_OK | MB_ICONEXCLAMATION);
         return;
