@@ -109,3 +109,15 @@ public:
 #ifndef VT_BSTRT
 #define VT_BSTRT ((VARTYPE)0x0FFF)
 #endif
+
+// Parameter descriptions of CWnd::InvokeHelper, one byte (the VARTYPE) per argument:
+//     static BYTE parms[] = VTS_I4 VTS_BSTR;
+//     InvokeHelper(5, DISPATCH_METHOD, VT_BOOL, &bResult, parms, 12L, "Text");
+#define VTS_NONE ""
+#define VTS_I2 "\x02"
+#define VTS_I4 "\x03"
+#define VTS_R8 "\x05"
+#define VTS_BSTR "\x08"
+#define VTS_DISPATCH "\x09"
+#define VTS_BOOL "\x0B"
+#define VTS_VARIANT "\x0C"

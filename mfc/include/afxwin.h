@@ -804,6 +804,10 @@ private:
 #define MLF_NOKICKIDLE 0x0002
 #define MLF_SHOWONIDLE 0x0004
 
+// The registered message by which CWnd::GetControlUnknown asks a control window
+// for its IUnknown (the answer, an LRESULT, is the pointer or 0).
+#define AFX_CONTROL_UNKNOWN_MESSAGE "QoMfcControlUnknown"
+
 class AFX_API CWnd : public CCmdTarget {
   DECLARE_DYNCREATE(CWnd)
 public:
@@ -958,6 +962,19 @@ public:
   static BOOL PASCAL WalkPreTranslateTree(HWND hWndStop, MSG* pMsg);
   // Sends the current message of the parent to the child that caused it.
   static BOOL PASCAL ReflectLastMsg(HWND hWndChild, LRESULT* pResult = NULL);
+
+  // ActiveX control members. The control behind this window hands out its IUnknown
+  // (not AddRef'd) when sent the registered message AFX_CONTROL_UNKNOWN_MESSAGE, as a
+  // control site would; null when the window is no such control. InvokeHelper calls
+  // a dispatch member with the arguments described by pbParamInfo (VTS_... string,
+  // NULL for none) and stores the result converted to vtRet in pvRet (a BOOL for
+  // VT_BOOL, a CString for VT_BSTR). A window that is no control raises
+  // CNotSupportedException; a call the control refuses, CInvalidArgException.
+  LPUNKNOWN GetControlUnknown();
+  void AFX_CDECL InvokeHelper(DISPID dwDispID, WORD wFlags, VARTYPE vtRet, void* pvRet,
+                              const BYTE* pbParamInfo, ...);
+  void GetProperty(DISPID dwDispID, VARTYPE vtProp, void* pvProp) const;
+  void AFX_CDECL SetProperty(DISPID dwDispID, VARTYPE vtProp, ...);
 
   // Virtual functions you might override
   virtual BOOL PreCreateWindow(CREATESTRUCT& cs);
