@@ -1,6 +1,9 @@
 #include "CInputFilterConfig.h"
 
+#include "CInputFilterConfigTextFix.h"
 #include "CInputFilterConfigTextVar.h"
+#include "CQoInputFilterTextFix.h"
+#include "CQoInputFilterTextVF.h"
 #include "CQoInputFilterTextVar.h"
 
 IMPLEMENT_DYNAMIC(CInputFilterConfig, CModelessDialog)
@@ -33,9 +36,17 @@ CInputFilterConfig* CInputFilterConfig::GetAppropriateConfig(CQoInputFilter* pFi
         if (CQoInputFilterTextVar* pTextVar = dynamic_cast<CQoInputFilterTextVar*>(pFilter))
             return new CInputFilterConfigTextVar(pTextVar, nNotifierId);
         return NULL;
+    case CQoInputFilter::filterTextFix:
+        if (dynamic_cast<CQoInputFilterTextFix*>(pFilter) != NULL)
+            return new CInputFilterConfigTextFix(pFilter, nNotifierId, false);
+        return NULL;
+    case CQoInputFilter::filterTextVF:
+        if (dynamic_cast<CQoInputFilterTextVF*>(pFilter) != NULL)
+            return new CInputFilterConfigTextFix(pFilter, nNotifierId, true);
+        return NULL;
     default:
-        // dBase (1, 2), fixed-length text (3, 7) and the file databases (5, 6)
-        // have no page in this build; unknown types never have one.
+        // dBase (1, 2) and the file databases (5, 6) have no page in this build;
+        // unknown types never have one.
         return NULL;
     }
 }
