@@ -1,0 +1,399 @@
+// The file-database and dBase output pages on real windows: real output
+// filters over an output source that reads a real delimited file, a user who
+// selects rows, chooses types, types lengths and applies, and what the filters
+// then write into a real Access-type database and a real dBase file, read back.
+#include <gtest/gtest.h>
+
+#include <afxcmn.h>
+#include <afxdao.h>
+
+#include <COutputFilterConfigDao.h>
+#include <COutputFilterConfigDbase.h>
+#include <COutputFilterSource.h>
+#include <CQoInputFilterDao.h>
+#include <CQoInputFilterDbase34.h>
+#include <CQoInputFilterTextVar.h>
+#include <CQoOutputFilterDao.h>
+#include <CQoOutputFilterDbase.h>
+
+#include <string>
+#include <vector>
+
+#include "MfcTestHost.h"
+#include "resource.h"
+
+namespace {
+
+using qotest::PressKey;
+using qotest::PumpApp;
+
+// The rows of a delimited input file as the host's output source.
+class FileSource : public COutputFilterSource {
+public:
+    explicit FileSource(CQoInputFilterTextVar& in) : m_in(in) {}
+    void GetSourceValue(long row, int column, CString& value) override
+    {
+        CQoString text;
+        if (m_in.AbsoluteRow(row)) m_in.Value(column, text);
+        value = text.GetString();
+    }
+    void GetSourceName(int column, CString& name, int) override
+    {
+        CQoString text;
+        m_in.ColName(column, text);
+        name = text.GetString();
+    }
+    int NumSourceColumns() override { return m_in.NumCols(); }
+    long NumSourceRows() override { return m_in.NumRows(); }
+
+private:
+    CQoInputFilterTextVar& m_in;
+};
+
+const char* const kCustomers = "Name;Ort;PLZ\r\nM\xFCller;K\xF6ln;50667\r\nSchmidt;Br\xFChl;50321\r\n";
+
+class DbOutputPagesTest : public qotest::HostFrameTest {
+protected:
+    DbOutputPagesTest() : HostFrameTest("Ausgabe", 720, 460) {}
+    void TearDown() override
+    {
+        if (m_pPage != NULL && ::IsWindow(m_pPage->m_hWnd)) m_pPage->DestroyWindow();
+        delete m_pPage;
+        HostFrameTest::TearDown();
+    }
+
+    void Input(const std::string& content)
+    {
+        m_in.Delimiter(';');
+        m_in.SetFirstRowHasNames(true);
+        m_in.Init(qotest::WriteTempFile("qo_dboutput_pages.csv", content).c_str());
+        m_source.InitArray();
+    }
+    // The host's steps: filter and source, window, settings, columns; then shown.
+    void Show(COutputFilterConfig* page, CQoOutputFilter* filter)
+    {
+        m_pPage = page;
+        page->SetSourceAndFilter(&m_source, filter);
+        ASSERT_TRUE(page->Create(m_pFrame));
+        page->UpdateOutputFilter(0);
+        page->RefreshDisplay();
+        qotest::ShowChild(*page, 8, 8);
+    }
+    // What the host writes during a conversion: every source row through the filter.
+    void WriteRows(CQoOutputFilter& out)
+    {
+        for (long r = 0; r < m_source.GetNumRows(); ++r) {
+            out.InitRow();
+            for (int c = 0; c < m_source.GetNumColumns(); ++c) {
+                CQoString value;
+                m_source.GetValue(r, c, value);
+                out.Value(c, value);
+            }
+            EXPECT_TRUE(out.WriteRow());
+        }
+    }
+
+    HWND Item(int id) const { return ::GetDlgItem(m_pPage->m_hWnd, id); }
+    bool Enabled(int id) const { return ::IsWindowEnabled(Item(id)) != FALSE; }
+    qotest::Dialog Page() const { return qotest::Dialog(m_pPage->m_hWnd); }
+
+    // The text the list paints in each cell, "a|b|c" per row, rows joined by ",".
+    std::string Cells(int listId, int columns)
+    {
+        CColoredListCtrl* list = dynamic_cast<CColoredListCtrl*>(CWnd::FromHandlePermanent(Item(listId)));
+        std::string out;
+        for (int row = 0; row < list->GetItemCount(); ++row) {
+            out += row ? "," : "";
+            for (int col = 0; col < columns; ++col) {
+                CString text;
+                DWORD clr = 1, clrSel = 1;
+                bool bold = true;
+                list->GetColoredItem(row, col, text, clr, clrSel, bold);
+                EXPECT_EQ(0x000000u, clr);
+                EXPECT_EQ(0xFFFFFFu, clrSel);
+                out += (col ? "|" : "") + std::string(static_cast<const char*>(text));
+            }
+        }
+        return out;
+    }
+    void ClickRow(int listId, int row)
+    {
+        HWND list = Item(listId);
+        CRect rc;
+        ListView_GetItemRect(list, row, &rc, LVIR_BOUNDS);
+        qotest::Click(list, rc.left + 10, rc.CenterPoint().y);
+        PumpApp(100);
+    }
+    void TypeInto(int id, const std::string& text) { qotest::TypeOver(Item(id), text); }
+    // "Übernehmen", clicked.
+    void Apply(int id) { qotest::ClickMiddle(Item(id)); }
+
+    CQoInputFilterTextVar m_in;
+    FileSource m_source{m_in};
+    COutputFilterConfig* m_pPage = nullptr;
+};
+
+// ---------------------------------------------------------------------------
+// File database
+
+class DaoOutputPageTest : public DbOutputPagesTest {
+protected:
+    void Show() { DbOutputPagesTest::Show(new COutputFilterConfigDao(9, m_pFrame), &m_filter); }
+    std::string Cells() { return DbOutputPagesTest::Cells(IDC_OUTDAO_LIST, 4); }
+    // "name:type/length[i],..." of the filter.
+    std::string FilterColumns()
+    {
+        std::string out = std::string(m_filter.GetTableName().GetString()) + ":";
+        for (int i = 0; i < m_filter.NumCols(); ++i) {
+            CQoString name;
+            m_filter.GetColumnName(i, name);
+            out += (i ? "," : "") + std::string(name.GetString()) + "=" + std::to_string(m_filter.GetType(i)) + "/" +
+                   std::to_string(m_filter.GetLength(i)) + (m_filter.GetIndexed(i) ? "i" : "");
+        }
+        return out;
+    }
+
+    CQoOutputFilterDao m_filter;
+};
+
+TEST_F(DaoOutputPageTest, TheUserSetsTypeLengthAndIndexAndTheDatabaseGetsThem)
+{
+    Input(kCustomers);
+    Show();
+    EXPECT_EQ("Tabelle", Page().Text(IDC_OUTDAO_TABLE)) << "a filter without a table name";
+    EXPECT_EQ("Name|Text|255|nein,Ort|Text|255|nein,PLZ|Text|255|nein", Cells());
+    for (int id : {IDC_OUTDAO_TYPE, IDC_OUTDAO_FIELDLEN, IDC_OUTDAO_INDEXED})
+        EXPECT_FALSE(Enabled(id)) << id << ": no row selected";
+
+    ClickRow(IDC_OUTDAO_LIST, 0);
+    EXPECT_EQ("255", Page().Text(IDC_OUTDAO_FIELDLEN));
+    EXPECT_TRUE(Enabled(IDC_OUTDAO_FIELDLEN));
+    TypeInto(IDC_OUTDAO_FIELDLEN, "40");
+    Page().Check(IDC_OUTDAO_INDEXED);
+    Apply(IDC_OUTDAO_APPLY);
+    EXPECT_EQ("Tabelle:Name=2/40i,Ort=2/255,PLZ=2/255", FilterColumns());
+
+    // Numeric: no length to type, none shown; Enter applies with the table name typed.
+    ClickRow(IDC_OUTDAO_LIST, 2);
+    Page().Select(IDC_OUTDAO_TYPE, 1);
+    EXPECT_FALSE(Enabled(IDC_OUTDAO_FIELDLEN));
+    TypeInto(IDC_OUTDAO_TABLE, "Kunden");
+    PressKey(VK_RETURN);
+    EXPECT_EQ("Kunden:Name=2/40i,Ort=2/255,PLZ=1/255", FilterColumns());
+    EXPECT_EQ("Name|Text|40|ja,Ort|Text|255|nein,PLZ|numerisch||nein", Cells());
+    qotest::CaptureWindow(m_pPage->m_hWnd, qotest::CapturePath("output-dao-4025.png").c_str());
+
+    // What the page set is what the database holds.
+    const std::string path = qotest::TempPath("qo_dboutput_pages.mdb");
+    ::DeleteFileA(path.c_str());
+    m_filter.UseDB(path.c_str());
+    ASSERT_TRUE(m_filter.Init());
+    ASSERT_EQ(2, m_source.GetNumRows());
+    WriteRows(m_filter);
+    m_filter.ReleaseFile();  // stores the rows and closes the database
+    {
+        CQoInputFilterDao in(CQoFile::typeAccess);
+        in.SetTableName("Kunden");
+        in.SetTableType(CQoInputFilterDB::tableTable);
+        in.Init(path.c_str());
+        CDaoTableDef table(&in.GetDatabase());
+        table.Open("Kunden");
+        ASSERT_EQ(3, table.GetFieldCount());
+        const std::pair<short, long> fields[] = {{dbText, 40}, {dbText, 255}, {dbLong, 4}};
+        for (int i = 0; i < 3; ++i) {
+            CDaoFieldInfo field;
+            table.GetFieldInfo(i, field, AFX_DAO_ALL_INFO);
+            EXPECT_EQ(fields[i].first, field.m_nType) << i;
+            EXPECT_EQ(fields[i].second, field.m_lSize) << i;
+        }
+        ASSERT_EQ(1, table.GetIndexCount());
+        CDaoIndexInfo index;
+        table.GetIndexInfo(0, index, AFX_DAO_ALL_INFO);
+        EXPECT_EQ("Kunden0", std::string(static_cast<LPCSTR>(index.m_strName)));
+        table.Close();
+        std::vector<std::string> rows;
+        EXPECT_EQ(2, in.NumRows());
+        for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
+            std::string row;
+            for (int c = 0; c < in.NumCols(); ++c) {
+                CQoString value;
+                in.Value(c, value);
+                row += (c ? "|" : "") + std::string(value.GetString());
+            }
+            rows.push_back(row);
+        }
+        EXPECT_EQ((std::vector<std::string>{"M\xFCller|K\xF6ln|50667", "Schmidt|Br\xFChl|50321"}), rows);
+    }
+    ::DeleteFileA(path.c_str());
+
+    // Columns keep their settings by name; a renamed one starts as text of 255.
+    Input("Name;Wohnort;PLZ\r\nM\xFCller;K\xF6ln;50667\r\n");
+    m_pPage->RefreshDisplay();
+    EXPECT_EQ("Name|Text|40|ja,Wohnort|Text|255|nein,PLZ|numerisch||nein", Cells());
+    EXPECT_FALSE(Enabled(IDC_OUTDAO_TYPE));
+    Apply(IDC_OUTDAO_APPLY);
+    EXPECT_EQ("Kunden:Name=2/40i,Wohnort=2/255,PLZ=1/255", FilterColumns());
+}
+
+TEST_F(DaoOutputPageTest, BadSettingsAreRefusedAndNothingReachesTheFilter)
+{
+    Input(kCustomers);
+    // A project may hold a type the database cannot create.
+    m_filter.SetTableName("Alt");
+    m_filter.NumCols(3);
+    const char* names[] = {"Name", "Ort", "PLZ"};
+    for (int i = 0; i < 3; ++i) m_filter.ColumnName(i, names[i]);
+    m_filter.SetType(1, 7);
+    Show();
+    EXPECT_EQ("Alt", Page().Text(IDC_OUTDAO_TABLE));
+    EXPECT_EQ("Name|Text|30|nein,Ort|||nein,PLZ|Text|30|nein", Cells());
+    const std::string before = FilterColumns();
+    const std::string length = "Die L\xE4nge des Textfeldes 'Name' muss zwischen 1 und 255 liegen.";
+
+    struct Case {
+        const char* what;
+        int row;  // -1: none selected
+        const char* table;
+        const char* fieldLen;
+        std::string message;
+    } cases[] = {
+        {"unknown type", -1, "Kunden", nullptr,
+         "Das Feld 'Ort' hat einen unbekannten Feldtyp (7). Bitte w\xE4hlen Sie 'Text' oder 'numerisch'."},
+        {"unknown type selected", 1, "Kunden", nullptr, "Bitte w\xE4hlen Sie einen Feldtyp f\xFCr das Feld 'Ort'."},
+        {"zero length", 0, "Kunden", "0", length},
+        {"too long", 0, "Kunden", "256", length},
+        {"no length", 0, "Kunden", "", "Geben Sie eine ganze Zahl ein."},
+        {"no table", 2, "  ", "20", "Bitte geben Sie den Namen der Tabelle an, in die geschrieben wird."},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        if (c.row >= 0) ClickRow(IDC_OUTDAO_LIST, c.row);
+        Page().SetText(IDC_OUTDAO_TABLE, c.table);
+        if (c.fieldLen) Page().SetText(IDC_OUTDAO_FIELDLEN, c.fieldLen);
+        EXPECT_EQ(c.message, qotest::MessageOf([&] { Apply(IDC_OUTDAO_APPLY); }));
+        EXPECT_EQ(before, FilterColumns()) << "nothing reached the filter";
+    }
+    EXPECT_EQ("Name|Text|30|nein,Ort|||nein,PLZ|Text|20|nein", Cells()) << "only PLZ was accepted";
+
+    // The type chosen, the same apply goes through.
+    ClickRow(IDC_OUTDAO_LIST, 1);
+    Page().Select(IDC_OUTDAO_TYPE, 0);
+    Page().SetText(IDC_OUTDAO_TABLE, "Kunden");
+    Apply(IDC_OUTDAO_APPLY);
+    EXPECT_EQ("Kunden:Name=2/30,Ort=2/30,PLZ=2/20", FilterColumns());
+
+    // Switched off, nothing can be used; on again, the fields follow the selection.
+    m_pPage->Enable(false);
+    for (int id : {IDC_OUTDAO_LIST, IDC_OUTDAO_TABLE, IDC_OUTDAO_TYPE, IDC_OUTDAO_FIELDLEN, IDC_OUTDAO_APPLY})
+        EXPECT_FALSE(Enabled(id)) << id;
+    m_pPage->Enable(true);
+    EXPECT_TRUE(Enabled(IDC_OUTDAO_FIELDLEN));
+    EXPECT_TRUE(Enabled(IDC_OUTDAO_INDEXED));
+}
+
+// ---------------------------------------------------------------------------
+// dBase
+
+class DbaseOutputPageTest : public DbOutputPagesTest {
+protected:
+    void Show() { DbOutputPagesTest::Show(new COutputFilterConfigDbase(10, m_pFrame), &m_filter); }
+    std::string Cells() { return DbOutputPagesTest::Cells(IDC_OUTDBF_LIST, 3); }
+    // "name:type/length,..." of the filter's field descriptions.
+    std::string Fields()
+    {
+        std::string out;
+        CDbaseField field;
+        for (int i = 0; m_filter.GetFieldDesc(i, field); ++i)
+            out += (i ? "," : "") + std::string(field.Name().GetString()) + ":" + field.Type() + "/" +
+                   std::to_string(field.Length());
+        return out;
+    }
+
+    CQoOutputFilterDbase m_filter;
+};
+
+TEST_F(DbaseOutputPageTest, TheUserSetsTypeAndLengthAndTheFileHasThoseFields)
+{
+    Input(kCustomers);
+    Show();
+    EXPECT_EQ("Name|Text|255,Ort|Text|255,PLZ|Text|255", Cells());
+    EXPECT_FALSE(Enabled(IDC_OUTDBF_TYPE));
+    EXPECT_FALSE(Enabled(IDC_OUTDBF_FIELDLEN));
+
+    ClickRow(IDC_OUTDBF_LIST, 0);
+    TypeInto(IDC_OUTDBF_FIELDLEN, "20");
+    PressKey(VK_RETURN);
+    ClickRow(IDC_OUTDBF_LIST, 2);
+    Page().Select(IDC_OUTDBF_TYPE, 1);
+    EXPECT_FALSE(Enabled(IDC_OUTDBF_FIELDLEN));
+    Apply(IDC_OUTDBF_APPLY);
+    // Numeric fields are 8 digits wide whatever length the page holds.
+    EXPECT_EQ("Name:C/20,Ort:C/255,PLZ:N/8", Fields());
+    // The page keeps its settings after the apply: the list still shows them,
+    // and an apply without a selection writes them again.
+    EXPECT_EQ("Name|Text|20,Ort|Text|255,PLZ|numerisch|", Cells());
+    qotest::CaptureWindow(m_pPage->m_hWnd, qotest::CapturePath("output-dbase-4028.png").c_str());
+    ListView_SetItemState(Item(IDC_OUTDBF_LIST), -1, 0, LVIS_SELECTED);
+    PumpApp(50);
+    Apply(IDC_OUTDBF_APPLY);
+    EXPECT_EQ("Name:C/20,Ort:C/255,PLZ:N/8", Fields());
+
+    // A real file with those fields and the rows.
+    const std::string path = qotest::TempPath("qo_dboutput_pages.dbf");
+    m_filter.UseFile(path.c_str());
+    ASSERT_TRUE(m_filter.Init());
+    WriteRows(m_filter);
+    m_filter.ReleaseFile();
+    CQoInputFilterDbase34 in;
+    in.Init(path.c_str());
+    ASSERT_EQ(3, in.NumFields());
+    std::string read;
+    CDbaseField field;
+    for (int i = 0; in.GetFieldDesc(i, field); ++i)
+        read += std::string(field.Name().GetString()) + ":" + field.Type() + "/" + std::to_string(field.Length()) + ",";
+    for (bool ok = in.FirstRow(); ok; ok = in.NextRow())
+        for (int c = 0; c < 3; ++c) {
+            CQoString value;
+            in.Value(c, value);
+            read += std::string(value.GetString()) + (c < 2 ? "|" : ",");
+        }
+    EXPECT_EQ("NAME:C/20,ORT:C/255,PLZ:N/8,M\xFCller|K\xF6ln|50667,Schmidt|Br\xFChl|50321,", read);
+
+    // A new page over the filter shows its fields; renamed columns start as text of 255.
+    m_pPage->DestroyWindow();
+    delete m_pPage;
+    Input("Name;Ort;Kasse\r\nM\xFCller;K\xF6ln;12\r\n");
+    m_pPage = new COutputFilterConfigDbase(10, m_pFrame);
+    m_pPage->SetSourceAndFilter(&m_source, &m_filter);
+    ASSERT_TRUE(m_pPage->Create(m_pFrame));
+    m_pPage->UpdateOutputFilter(0);
+    COutputFilterConfigDbase::SCol plz;
+    ASSERT_TRUE(static_cast<COutputFilterConfigDbase*>(m_pPage)->GetColumn(2, plz));
+    EXPECT_EQ("PLZ", std::string(static_cast<const char*>(plz.strName)));
+    EXPECT_EQ(1, plz.nType) << "the filter's fields before the refresh";
+    m_pPage->RefreshDisplay();
+    EXPECT_EQ("Name|Text|20,Ort|Text|255,Kasse|Text|255", Cells());
+}
+
+TEST_F(DbaseOutputPageTest, TextLengthsADbaseFileCannotHoldAreRefused)
+{
+    Input(kCustomers);
+    Show();
+    ClickRow(IDC_OUTDBF_LIST, 1);
+    const std::string range = "Die L\xE4nge des Textfeldes 'Ort' muss zwischen 1 und 255 liegen.";
+    const std::pair<const char*, std::string> cases[] = {
+        {"0", range}, {"256", range}, {"", "Geben Sie eine ganze Zahl ein."}};
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.first);
+        Page().SetText(IDC_OUTDBF_FIELDLEN, c.first);
+        EXPECT_EQ(c.second, qotest::MessageOf([&] { Apply(IDC_OUTDBF_APPLY); }));
+        EXPECT_EQ("", Fields()) << "nothing reached the filter";
+        EXPECT_EQ(Item(IDC_OUTDBF_FIELDLEN), ::GetFocus()) << "the user corrects the length";
+    }
+    EXPECT_EQ("Name|Text|255,Ort|Text|255,PLZ|Text|255", Cells());
+    Page().SetText(IDC_OUTDBF_FIELDLEN, "1");
+    Apply(IDC_OUTDBF_APPLY);
+    EXPECT_EQ("Name:C/255,Ort:C/1,PLZ:C/255", Fields());
+}
+
+}  // namespace
