@@ -42,7 +42,7 @@ bool SameParts(const std::vector<CFunctionManager::CCombiPart>& a, const std::ve
 
 CColumnMapping::CColumnMapping()
     : m_handler(CMultiColumnHandler::composeOutput), m_pComposed(nullptr), m_pRecords(nullptr), m_nInputColumns(0),
-      m_bDefined(false), m_bComposition(false), m_bSelectionPending(false)
+      m_bFunctionsBuilt(false), m_bDefined(false), m_bComposition(false), m_bSelectionPending(false)
 {
     m_pComposed = m_handler.CreateMultiColumnOutputSource();
     m_view.SetComposed(m_pComposed);
@@ -170,9 +170,10 @@ void CColumnMapping::Build(COutputFilterSource& records)
 
     m_pRecords = &records;
     m_handler.SetWriteOutputSource(&records);
-    // Input column i is function i + 1: the predefined range bounds the count.
-    m_nInputColumns = std::max(0, std::min(records.GetNumColumns(), static_cast<int>(m_functions.GetMaxPredefinedId())));
-    BuildFunctions();
+    m_nInputColumns = std::max(0, std::min(records.GetNumColumns(), qolimits::maxColumns));
+    // The functions only for the page that shows them: the manager sorts
+    // anew with every function added, too slow for wide inputs in a run.
+    m_bFunctionsBuilt = false;
     if (!m_bComposition) {
         BuildDefaultComposition();
     } else {
@@ -180,27 +181,47 @@ void CColumnMapping::Build(COutputFilterSource& records)
         for (int i = 0; i < m_nInputColumns; ++i) {
             if (m_handler.FindInnerColumn(i + 1) >= 0)
                 continue;
-            CFunctionManager::CFunction function(i + 1, CString());
-            m_functions.GetFunction(i + 1, function);
-            m_handler.AddInnerColumn(i + 1, i + 1, function.GetName(), i);
+            m_handler.AddInnerColumn(i + 1, i + 1, FunctionName(i), i);
         }
     }
+    // Without a composition of the project's the columns are the input's as
+    // read: the view reads them straight (the handler holds the same
+    // composition for the page that edits it).
+    m_view.SetComposed(m_bComposition ? m_pComposed : &records);
     m_view.Sync(wanted);
+}
+
+CString CColumnMapping::FunctionName(int column)
+{
+    CFunctionManager::CFunction stored(column + 1, CString());
+    if (m_bDefined && m_functions.GetFunction(column + 1, stored) && !stored.GetName().IsEmpty())
+        return stored.GetName();
+    CString name;
+    m_pRecords->GetName(column, name, 0);
+    return name;
+}
+
+CFunctionManager& CColumnMapping::Functions()
+{
+    if (!m_bFunctionsBuilt && m_pRecords != nullptr)
+        BuildFunctions();
+    return m_functions;
 }
 
 void CColumnMapping::BuildFunctions()
 {
+    m_bFunctionsBuilt = true;
     // The input's columns are the plain functions; what else the project
     // defines (combinations) stays as it is. Functions of columns the input no
     // longer has are dropped, combinations then skip those parts.
     CFunctionManager rebuilt;
+    // Input column i is function i + 1: the predefined range holds them all.
+    if (m_nInputColumns > rebuilt.GetMaxPredefinedId()) {
+        rebuilt.SetMaxPredefinedId(m_nInputColumns);
+        rebuilt.SetMinUserdefinedId(m_nInputColumns + 1);
+    }
     for (int i = 0; i < m_nInputColumns; ++i) {
-        CString name;
-        m_pRecords->GetName(i, name, 0);
-        CFunctionManager::CFunction stored(i + 1, CString());
-        if (m_bDefined && m_functions.GetFunction(i + 1, stored) && !stored.GetName().IsEmpty())
-            name = stored.GetName();
-        CFunctionManager::CFunction function(i + 1, name);
+        CFunctionManager::CFunction function(i + 1, FunctionName(i));
         rebuilt.AddFunction(function);
     }
     long nextCombi = rebuilt.GetMinCombiId();
@@ -232,9 +253,7 @@ void CColumnMapping::BuildDefaultComposition()
     for (int i = 0; i < m_nInputColumns; ++i) {
         CString name;
         m_pRecords->GetName(i, name, 0);
-        CFunctionManager::CFunction function(i + 1, name);
-        m_functions.GetFunction(i + 1, function);
-        m_handler.AddInnerColumn(i + 1, i + 1, function.GetName(), i);
+        m_handler.AddInnerColumn(i + 1, i + 1, FunctionName(i), i);
         m_handler.AddOuterColumn(i, name);
         m_handler.AddAssignment(i, i + 1, "", false);
     }
@@ -242,6 +261,7 @@ void CColumnMapping::BuildDefaultComposition()
 
 std::vector<long> CColumnMapping::OuterFunctions()
 {
+    Functions();
     std::vector<long> result;
     for (int i = 0; i < m_handler.NumOuterColumns(); ++i) {
         const int outerId = m_handler.GetOuterColumnId(i);
@@ -322,5 +342,6 @@ void CColumnMapping::TakeComposition(const CMultiColumnHandler& edited, bool sam
     m_bComposition = true;
     m_bDefined = true;
     m_bSelectionPending = false;
+    m_view.SetComposed(m_pComposed);
     m_view.Sync(keep);
 }

@@ -64,7 +64,8 @@ public:
 
     // What an output filter writes.
     CColumnView& View() { return m_view; }
-    CFunctionManager& Functions() { return m_functions; }
+    // The functions: the input's columns and the project's combinations.
+    CFunctionManager& Functions();
     const CMultiColumnHandler& Handler() const { return m_handler; }
     // The number of the input's columns at the last Build.
     int NumInputColumns() const { return m_nInputColumns; }
@@ -83,6 +84,8 @@ public:
 
 private:
     void BuildFunctions();
+    // The function name of an input column: the project's, else the column's.
+    CString FunctionName(int column);
     void BuildDefaultComposition();
 
     CFunctionManager m_functions;
@@ -91,6 +94,7 @@ private:
     CColumnView m_view;
     COutputFilterSource* m_pRecords;
     int m_nInputColumns;
+    bool m_bFunctionsBuilt;
 
     bool m_bDefined;
     bool m_bComposition;      // the handler holds a stored or edited composition
