@@ -151,8 +151,9 @@ bool CInputFilterConfigTextFix::SaveSettings()
     bounds.push_back(limit);
     if (limit == 0) bounds.resize(1);  // nothing to cut: no columns
     const int cols = static_cast<int>(bounds.size()) - 1;
-    // Lines mode without a line shown (an empty file): the columns stay as they are.
-    const bool keepColumns = m_bLinesMode && limit == 0;
+    // Without the view there are no marks to read, and in lines mode without a
+    // line shown (an empty file) nothing to cut: the columns stay as they are.
+    const bool keepColumns = !::IsWindow(m_textView.m_hWnd) || (m_bLinesMode && limit == 0);
 
     try {
         CInputCharSetChoice::Save(m_nCharSet, *m_pInputFilter);

@@ -203,4 +203,13 @@ TEST_F(TextFixPageTest, LinesModeCutsUpToTheLongestLineAndKeepsTheRecordLengthOf
     ::DeleteFileA(file.c_str());
 }
 
+TEST_F(TextFixPageTest, SavingWithoutTheWindowKeepsTheColumns)
+{
+    CInputFilterConfigTextFix page(&m_filter, kPageId, false);
+    page.m_nRecordLen = 30;
+    page.UpdateInputFilter(1);
+    EXPECT_EQ(30, m_filter.RecordLen());
+    EXPECT_EQ(std::vector<int>({10, 10}), Widths(m_filter));
+}
+
 }  // namespace
