@@ -233,3 +233,24 @@ int CColoredListCtrl::GetMaxColumnWidth(int column)
     ReleaseDC(pDC);
     return widest > kMinColumnWidth ? widest : kMinColumnWidth;
 }
+
+int CColoredListCtrl::ColumnAtScreenPoint(CPoint point)
+{
+    if (!::IsWindow(m_hWnd))
+        return -1;
+    CRect rcList;
+    GetWindowRect(&rcList);
+    CHeaderCtrl* pHeader = GetHeaderCtrl();
+    if (!rcList.PtInRect(point) || pHeader == NULL)
+        return -1;
+    const int nItems = pHeader->GetItemCount();
+    for (int i = 0; i < nItems; ++i) {
+        CRect rcItem;
+        if (!pHeader->GetItemRect(i, &rcItem))
+            continue;
+        pHeader->ClientToScreen(&rcItem);
+        if (rcItem.left <= point.x && point.x <= rcItem.right)
+            return i;
+    }
+    return -1;
+}

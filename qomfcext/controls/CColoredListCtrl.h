@@ -56,6 +56,10 @@ public:
     void RemoveListener(CColoredListCtrlListener* pListener);
     // Width that fits the widest text among the column's first 300 rows; at least 50.
     int GetMaxColumnWidth(int column);
+    // The column (index, not display position) whose header spans the x of a
+    // point in screen coordinates that lies on the list; -1 for a point beside
+    // the list or right of the last column. For context menus of the columns.
+    int ColumnAtScreenPoint(CPoint point);
 
 protected:
     afx_msg void OnItemchanged(NMHDR* pNMHDR, LRESULT* pResult);

@@ -4,13 +4,11 @@
 #include <vector>
 
 #include "CListRedrawOff.h"
+#include "PreviewColumnWidths.h"
 #include "CQoInputFilter.h"
 
 namespace {
 const int kNewColumnWidth = 170;
-const int kUnsampledWidth = 50;   // a column's text width when no row could be sampled
-const int kColumnPadding = 30;
-const int kListPadding = 16;      // room for the border and the scroll bar
 }
 
 CColoredInputFilterListCtrl::CColoredInputFilterListCtrl(bool useHeader)
@@ -130,19 +128,7 @@ void CColoredInputFilterListCtrl::Update()
     const long rows = CountRowsUpToLimit();
     SetItemCountEx(static_cast<int>(rows) + extraItem, LVSICF_NOINVALIDATEALL);
 
-    std::vector<int> widths(static_cast<size_t>(n));
-    long long total = kListPadding;
-    for (int i = 0; i < n; ++i) {
-        long long w = sampled > 0 ? sums[static_cast<size_t>(i)] / sampled : kUnsampledWidth;
-        w += kColumnPadding;
-        if (w > 0x7fff) w = 0x7fff;  // a header item's width is a 16-bit value
-        widths[static_cast<size_t>(i)] = static_cast<int>(w);
-        total += w;
-    }
-    CRect rcWindow;
-    GetWindowRect(&rcWindow);
-    const long long extra = total < rcWindow.Width() ? (rcWindow.Width() - total) / n : 0;
-    for (int i = 0; i < n; ++i) SetColumnWidth(i, widths[static_cast<size_t>(i)] + static_cast<int>(extra));
+    SetPreviewColumnWidths(*this, sums, sampled);
 }
 
 int CColoredInputFilterListCtrl::GetColoredItem(int row, int col, CString& text, DWORD& clrText,

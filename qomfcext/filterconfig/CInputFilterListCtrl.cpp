@@ -4,14 +4,12 @@
 #include <vector>
 
 #include "CListRedrawOff.h"
+#include "PreviewColumnWidths.h"
 #include "CQoInputFilter.h"
 #include "CColoredInputFilterListCtrl.h"
 
 namespace {
 const int kNewColumnWidth = 170;
-const int kUnsampledWidth = 50;
-const int kColumnPadding = 30;
-const int kListPadding = 16;
 }
 
 BEGIN_MESSAGE_MAP(CInputFilterListCtrl, CListCtrl)
@@ -86,17 +84,5 @@ void CInputFilterListCtrl::Update()
     }
     if (n == 0) return;
 
-    std::vector<int> widths(static_cast<size_t>(n));
-    long long total = kListPadding;
-    for (int i = 0; i < n; ++i) {
-        long long w = rows > 0 ? sums[static_cast<size_t>(i)] / rows : kUnsampledWidth;
-        w += kColumnPadding;
-        if (w > 0x7fff) w = 0x7fff;
-        widths[static_cast<size_t>(i)] = static_cast<int>(w);
-        total += w;
-    }
-    CRect rcWindow;
-    GetWindowRect(&rcWindow);
-    const long long extra = total < rcWindow.Width() ? (rcWindow.Width() - total) / n : 0;
-    for (int i = 0; i < n; ++i) SetColumnWidth(i, widths[static_cast<size_t>(i)] + static_cast<int>(extra));
+    SetPreviewColumnWidths(*this, sums, rows);
 }

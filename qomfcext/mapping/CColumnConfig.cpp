@@ -297,20 +297,7 @@ void CColumnConfig::OnColumnclickList(NMHDR* pNMHDR, LRESULT* pResult)
 void CColumnConfig::OnContextMenu(CWnd*, CPoint point)
 {
     if (!m_bEnabled || !::IsWindow(m_list.m_hWnd)) return;
-    CRect rcList;
-    m_list.GetWindowRect(&rcList);
-    if (!rcList.PtInRect(point)) return;
-
-    CHeaderCtrl* pHeader = m_list.GetHeaderCtrl();
-    if (pHeader == NULL) return;
-    int nField = -1;
-    const int nItems = pHeader->GetItemCount();
-    for (int i = 0; i < nItems && nField < 0; ++i) {
-        CRect rcItem;
-        if (!pHeader->GetItemRect(i, &rcItem)) continue;
-        pHeader->ClientToScreen(&rcItem);
-        if (rcItem.left <= point.x && point.x <= rcItem.right) nField = i;
-    }
+    const int nField = m_list.ColumnAtScreenPoint(point);
     if (nField < 0) return;
 
     m_cbFields.SetCurSel(nField);

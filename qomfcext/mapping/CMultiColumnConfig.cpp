@@ -642,19 +642,7 @@ void CMultiColumnConfig::OnFuncToNames()
 void CMultiColumnConfig::OnContextMenu(CWnd*, CPoint point)
 {
     if (!m_bEnabled || !::IsWindow(m_list.m_hWnd)) return;
-    CRect rcList;
-    m_list.GetWindowRect(&rcList);
-    if (!rcList.PtInRect(point)) return;
-    CHeaderCtrl* pHeader = m_list.GetHeaderCtrl();
-    if (pHeader == NULL) return;
-    int nColumn = -1;
-    const int nItems = pHeader->GetItemCount();
-    for (int i = 0; i < nItems && nColumn < 0; ++i) {
-        CRect rcItem;
-        if (!pHeader->GetItemRect(i, &rcItem)) continue;
-        pHeader->ClientToScreen(&rcItem);
-        if (rcItem.left <= point.x && point.x <= rcItem.right) nColumn = i;
-    }
+    const int nColumn = m_list.ColumnAtScreenPoint(point);
     if (nColumn < 0) return;
 
     CQoString name;
