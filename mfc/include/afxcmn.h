@@ -18,6 +18,28 @@ public:
   BOOL GetItemRect(int nIndex, LPRECT lpRect) const;
 };
 
+// An image list of the common controls; the object owns its handle and destroys it
+// with itself. A list control given one with SetImageList uses it without owning it
+// only when the control has the style LVS_SHAREIMAGELISTS.
+class AFX_API CImageList : public CObject {
+public:
+  CImageList() : m_hImageList(NULL) {}
+  virtual ~CImageList();
+  // cx by cy pixel images, ILC_ flags, room for nInitial images growing by nGrow.
+  BOOL Create(int cx, int cy, UINT nFlags, int nInitial, int nGrow);
+  // The icon's index in the list, -1 if it could not be added.
+  int Add(HICON hIcon);
+  int GetImageCount() const;
+  BOOL DeleteImageList();
+  HIMAGELIST GetSafeHandle() const { return m_hImageList; }
+
+  HIMAGELIST m_hImageList;
+
+private:
+  CImageList(const CImageList&);
+  CImageList& operator=(const CImageList&);
+};
+
 class AFX_API CListCtrl : public CWnd {
   DECLARE_DYNAMIC(CListCtrl)
 public:
@@ -49,6 +71,12 @@ public:
   COLORREF GetBkColor() const;
   // Items of a list that holds its own rows (not LVS_OWNERDATA for the texts).
   int InsertItem(int nItem, LPCTSTR lpszItem);
+  int InsertItem(int nItem, LPCTSTR lpszItem, int nImage);
+  // The next item after nStart (-1: from the start) that matches, -1 if none.
+  int FindItem(LVFINDINFO* pFindInfo, int nStart = -1) const;
+  // LVSIL_NORMAL, LVSIL_SMALL or LVSIL_STATE. The previous list is answered only
+  // as NULL: the subset keeps no wrapper objects for foreign handles.
+  CImageList* SetImageList(CImageList* pImageList, int nImageListType);
   BOOL SetItemText(int nItem, int nSubItem, LPCTSTR lpszText);
   CString GetItemText(int nItem, int nSubItem) const;
   BOOL DeleteAllItems();

@@ -82,6 +82,22 @@ COLORREF CListCtrl::GetBkColor() const { return (COLORREF)SEND(LVM_GETBKCOLOR, 0
 BOOL CListCtrl::SetColumn(int nCol, const LVCOLUMN* pColumn) { return (BOOL)SEND(LVM_SETCOLUMNA, nCol, pColumn); }
 BOOL CListCtrl::DeleteColumn(int nCol) { return (BOOL)SEND(LVM_DELETECOLUMN, nCol, 0); }
 int CListCtrl::GetStringWidth(LPCTSTR lpsz) const { return (int)SEND(LVM_GETSTRINGWIDTHA, 0, lpsz); }
+int CListCtrl::InsertItem(int nItem, LPCTSTR lpszItem, int nImage) {
+  LVITEMA item;
+  memset(&item, 0, sizeof(item));
+  item.mask = LVIF_TEXT | LVIF_IMAGE;
+  item.iItem = nItem;
+  item.pszText = (LPSTR)lpszItem;
+  item.iImage = nImage;
+  return (int)SEND(LVM_INSERTITEMA, 0, &item);
+}
+int CListCtrl::FindItem(LVFINDINFO* pFindInfo, int nStart) const {
+  return (int)SEND(LVM_FINDITEMA, nStart, pFindInfo);
+}
+CImageList* CListCtrl::SetImageList(CImageList* pImageList, int nImageListType) {
+  SEND(LVM_SETIMAGELIST, nImageListType, pImageList != NULL ? pImageList->m_hImageList : NULL);
+  return NULL;
+}
 int CListCtrl::InsertItem(int nItem, LPCTSTR lpszItem) {
   LVITEMA item;
   memset(&item, 0, sizeof(item));
@@ -148,5 +164,24 @@ BOOL CListCtrl::OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESUL
   if (message != WM_DRAWITEM) return CWnd::OnChildNotify(message, wParam, lParam, pResult);
   DrawItem((LPDRAWITEMSTRUCT)lParam);
   if (pResult != NULL) *pResult = TRUE;
+  return TRUE;
+}
+
+// ---------------------------------------------------------------------------
+// CImageList
+// ---------------------------------------------------------------------------
+
+CImageList::~CImageList() { DeleteImageList(); }
+BOOL CImageList::Create(int cx, int cy, UINT nFlags, int nInitial, int nGrow) {
+  DeleteImageList();
+  m_hImageList = ImageList_Create(cx, cy, nFlags, nInitial, nGrow);
+  return m_hImageList != NULL;
+}
+int CImageList::Add(HICON hIcon) { return m_hImageList != NULL ? ImageList_AddIcon(m_hImageList, hIcon) : -1; }
+int CImageList::GetImageCount() const { return m_hImageList != NULL ? ImageList_GetImageCount(m_hImageList) : 0; }
+BOOL CImageList::DeleteImageList() {
+  if (m_hImageList == NULL) return FALSE;
+  ImageList_Destroy(m_hImageList);
+  m_hImageList = NULL;
   return TRUE;
 }

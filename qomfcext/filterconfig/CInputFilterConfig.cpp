@@ -1,7 +1,11 @@
 #include "CInputFilterConfig.h"
 
+#include "CInputFilterConfigDao.h"
+#include "CInputFilterConfigDbase.h"
 #include "CInputFilterConfigTextFix.h"
 #include "CInputFilterConfigTextVar.h"
+#include "CQoInputFilterDao.h"
+#include "CQoInputFilterDbase34.h"
 #include "CQoInputFilterTextFix.h"
 #include "CQoInputFilterTextVF.h"
 #include "CQoInputFilterTextVar.h"
@@ -36,6 +40,16 @@ CInputFilterConfig* CInputFilterConfig::GetAppropriateConfig(CQoInputFilter* pFi
         if (CQoInputFilterTextVar* pTextVar = dynamic_cast<CQoInputFilterTextVar*>(pFilter))
             return new CInputFilterConfigTextVar(pTextVar, nNotifierId);
         return NULL;
+    case CQoInputFilter::filterDbase3:
+    case CQoInputFilter::filterDbase4:
+        if (CQoInputFilterDbase34* pDbase = dynamic_cast<CQoInputFilterDbase34*>(pFilter))
+            return new CInputFilterConfigDbase(pDbase, nNotifierId);
+        return NULL;
+    case CQoInputFilter::filterExcel:
+    case CQoInputFilter::filterAccess:
+        if (CQoInputFilterDao* pDao = dynamic_cast<CQoInputFilterDao*>(pFilter))
+            return new CInputFilterConfigDao(pDao, nNotifierId);
+        return NULL;
     case CQoInputFilter::filterTextFix:
         if (dynamic_cast<CQoInputFilterTextFix*>(pFilter) != NULL)
             return new CInputFilterConfigTextFix(pFilter, nNotifierId, false);
@@ -45,8 +59,7 @@ CInputFilterConfig* CInputFilterConfig::GetAppropriateConfig(CQoInputFilter* pFi
             return new CInputFilterConfigTextFix(pFilter, nNotifierId, true);
         return NULL;
     default:
-        // dBase (1, 2) and the file databases (5, 6) have no page in this build;
-        // unknown types never have one.
+        // Unknown types never have a page.
         return NULL;
     }
 }
