@@ -78,53 +78,37 @@ Result RunJob(bool bProcess, const std::vector<std::string>& args, long lUser, C
     return r;
 }
 
-TEST(ExecuterTest, LibraryModeCallsQoMainWithTheArgumentsAndPutsTheModuleFolderFirstInPath)
+TEST(ExecuterTest, TheCodeAndTheUserValueArePostedAndLibraryModePutsTheModuleFolderFirstInPath)
 {
     const std::string strModule = ModuleDir() + "\\qo_test_module.dll";
     const std::string strOut = TempFile("qo_exec_args.txt");
-    const struct {
-        const char* pszReturn;
-        int nExpected;
-        long lUser;
-    } cases[] = {{"7", 7, 11}, {"0", 0, -12}, {"-5", -5, 13}};
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.pszReturn);
-        const std::string strPathBefore = Path();
-        Result r = RunJob(false, {strModule, strOut, c.pszReturn, "mit Leerzeichen"}, c.lUser, AfxGetApp());
-        EXPECT_TRUE(r.bEnded);
-        ASSERT_TRUE(r.bPosted);
-        EXPECT_EQ(c.nExpected, r.nCode);
-        EXPECT_EQ(c.lUser, r.lUser);
-        EXPECT_EQ(ModuleDir() + ";" + strPathBefore, Path());
-        const std::vector<std::string> expected = {"4", strModule, strOut, c.pszReturn, "mit Leerzeichen", "(null)"};
-        EXPECT_EQ(expected, ReadLines(strOut));
-    }
-}
-
-TEST(ExecuterTest, FailuresArePostedAsCodes)
-{
-    const std::string strMissing = ModuleDir() + "\\fehlt.dll";
-    const std::string strNoEntry = ModuleDir() + "\\qo_test_nomain.dll";
     const struct {
         const char* pszCase;
         bool bProcess;
         std::vector<std::string> args;
         int nExpected;
     } cases[] = {
-        {"missing module", false, {strMissing}, -1},
-        {"module without QoMain", false, {strNoEntry, "x"}, -2},
+        {"QoMain returns 7", false, {strModule, strOut, "7", "mit Leerzeichen"}, 7},
+        {"QoMain returns -5", false, {strModule, strOut, "-5", "mit Leerzeichen"}, -5},
+        {"missing module", false, {ModuleDir() + "\\fehlt.dll"}, -1},
+        {"module without QoMain", false, {ModuleDir() + "\\qo_test_nomain.dll", "x"}, -2},
         {"library mode without arguments", false, {}, -1},
         {"process mode without arguments", true, {}, -2},
         {"program that does not exist", true, {BinDir() + "\\fehlt.exe"}, -2},
     };
-    long lUser = 100;
+    long lUser = -100;
     for (const auto& c : cases) {
         SCOPED_TRACE(c.pszCase);
+        const std::string strPathBefore = Path();
         Result r = RunJob(c.bProcess, c.args, ++lUser, AfxGetApp());
         EXPECT_TRUE(r.bEnded);
         ASSERT_TRUE(r.bPosted);
         EXPECT_EQ(c.nExpected, r.nCode);
         EXPECT_EQ(lUser, r.lUser);
+        if (c.args.size() < 4) continue;
+        EXPECT_EQ(ModuleDir() + ";" + strPathBefore, Path());
+        EXPECT_EQ((std::vector<std::string>{"4", strModule, strOut, c.args[2], "mit Leerzeichen", "(null)"}),
+                  ReadLines(strOut));
     }
 }
 

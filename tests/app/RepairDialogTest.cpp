@@ -3,9 +3,6 @@
 // would (typing, clicking the spin arrows, arrow keys, buttons).
 #include <gtest/gtest.h>
 
-#include <windows.h>
-
-#include <fstream>
 #include <string>
 #include <vector>
 
@@ -13,9 +10,7 @@
 #include "CQoInputFilterTextVar.h"
 #include "CQoInterActive.h"
 #include "CRepairRecordDlg.h"
-#include "Capture.h"
-#include "DialogDriver.h"
-#include "Input.h"
+#include "MfcTestHost.h"
 #include "resource.h"
 
 namespace {
@@ -55,14 +50,6 @@ void PressRefused(Dialog& d, int id)
     qotest::PumpFor(600);
 }
 
-DialogScript ExpectMessage(UINT id)
-{
-    return [id](Dialog& box) {
-        EXPECT_EQ(Text(id), box.MessageText());
-        box.Press(IDOK);
-    };
-}
-
 struct Outcome {
     std::vector<std::string> rows;
     std::string stop;   // the message that ended reading, if any
@@ -70,13 +57,7 @@ struct Outcome {
 
 class RepairTest : public ::testing::Test {
 protected:
-    void SetUp() override
-    {
-        char temp[MAX_PATH];
-        GetTempPathA(MAX_PATH, temp);
-        m_path = std::string(temp) + "qo_repair_" + std::to_string(GetCurrentProcessId()) + ".csv";
-        CQoInterActive::SetRepairRecord(CRepairRecordDlgDoIt);
-    }
+    void SetUp() override { CQoInterActive::SetRepairRecord(CRepairRecordDlgDoIt); }
     void TearDown() override
     {
         CQoInterActive::SetRepairRecord(nullptr);
@@ -87,7 +68,7 @@ protected:
     // Reads every row of `content` with the dialogs answered by `scripts`.
     Outcome Read(const std::string& content, std::vector<DialogScript> scripts)
     {
-        std::ofstream(m_path, std::ios::binary) << content;
+        m_path = qotest::WriteTempFile("qo_repair_" + std::to_string(GetCurrentProcessId()) + ".csv", content);
         Outcome out;
         qotest::DialogDriver driver;
         for (auto& s : scripts) driver.Expect(std::move(s));
@@ -193,65 +174,60 @@ TEST_F(RepairTest, SpinMovesARecordThatRunsOverTwoLinesIntoTheCorrection)
     EXPECT_EQ("", out.stop);
 }
 
-TEST_F(RepairTest, SplitAtTheStartRefusesBothWaysOutUntilMoved)
+TEST_F(RepairTest, RefusalsAndSplitsOnTheRecordAlone)
 {
-    CQoString data("abc;def\r\nghi;jkl\r\n");
-    int pos = 0;
-    qotest::DialogDriver driver;
-    driver.Expect([](Dialog& d) {
-        EXPECT_EQ("", d.Text(IDC_REPAIR_CORRECTION));
-        EXPECT_EQ("abc;def\r\nghi;jkl\r\n", d.Text(IDC_REPAIR_DATA));
-        ClickSpin(d, false);  // below 0: stays there
-        EXPECT_EQ("", d.Text(IDC_REPAIR_CORRECTION));
-        PressRefused(d, IDOK);
-        PressRefused(d, IDC_REPAIR_IGNORE);
-        d.Cancel();
-    });
-    driver.Expect(ExpectMessage(IDS_REPAIR_SET_SPLIT));
-    driver.Expect(ExpectMessage(IDS_REPAIR_SET_SPLIT));
-    EXPECT_EQ(0, CRepairRecordDlgDoIt("kunden.csv", data, pos));
-    EXPECT_EQ(0, pos);
-    EXPECT_STREQ("abc;def\r\nghi;jkl\r\n", data.GetString());
-    EXPECT_TRUE(driver.Done());
-    EXPECT_EQ(0, driver.Unanswered());
-}
-
-TEST_F(RepairTest, UnchangedRecordIsRefusedButMayBeSkipped)
-{
-    CQoString data("abc;def;xyz");
-    int pos = data.GetLength();
-    qotest::DialogDriver driver;
-    driver.Expect([](Dialog& d) {
-        EXPECT_EQ("abc;def;xyz", d.Text(IDC_REPAIR_CORRECTION));
-        EXPECT_EQ("", d.Text(IDC_REPAIR_DATA));
-        ClickSpin(d, true);  // beyond the end: stays there
-        PressRefused(d, IDOK);
-        d.SetText(IDC_REPAIR_CORRECTION, "abc;def;xyz  \r\n");  // trailing blanks and breaks only
-        PressRefused(d, IDOK);
-        d.Press(IDC_REPAIR_IGNORE);
-    });
-    driver.Expect(ExpectMessage(IDS_REPAIR_UNCHANGED));
-    driver.Expect(ExpectMessage(IDS_REPAIR_UNCHANGED));
-    EXPECT_EQ(2, CRepairRecordDlgDoIt("kunden.csv", data, pos));
-    EXPECT_EQ(11, pos);
-    EXPECT_STREQ("abc;def;xyz  \r\n", data.GetString());
-    EXPECT_TRUE(driver.Done());
-    EXPECT_EQ(0, driver.Unanswered());
-}
-
-TEST_F(RepairTest, SplitReachesDataLongerThanSixteenBits)
-{
-    CQoString data(std::string(40000, 'a'));
-    int pos = 39990;
-    qotest::DialogDriver driver;
-    driver.Expect([](Dialog& d) {
-        EXPECT_EQ(39990u, d.Text(IDC_REPAIR_CORRECTION).size());
-        ClickSpin(d, false);
-        EXPECT_EQ(39989u, d.Text(IDC_REPAIR_CORRECTION).size());
-        EXPECT_EQ(11u, d.Text(IDC_REPAIR_DATA).size());
-        d.Press(IDC_REPAIR_IGNORE);
-    });
-    EXPECT_EQ(2, CRepairRecordDlgDoIt("gross.txt", data, pos));
-    EXPECT_EQ(39989, pos);
-    EXPECT_EQ(39989, data.GetLength());
+    const std::string big(40000, 'a');
+    struct {
+        const char* what;
+        std::string data;
+        int pos;
+        DialogScript script;
+        std::vector<UINT> messages;  // the refusals, in order
+        int result, posAfter;
+        std::string dataAfter;
+    } cases[] = {
+        {"split at the start: both ways out refused until moved", "abc;def\r\nghi;jkl\r\n", 0,
+         [](Dialog& d) {
+             EXPECT_EQ("", d.Text(IDC_REPAIR_CORRECTION));
+             EXPECT_EQ("abc;def\r\nghi;jkl\r\n", d.Text(IDC_REPAIR_DATA));
+             ClickSpin(d, false);  // below 0: stays there
+             EXPECT_EQ("", d.Text(IDC_REPAIR_CORRECTION));
+             PressRefused(d, IDOK);
+             PressRefused(d, IDC_REPAIR_IGNORE);
+             d.Cancel();
+         },
+         {IDS_REPAIR_SET_SPLIT, IDS_REPAIR_SET_SPLIT}, 0, 0, "abc;def\r\nghi;jkl\r\n"},
+        {"unchanged record refused, but may be skipped", "abc;def;xyz", 11,
+         [](Dialog& d) {
+             EXPECT_EQ("", d.Text(IDC_REPAIR_DATA));
+             ClickSpin(d, true);  // beyond the end: stays there
+             PressRefused(d, IDOK);
+             d.SetText(IDC_REPAIR_CORRECTION, "abc;def;xyz  \r\n");  // trailing blanks and breaks only
+             PressRefused(d, IDOK);
+             d.Press(IDC_REPAIR_IGNORE);
+         },
+         {IDS_REPAIR_UNCHANGED, IDS_REPAIR_UNCHANGED}, 2, 11, "abc;def;xyz  \r\n"},
+        {"split beyond sixteen bits", big, 39990,
+         [](Dialog& d) {
+             ClickSpin(d, false);
+             EXPECT_EQ(39989u, d.Text(IDC_REPAIR_CORRECTION).size());
+             EXPECT_EQ(11u, d.Text(IDC_REPAIR_DATA).size());
+             d.Press(IDC_REPAIR_IGNORE);
+         },
+         {}, 2, 39989, big.substr(0, 39989)},
+    };
+    for (auto& c : cases) {
+        SCOPED_TRACE(c.what);
+        CQoString data(c.data.c_str());
+        int pos = c.pos;
+        std::vector<DialogScript> scripts = {c.script};
+        for (UINT id : c.messages)
+            scripts.push_back([id](Dialog& box) {
+                EXPECT_EQ(Text(id), box.MessageText());
+                box.Press(IDOK);
+            });
+        qotest::Answering(scripts, [&] { EXPECT_EQ(c.result, CRepairRecordDlgDoIt("kunden.csv", data, pos)); });
+        EXPECT_EQ(c.posAfter, pos);
+        EXPECT_EQ(c.dataAfter, data.GetString());
+    }
 }

@@ -28,6 +28,9 @@ public:
     int calls = 0;
 };
 
+// "Text:data:check[:aus]" of each item; Gamma is disabled.
+const std::vector<std::string> kStart = {"Alpha:10:1", "Beta:11:0", "Gamma:12:1:aus", "Delta:13:0"};
+
 const DWORD kListStyle = WS_CHILD | WS_VISIBLE | WS_BORDER | WS_VSCROLL | WS_HSCROLL | LBS_NOTIFY |
                          LBS_OWNERDRAWFIXED | LBS_HASSTRINGS | LBS_NOINTEGRALHEIGHT;
 
@@ -40,12 +43,7 @@ protected:
         ASSERT_TRUE(m_list.Create(kListStyle, CRect(10, 10, 230, 210), m_pFrame, 100));
         m_list.SetFont(CFont::FromHandle((HFONT)::GetStockObject(DEFAULT_GUI_FONT)));
         m_list.AddModifiedListener(&m_listener);
-        // Text, item data, tick; Gamma is disabled.
-        m_list.AddString("Alpha", 10, 1);
-        m_list.AddString("Beta", 11, 0);
-        m_list.AddString("Gamma", 12, 1);
-        m_list.AddString("Delta", 13, 0);
-        m_list.Enable(2, FALSE);
+        Fill(kStart);
         qotest::BringToFront(m_list.m_hWnd);
     }
     void TearDown() override
@@ -124,7 +122,7 @@ std::vector<int> MarkerRows(HWND list)
 
 TEST_F(DragCheckListBoxTest, ADraggedItemLandsWhereTheBarShowedWithItsDataAndStates)
 {
-    const std::vector<std::string> start = {"Alpha:10:1", "Beta:11:0", "Gamma:12:1:aus", "Delta:13:0"};
+    const std::vector<std::string>& start = kStart;
     struct {
         const char* what;
         int from, to;
@@ -176,35 +174,31 @@ TEST_F(DragCheckListBoxTest, TheBarShowsDuringADragAndNeverWithNoDrag)
             EXPECT_EQ((std::vector<int>{Item(1).bottom - 1, Item(1).bottom, Item(1).bottom + 1}), rows);
         }
         EXPECT_EQ(noDrag ? "Alpha:10:1" : "Beta:11:0", Items()[0]);
-        m_list.DeleteString(noDrag ? 0 : 1);
-        m_list.InsertString(0, "Alpha");
-        m_list.SetItemData(0, 10);
-        m_list.SetCheck(0, 1);
+        Fill(kStart);
     }
 }
 
 TEST_F(DragCheckListBoxTest, TicksByClickAndSpaceBarReachTheListenersAsDoOtherKeys)
 {
     struct {
-        const char* what;
+        int item;  // -1: a key
+        WORD key;
         std::vector<int> checks;
     } const steps[] = {
-        {"click in Beta's box", {1, 1, 1, 0}},
-        {"space", {1, 0, 1, 0}},
-        {"down", {1, 0, 1, 0}},  // Gamma is selected, disabled: space does nothing to it
-        {"space", {1, 0, 1, 0}},
-        {"click in Alpha's box", {0, 0, 1, 0}},
+        {1, 0, {1, 1, 1, 0}},          // click in Beta's box
+        {-1, VK_SPACE, {1, 0, 1, 0}},
+        {-1, VK_DOWN, {1, 0, 1, 0}},   // Gamma is selected, disabled: space does nothing to it
+        {-1, VK_SPACE, {1, 0, 1, 0}},
+        {0, 0, {0, 0, 1, 0}},          // click in Alpha's box
     };
     for (const auto& s : steps) {
-        SCOPED_TRACE(s.what);
+        SCOPED_TRACE(s.item >= 0 ? "click " + std::to_string(s.item) : "key " + std::to_string(s.key));
         const int before = m_listener.calls;
-        const std::string what = s.what;
-        if (what == "space" || what == "down") {
-            qotest::PressKey(what == "space" ? VK_SPACE : VK_DOWN);
+        if (s.item < 0) {
+            qotest::PressKey(s.key);
         } else {
             ::Sleep(600);  // no double click with the click before
-            const CRect rc = Item(what.find("Beta") != std::string::npos ? 1 : 0);
-            qotest::Click(m_list.m_hWnd, rc.left + 8, rc.CenterPoint().y);
+            qotest::Click(m_list.m_hWnd, Item(s.item).left + 8, Item(s.item).CenterPoint().y);
         }
         qotest::PumpFor(30);
         std::vector<int> checks;

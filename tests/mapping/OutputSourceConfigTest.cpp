@@ -8,6 +8,7 @@
 #include <COutputFilterSourceConfig.h>
 #include <CPrefixDialog.h>
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -111,50 +112,34 @@ protected:
 TEST_F(OutputSourceConfigTest, TicksAndADragGoIntoTheSourceAtOnceAndOnlyChangesAreTold)
 {
     EXPECT_EQ((std::vector<std::string>{"Name", "Vorname", "PLZ", "Ort"}), ListTexts());
-    // The list covers the page.
-    RECT page, list;
+    RECT page, list;  // the list covers the page
     ::GetClientRect(m_page.m_hWnd, &page);
     ::GetWindowRect(m_list, &list);
-    EXPECT_EQ(page.right, list.right - list.left);
-    EXPECT_EQ(page.bottom, list.bottom - list.top);
+    EXPECT_EQ(page.right * 10000 + page.bottom, (list.right - list.left) * 10000 + list.bottom - list.top);
 
-    struct {
+    auto drag = [this](int from, int to) {
+        ::Sleep(600);  // no double click with the click before
+        qotest::Drag(m_list, {80, Item(from).top + 4}, {80, Item(to).top + 3});
+    };
+    const struct {
         const char* what;
+        std::function<void()> act;
         std::string entries;
-        int calls;
-        int columns;
+        int calls, columns;
         std::string first;
-    } const steps[] = {
-        {"untick Vorname", "Name:0 -Vorname:1 PLZ:2 Ort:3", 1, 3, "Meier"},
-        {"click on the text of Name", "Name:0 -Vorname:1 PLZ:2 Ort:3", 1, 3, "Meier"},
-        {"space on Name", "-Name:0 -Vorname:1 PLZ:2 Ort:3", 2, 2, "10115"},
-        {"down and up", "-Name:0 -Vorname:1 PLZ:2 Ort:3", 2, 2, "10115"},
-        {"drag PLZ to the top", "PLZ:2 -Name:0 -Vorname:1 Ort:3", 3, 2, "10115"},
-        {"drag Ort above Name", "PLZ:2 Ort:3 -Name:0 -Vorname:1", 4, 2, "10115"},
-        {"tick Vorname", "PLZ:2 Ort:3 -Name:0 Vorname:1", 5, 3, "10115"},
+    } steps[] = {
+        {"untick Vorname", [&] { ClickBox(1); }, "Name:0 -Vorname:1 PLZ:2 Ort:3", 1, 3, "Meier"},
+        {"click on the text of Name", [&] { ::Sleep(600), qotest::Click(m_list, 80, Item(0).top + 4); }, "Name:0 -Vorname:1 PLZ:2 Ort:3", 1, 3, "Meier"},
+        {"space on Name", [] { qotest::PressKey(VK_SPACE); }, "-Name:0 -Vorname:1 PLZ:2 Ort:3", 2, 2, "10115"},
+        {"down and up", [] { qotest::PressKey(VK_DOWN), qotest::PressKey(VK_UP); }, "-Name:0 -Vorname:1 PLZ:2 Ort:3", 2,
+         2, "10115"},
+        {"drag PLZ to the top", [&] { drag(2, 0); }, "PLZ:2 -Name:0 -Vorname:1 Ort:3", 3, 2, "10115"},
+        {"drag Ort above Name", [&] { drag(3, 1); }, "PLZ:2 Ort:3 -Name:0 -Vorname:1", 4, 2, "10115"},
+        {"tick Vorname", [&] { ClickBox(3); }, "PLZ:2 Ort:3 -Name:0 Vorname:1", 5, 3, "10115"},
     };
     for (const auto& s : steps) {
         SCOPED_TRACE(s.what);
-        const std::string what = s.what;
-        if (what == "untick Vorname") ClickBox(1);
-        if (what == "tick Vorname") ClickBox(3);
-        if (what == "click on the text of Name") {
-            ::Sleep(600);
-            qotest::Click(m_list, 80, Item(0).top + 4);
-        }
-        if (what == "space on Name") qotest::PressKey(VK_SPACE);
-        if (what == "down and up") {
-            qotest::PressKey(VK_DOWN);
-            qotest::PressKey(VK_UP);
-        }
-        if (what == "drag PLZ to the top") {
-            ::Sleep(600);
-            qotest::Drag(m_list, {80, Item(2).top + 4}, {80, Item(0).top + 3});
-        }
-        if (what == "drag Ort above Name") {
-            ::Sleep(600);
-            qotest::Drag(m_list, {80, Item(3).top + 4}, {80, Item(1).top + 3});
-        }
+        s.act();
         qotest::PumpApp(50);
         EXPECT_EQ(s.entries, Entries());
         EXPECT_EQ(s.calls, m_host.calls);
