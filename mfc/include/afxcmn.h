@@ -140,3 +140,60 @@ public:
   void SetRange32(int nLower, int nUpper);
   void GetRange32(int& lower, int& upper) const;
 };
+
+// The tree view. Items are HTREEITEM handles that stay valid until the item is
+// deleted; texts are copied by the control. The notifications (TVN_SELCHANGING,
+// TVN_ITEMEXPANDING, ...) reach the control's own message map through
+// ON_NOTIFY_REFLECT, where a nonzero *pResult refuses the change.
+class AFX_API CTreeCtrl : public CWnd {
+  DECLARE_DYNAMIC(CTreeCtrl)
+public:
+  CTreeCtrl() {}
+  virtual BOOL Create(DWORD dwStyle, const RECT& rect, CWnd* pParentWnd, UINT nID);
+
+  // TVSIL_NORMAL or TVSIL_STATE; the control uses the list without owning it. The
+  // previous list is answered only as NULL (no wrappers for foreign handles).
+  CImageList* SetImageList(CImageList* pImageList, int nImageListType);
+
+  HTREEITEM InsertItem(LPTVINSERTSTRUCT lpInsertStruct);
+  HTREEITEM InsertItem(UINT nMask, LPCTSTR lpszItem, int nImage, int nSelectedImage, UINT nState,
+                       UINT nStateMask, LPARAM lParam, HTREEITEM hParent, HTREEITEM hInsertAfter);
+  HTREEITEM InsertItem(LPCTSTR lpszItem, HTREEITEM hParent = TVI_ROOT, HTREEITEM hInsertAfter = TVI_LAST);
+  BOOL DeleteItem(HTREEITEM hItem);
+  BOOL DeleteAllItems();
+  UINT GetCount() const;
+
+  // pItem->hItem and pItem->mask say which item and what to read or write.
+  BOOL GetItem(TVITEM* pItem) const;
+  BOOL SetItem(TVITEM* pItem);
+  BOOL SetItem(HTREEITEM hItem, UINT nMask, LPCTSTR lpszItem, int nImage, int nSelectedImage, UINT nState,
+               UINT nStateMask, LPARAM lParam);
+  CString GetItemText(HTREEITEM hItem) const;
+  BOOL SetItemText(HTREEITEM hItem, LPCTSTR lpszItem);
+  DWORD_PTR GetItemData(HTREEITEM hItem) const;
+  BOOL SetItemData(HTREEITEM hItem, DWORD_PTR dwData);
+  UINT GetItemState(HTREEITEM hItem, UINT nStateMask) const;
+  BOOL SetItemState(HTREEITEM hItem, UINT nState, UINT nStateMask);
+  BOOL GetItemImage(HTREEITEM hItem, int& nImage, int& nSelectedImage) const;
+  // Whether the item shows an expand button (cChildren nonzero).
+  BOOL ItemHasChildren(HTREEITEM hItem) const;
+  // bTextOnly: the rectangle of the text alone; FALSE if the item is not visible.
+  BOOL GetItemRect(HTREEITEM hItem, LPRECT lpRect, BOOL bTextOnly) const;
+
+  // Navigation (TVGN_ codes); NULL where there is no such item.
+  HTREEITEM GetNextItem(HTREEITEM hItem, UINT nCode) const;
+  HTREEITEM GetChildItem(HTREEITEM hItem) const;
+  HTREEITEM GetNextSiblingItem(HTREEITEM hItem) const;
+  HTREEITEM GetPrevSiblingItem(HTREEITEM hItem) const;
+  HTREEITEM GetParentItem(HTREEITEM hItem) const;
+  HTREEITEM GetRootItem() const;
+  HTREEITEM GetSelectedItem() const;
+  HTREEITEM GetFirstVisibleItem() const;
+
+  BOOL SelectItem(HTREEITEM hItem);
+  // TVE_EXPAND, TVE_COLLAPSE or TVE_TOGGLE.
+  BOOL Expand(HTREEITEM hItem, UINT nCode);
+  BOOL EnsureVisible(HTREEITEM hItem);
+  // The item at a point of the client area; *pFlags receives the TVHT_ flags.
+  HTREEITEM HitTest(CPoint pt, UINT* pFlags = NULL) const;
+};
