@@ -14,7 +14,7 @@
 
 #include <afxwin.h>
 
-#include "CStaticFilespec.h"
+#include "CStaticFilePath.h"
 #include "QoMfcExtApi.h"
 
 class QOMFCEXT_API CQoFileOpenDlg : public CDialog

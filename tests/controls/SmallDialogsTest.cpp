@@ -11,7 +11,7 @@
 #include "CQoInfoView.h"
 #include "CQoInputDialog.h"
 #include "CQoLog.h"
-#include "CStaticFilespec.h"
+#include "CStaticFilePath.h"
 #include "CStaticLink.h"
 #include "MfcTestHost.h"
 #include "resource.h"

@@ -1,4 +1,4 @@
-#include "CStaticFilespec.h"
+#include "CStaticFilePath.h"
 
 #include <vector>
 
