@@ -19,6 +19,7 @@
 #include <string>
 #include <vector>
 
+#include "FileSource.h"
 #include "MfcTestHost.h"
 #include "resource.h"
 
@@ -27,28 +28,7 @@ namespace {
 using qotest::PressKey;
 using qotest::PumpApp;
 
-// The rows of a delimited input file as the host's output source.
-class FileSource : public COutputFilterSource {
-public:
-    explicit FileSource(CQoInputFilterTextVar& in) : m_in(in) {}
-    void GetSourceValue(long row, int column, CString& value) override
-    {
-        CQoString text;
-        if (m_in.AbsoluteRow(row)) m_in.Value(column, text);
-        value = text.GetString();
-    }
-    void GetSourceName(int column, CString& name, int) override
-    {
-        CQoString text;
-        m_in.ColName(column, text);
-        name = text.GetString();
-    }
-    int NumSourceColumns() override { return m_in.NumCols(); }
-    long NumSourceRows() override { return m_in.NumRows(); }
-
-private:
-    CQoInputFilterTextVar& m_in;
-};
+using qotest::FileSource;
 
 const char* const kCustomers = "Name;Ort;PLZ\r\nM\xFCller;K\xF6ln;50667\r\nSchmidt;Br\xFChl;50321\r\n";
 

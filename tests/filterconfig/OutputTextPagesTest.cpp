@@ -18,6 +18,7 @@
 #include <string>
 #include <vector>
 
+#include "FileSource.h"
 #include "MfcTestHost.h"
 #include "resource.h"
 
@@ -27,29 +28,7 @@ using qotest::PressKey;
 using qotest::PumpApp;
 using qotest::WindowText;
 
-// The rows of a delimited input file as the host's output source, as an
-// application of the family maps its input.
-class FileSource : public COutputFilterSource {
-public:
-    explicit FileSource(CQoInputFilterTextVar& in) : m_in(in) {}
-    void GetSourceValue(long row, int column, CString& value) override
-    {
-        CQoString text;
-        if (m_in.AbsoluteRow(row)) m_in.Value(column, text);
-        value = text.GetString();
-    }
-    void GetSourceName(int column, CString& name, int) override
-    {
-        CQoString text;
-        m_in.ColName(column, text);
-        name = text.GetString();
-    }
-    int NumSourceColumns() override { return m_in.NumCols(); }
-    long NumSourceRows() override { return m_in.NumRows(); }
-
-private:
-    CQoInputFilterTextVar& m_in;
-};
+using qotest::FileSource;
 
 class OutputTextPagesTest : public qotest::HostFrameTest {
 protected:
