@@ -7,7 +7,11 @@
 #include <CQoInputFilterDao.h>
 #include <CQoInputFilterODBC.h>
 #include <CQoOutputFilterDao.h>
+#include <CQoInputFilterDbase34.h>
+#include <CQoInputFilterTextFix.h>
+#include <CQoInputFilterTextVF.h>
 #include <CQoInputFilterTextVar.h>
+#include <CQoOutputFilterDbase.h>
 #include <CQoOutputFilterODBC.h>
 #include <CQoOutputFilterTextFix.h>
 #include <CQoOutputFilterTextVar.h>
@@ -75,13 +79,33 @@ private:
 };
 
 CConversion::CConversion()
-    : m_bSkipDefective(false), m_inputCharset(charsetAnsi), m_outputCharset(charsetAnsi),
-      m_outputFormat(formatDelimited), m_bTextFilters(false), m_pProgress(nullptr), m_lSkipped(0)
+    : m_bSkipDefective(false), m_pProgress(nullptr), m_lSkipped(0)
 {
+    Clear();
+}
+
+void CConversion::Clear()
+{
+    m_inputFile.Empty();
+    m_inputFormat = inputDelimited;
+    m_inputCharset = charsetAnsi;
+    m_outputFile.Empty();
+    m_outputCharset = charsetAnsi;
+    m_inputConnect.Empty();
+    m_inputTable.Empty();
+    m_inputSql.Empty();
+    m_outputConnect.Empty();
+    m_outputTable.Empty();
+    m_inputDatabase.Empty();
+    m_outputDatabase.Empty();
+    m_outputFormat = formatDelimited;
+    m_filterSettings.Clear();
+    m_bFilters = false;
 }
 
 void CConversion::ReadConfig(CQoConfigFile& config)
 {
+    Clear();
     config.GetValue(kInput, "Datei", m_inputFile);
     ReadCharset(config, kInput, m_inputCharset);
     config.GetValue(kOutput, "Datei", m_outputFile);
@@ -93,28 +117,33 @@ void CConversion::ReadConfig(CQoConfigFile& config)
     config.GetValue(kOutput, "Tabelle", m_outputTable);
     config.GetValue(kInput, "Datenbank", m_inputDatabase);
     config.GetValue(kOutput, "Datenbank", m_outputDatabase);
-    if (config.HasKey(kOutput, "Format")) {
-        CQoString text;
-        config.GetValue(kOutput, "Format", text);
-        int format = -1;
-        if (!config.GetValue(kOutput, "Format", format) || (format != formatDelimited && format != formatFixed)) {
-            CQoString message;
-            message.Format("Unbekanntes Ausgabeformat '%s' in [Ausgabe] (erlaubt: 0 Trennzeichen, 1 feste L\xE4nge).",
-                           (const char*)text);
-            CQoException::Throw(message, "Format");
-        }
-        m_outputFormat = format;
-    }
-    m_filterSettings.Clear();
+    ReadFormat(config, kInput, inputDbase,
+               "0 Trennzeichen, 1 feste Satzl\xE4nge, 2 feste Spalten, 3 dBase", m_inputFormat);
+    ReadFormat(config, kOutput, formatDbase, "0 Trennzeichen, 1 feste L\xE4nge, 2 dBase", m_outputFormat);
     m_filterSettings.CopySection(config, kInputFilter);
     m_filterSettings.CopySection(config, kOutputFilter);
-    m_bTextFilters = config.HasSection(kInputFilter) || config.HasSection(kOutputFilter)
-                     || config.HasKey(kOutput, "Format");
+    m_bFilters = config.HasSection(kInputFilter) || config.HasSection(kOutputFilter)
+                 || config.HasKey(kOutput, "Format") || config.HasKey(kInput, "Format");
     if (InputIsDatabase() && m_inputTable.IsEmpty() && m_inputSql.IsEmpty())
         CQoException::Throw("Zur Datenbank-Eingabe fehlt die Tabelle (Tabelle=) oder die Abfrage (SQL=).", "Eingabe");
     if (OutputIsDatabase() && m_outputTable.IsEmpty())
         CQoException::Throw("Zur Datenbank-Ausgabe fehlt die Tabelle (Tabelle=).", "Ausgabe");
     m_columns.ReadConfig(config);
+}
+
+void CConversion::ReadFormat(CQoConfigFile& config, const char* section, int last, const char* allowed, int& format)
+{
+    if (!config.HasKey(section, "Format"))
+        return;
+    CQoString text;
+    config.GetValue(section, "Format", text);
+    int value = -1;
+    if (!config.GetValue(section, "Format", value) || value < 0 || value > last) {
+        CQoString message;
+        message.Format("Unbekanntes %sformat '%s' in [%s] (erlaubt: %s).", section, (const char*)text, section, allowed);
+        CQoException::Throw(message, "Format");
+    }
+    format = value;
 }
 
 void CConversion::ReadCharset(CQoConfigFile& config, const char* section, int& charset)
@@ -134,29 +163,99 @@ void CConversion::ReadCharset(CQoConfigFile& config, const char* section, int& c
     charset = value;
 }
 
+namespace {
+// A setting the project does not use leaves no empty key behind.
+void Store(CQoConfigFile& config, const char* section, const char* key, const CQoString& value)
+{
+    if (value.IsEmpty())
+        config.DeleteKey(section, key);
+    else
+        config.SetValue(section, key, value);
+}
+}
+
 void CConversion::WriteConfig(CQoConfigFile& config) const
 {
-    config.SetValue(kInput, "Datei", m_inputFile);
+    Store(config, kInput, "Datei", m_inputFile);
     config.SetValue(kInput, "Zeichensatz", m_inputCharset);
-    config.SetValue(kOutput, "Datei", m_outputFile);
+    Store(config, kOutput, "Datei", m_outputFile);
     config.SetValue(kOutput, "Zeichensatz", m_outputCharset);
-    config.SetValue(kInput, "Datenbank", m_inputDatabase);
-    config.SetValue(kInput, "Tabelle", m_inputTable);
-    config.SetValue(kOutput, "Datenbank", m_outputDatabase);
-    config.SetValue(kOutput, "Tabelle", m_outputTable);
-    if (m_bTextFilters) {
+    Store(config, kInput, "Datenbank", m_inputDatabase);
+    Store(config, kInput, "ODBC", m_inputConnect);
+    Store(config, kInput, "Tabelle", m_inputTable);
+    Store(config, kInput, "SQL", m_inputSql);
+    Store(config, kOutput, "Datenbank", m_outputDatabase);
+    Store(config, kOutput, "ODBC", m_outputConnect);
+    Store(config, kOutput, "Tabelle", m_outputTable);
+    if (m_bFilters) {
+        config.SetValue(kInput, "Format", m_inputFormat);
         config.SetValue(kOutput, "Format", m_outputFormat);
+        // The sections are replaced whole: keys of another kind of filter
+        // do not stay behind.
         config.CopySection(m_filterSettings, kInputFilter);
         config.CopySection(m_filterSettings, kOutputFilter);
     }
     m_columns.WriteConfig(config);
 }
 
+int CConversion::InputKind() const
+{
+    if (!m_inputConnect.IsEmpty())
+        return inputOdbc;
+    return m_inputDatabase.IsEmpty() ? m_inputFormat : int(inputDatabase);
+}
+
+int CConversion::OutputKind() const
+{
+    if (!m_outputConnect.IsEmpty())
+        return outputOdbc;
+    return m_outputDatabase.IsEmpty() ? m_outputFormat : int(outputDatabase);
+}
+
+void CConversion::SetInput(int kind, const CQoString& location)
+{
+    if (kind != InputKind()) {
+        m_filterSettings.DeleteSection(kInputFilter);
+        m_inputTable.Empty();
+        m_inputSql.Empty();
+    }
+    m_inputFile.Empty();
+    m_inputDatabase.Empty();
+    m_inputConnect.Empty();
+    if (kind == inputOdbc) {
+        m_inputConnect = location;
+    } else if (kind == inputDatabase) {
+        m_inputDatabase = location;
+    } else {
+        m_inputFile = location;
+        m_inputFormat = kind >= inputDelimited && kind <= inputDbase ? kind : int(inputDelimited);
+    }
+    m_bFilters = true;
+}
+
+void CConversion::SetOutput(int kind, const CQoString& location)
+{
+    if (kind != OutputKind())
+        m_filterSettings.DeleteSection(kOutputFilter);
+    m_outputFile.Empty();
+    m_outputDatabase.Empty();
+    m_outputConnect.Empty();
+    if (kind == outputOdbc) {
+        m_outputConnect = location;
+    } else if (kind == outputDatabase) {
+        m_outputDatabase = location;
+    } else {
+        m_outputFile = location;
+        m_outputFormat = kind >= formatDelimited && kind <= formatDbase ? kind : int(formatDelimited);
+    }
+    m_bFilters = true;
+}
+
 CQoString CConversion::InFolder(const CQoString& folder, const CQoString& file)
 {
     bool absolute = (file.GetLength() >= 2 && file.GetAt(1) == ':')
                     || (!file.IsEmpty() && (file.GetAt(0) == '\\' || file.GetAt(0) == '/'));
-    return absolute || file.IsEmpty() ? file : folder + "\\" + file;
+    return absolute || file.IsEmpty() || folder.IsEmpty() ? file : folder + "\\" + file;
 }
 
 namespace {
@@ -208,7 +307,7 @@ int CConversion::FileMode(int charset)
 
 long CConversion::Run()
 {
-    return InputIsDatabase() || OutputIsDatabase() || m_bTextFilters || m_columns.IsDefined() ? RunRecords()
+    return InputIsDatabase() || OutputIsDatabase() || m_bFilters || m_columns.IsDefined() ? RunRecords()
                                                                                              : RunLines();
 }
 
@@ -226,119 +325,241 @@ CQoString Quoted(const CQoString& name)
 }
 }
 
-CQoInputFilter* CConversion::NewInput() const
+CQoInputFilter* CConversion::NewInputFilter() const
 {
-    if (!m_inputDatabase.IsEmpty()) {
-        CQoString extension = m_inputDatabase.Right(5);
-        bool excel = _stricmp(extension, ".xlsx") == 0;
-        std::unique_ptr<CQoInputFilterDao> dao(new CQoInputFilterDao(excel ? CQoFile::typeExcel : CQoFile::typeAccess));
-        if (m_inputSql.IsEmpty()) {
-            dao->SetTableName(m_inputTable);
-            dao->SetTableType(CQoInputFilterDB::tableTable);
-        } else {
+    return MakeInputFilter(false);
+}
+
+CQoInputFilter* CConversion::MakeInputFilter(bool run) const
+{
+    std::unique_ptr<CQoInputFilter> filter;
+    switch (InputKind()) {
+    case inputOdbc: {
+        CQoInputFilterODBC* odbc = new CQoInputFilterODBC(m_inputConnect);
+        filter.reset(odbc);
+        odbc->SetTableName(m_inputSql.IsEmpty() ? m_inputTable : m_inputSql);
+        odbc->SetTableType(m_inputSql.IsEmpty() ? CQoInputFilterDB::tableTable : CQoInputFilterDB::tableSql);
+        return filter.release();
+    }
+    case inputDatabase: {
+        bool excel = _stricmp(m_inputDatabase.Right(5), ".xlsx") == 0;
+        CQoInputFilterDao* dao = new CQoInputFilterDao(excel ? CQoFile::typeExcel : CQoFile::typeAccess);
+        filter.reset(dao);
+        // A project names its table with its keys; the page's pick comes back
+        // through TakeInputSettings.
+        if (!m_inputSql.IsEmpty()) {
             dao->SetTableName(m_inputSql);
             dao->SetTableType(CQoInputFilterDB::tableSql);
+        } else if (!m_inputTable.IsEmpty()) {
+            dao->SetTableName(m_inputTable);
+            dao->SetTableType(CQoInputFilterDB::tableTable);
         }
-        dao->Init(m_inputDatabase);
-        if (!dao->GetDatabase().IsOpen())
-            CQoException::Throw("Die Datenbank ist nicht ge\xF6" "ffnet.", m_inputDatabase);
-        return dao.release();
+        return filter.release();
     }
-    if (InputIsDatabase()) {
-        std::unique_ptr<CQoInputFilterODBC> odbc(new CQoInputFilterODBC(m_inputConnect));
-        odbc->Init("");
-        if (m_inputSql.IsEmpty())
-            odbc->InitTable(m_inputTable, CQoInputFilterDB::tableTable, false);
-        else
-            odbc->InitTable(m_inputSql, CQoInputFilterDB::tableSql, false);
-        return odbc.release();
+    case inputFixed:
+        filter.reset(new CQoInputFilterTextFix);
+        break;
+    case inputColumns:
+        filter.reset(new CQoInputFilterTextVF);
+        break;
+    case inputDbase:
+        filter.reset(new CQoInputFilterDbase34);
+        break;
+    default: {
+        // The delimited input of a run logs its defective records.
+        CQoInputFilterTextVar* text = run ? new CConversionInput(*const_cast<CConversion*>(this))
+                                          : new CQoInputFilterTextVar;
+        filter.reset(text);
+        text->Delimiter(';');
+        text->SetFirstRowHasNames(true);
+        break;
     }
-    std::unique_ptr<CQoInputFilterTextVar> text(new CConversionInput(*const_cast<CConversion*>(this)));
-    ConfigureInput(*text);
-    text->Init(m_inputFile);
-    return text.release();
-}
-
-void CConversion::ConfigureInput(CQoInputFilterTextVar& filter) const
-{
-    filter.Delimiter(';');
-    filter.SetFirstRowHasNames(true);
-    filter.CharSet(FileMode(m_inputCharset));
+    }
+    filter->CharSet(FileMode(m_inputCharset));
     if (m_filterSettings.HasSection(kInputFilter)) {
         CQoConfigFile settings(m_filterSettings);   // the filters read from a file they may change
-        filter.ReadConfig(settings, kInputFilter);
+        filter->ReadConfig(settings, kInputFilter);
+    }
+    return filter.release();
+}
+
+void CConversion::OpenInputFilter(CQoInputFilter& filter, const CQoString& folder, bool numbered) const
+{
+    switch (InputKind()) {
+    case inputOdbc: {
+        // The rows of a table are counted (a large table is read once more
+        // for it) only when they are to be reached by number.
+        CQoInputFilterODBC& odbc = static_cast<CQoInputFilterODBC&>(filter);
+        CQoString table = odbc.GetTableName();
+        CQoInputFilterDB::tabletype type = odbc.GetTableType();
+        odbc.SetTableName(CQoString());
+        odbc.Init(ConnectInFolder(folder, m_inputConnect));
+        odbc.SetTableName(table);
+        if (!table.IsEmpty())
+            odbc.InitTable(table, type, numbered);
+        break;
+    }
+    case inputDatabase: {
+        CQoInputFilterDao& dao = static_cast<CQoInputFilterDao&>(filter);
+        dao.Init(InFolder(folder, m_inputDatabase));
+        if (!dao.GetDatabase().IsOpen())
+            CQoException::Throw("Die Datenbank ist nicht ge\xF6" "ffnet.", m_inputDatabase);
+        break;
+    }
+    default:
+        filter.Init(InFolder(folder, m_inputFile));
+        break;
     }
 }
 
-CQoOutputFilter* CConversion::NewTextOutput() const
+CQoInputFilter* CConversion::NewInput()
 {
-    std::unique_ptr<CQoOutputFilter> text;
-    if (m_outputFormat == formatFixed) {
-        text.reset(new CQoOutputFilterTextFix);
-    } else {
+    std::unique_ptr<CQoInputFilter> filter(MakeInputFilter(true));
+    OpenInputFilter(*filter);
+    return filter.release();
+}
+
+namespace {
+// The ODBC output keeps only its column names in a project; its table's
+// columns are kept as the file-database output keeps them, so that types,
+// lengths and indexes set on its page are not lost.
+void TransferColumns(CQoOutputFilterDB& from, CQoOutputFilterDB& to)
+{
+    to.SetTableName(from.GetTableName());
+    to.NumCols(from.NumCols());
+    CQoString name;
+    for (int c = 0; c < from.NumCols(); ++c) {
+        from.GetColumnName(c, name);
+        to.ColumnName(c, name);
+        to.SetType(c, from.GetType(c));
+        to.SetLength(c, from.GetLength(c));
+        to.SetIndexed(c, from.GetIndexed(c));
+    }
+}
+}
+
+CQoOutputFilter* CConversion::NewOutputFilter() const
+{
+    std::unique_ptr<CQoOutputFilter> filter;
+    CQoConfigFile settings(m_filterSettings);   // the filters read from a file they may change
+    const bool stored = m_filterSettings.HasSection(kOutputFilter);
+    switch (OutputKind()) {
+    case outputOdbc: {
+        CQoOutputFilterODBC* odbc = new CQoOutputFilterODBC;
+        filter.reset(odbc);
+        if (stored) {
+            CQoOutputFilterDao columns;
+            columns.ReadConfig(settings, kOutputFilter);
+            TransferColumns(columns, *odbc);
+        }
+        odbc->SetTableName(m_outputTable);
+        return filter.release();
+    }
+    case outputDatabase: {
+        CQoOutputFilterDao* dao = new CQoOutputFilterDao;
+        filter.reset(dao);
+        if (stored)
+            dao->ReadConfig(settings, kOutputFilter);
+        dao->SetTableName(m_outputTable);
+        return filter.release();
+    }
+    case formatDbase:
+        filter.reset(new CQoOutputFilterDbase);
+        break;
+    case formatFixed:
+        filter.reset(new CQoOutputFilterTextFix);
+        filter->FileCharSet(FileMode(m_outputCharset));
+        break;
+    default: {
         CQoOutputFilterTextVar* delimited = new CQoOutputFilterTextVar;
-        text.reset(delimited);
+        filter.reset(delimited);
         delimited->WriteHeaderFlag(true);
+        filter->FileCharSet(FileMode(m_outputCharset));
+        break;
     }
-    text->FileCharSet(FileMode(m_outputCharset));
-    if (m_filterSettings.HasSection(kOutputFilter)) {
-        CQoConfigFile settings(m_filterSettings);
-        text->ReadConfig(settings, kOutputFilter);
     }
-    return text.release();
+    if (stored)
+        filter->ReadConfig(settings, kOutputFilter);
+    return filter.release();
 }
 
-void CConversion::TakeFilterSettings(CQoInputFilter& input, CQoOutputFilter& output)
+void CConversion::FitOutputColumns(CQoOutputFilter& output, CQoOutputSource& source) const
 {
-    m_filterSettings.Clear();
-    input.WriteConfig(m_filterSettings, kInputFilter);
-    output.WriteConfig(m_filterSettings, kOutputFilter);
-    m_bTextFilters = true;
+    const int known = output.NumCols();
+    const int columns = source.GetNumColumns();
+    output.NumCols(columns);
+    CQoString name;
+    for (int c = 0; c < columns; ++c) {
+        source.GetColumnName(c, name);
+        output.ColumnName(c, name);
+    }
+    // A table's new column takes any value read (the filter's default would cut it).
+    if (CQoOutputFilterDB* table = dynamic_cast<CQoOutputFilterDB*>(&output)) {
+        for (int c = known; c < columns; ++c) {
+            table->SetType(c, CQoOutputFilterDB::dbtypeText);
+            table->SetLength(c, 255);
+        }
+    }
+}
+
+void CConversion::TakeInputSettings(CQoInputFilter& input)
+{
+    m_filterSettings.DeleteSection(kInputFilter);
+    if (CQoInputFilterDB* table = dynamic_cast<CQoInputFilterDB*>(&input)) {
+        // A database input is named by the project's keys alone.
+        if (table->GetTableType() == CQoInputFilterDB::tableSql) {
+            m_inputSql = table->GetTableName();
+            m_inputTable.Empty();
+        } else {
+            m_inputTable = table->GetTableName();
+            m_inputSql.Empty();
+        }
+    } else {
+        input.WriteConfig(m_filterSettings, kInputFilter);
+    }
+    m_bFilters = true;
+}
+
+void CConversion::TakeOutputSettings(CQoOutputFilter& output)
+{
+    m_filterSettings.DeleteSection(kOutputFilter);
+    if (CQoOutputFilterODBC* odbc = dynamic_cast<CQoOutputFilterODBC*>(&output)) {
+        CQoOutputFilterDao columns;
+        TransferColumns(*odbc, columns);
+        columns.WriteConfig(m_filterSettings, kOutputFilter);
+    } else {
+        output.WriteConfig(m_filterSettings, kOutputFilter);
+    }
+    if (CQoOutputFilterDB* table = dynamic_cast<CQoOutputFilterDB*>(&output))
+        m_outputTable = table->GetTableName();
+    m_bFilters = true;
 }
 
 CQoOutputFilter* CConversion::NewOutput(CQoOutputSource& source, CQoFile& file, std::string& temp)
 {
-    // The output: a table (text columns wide enough for any value read), or
-    // a text file written beside its target and put in place at the end.
-    int const columns = source.GetNumColumns();
-    CQoString name;
-    if (!m_outputDatabase.IsEmpty()) {
-        std::unique_ptr<CQoOutputFilterDao> dao(new CQoOutputFilterDao);
-        dao->SetTableName(m_outputTable);
-        dao->NumCols(columns);
-        for (int c = 0; c < columns; ++c) {
-            source.GetColumnName(c, name);
-            dao->ColumnName(c, name);
-            dao->SetType(c, CQoOutputFilterDB::dbtypeText);
-            dao->SetLength(c, 255);
+    // The output: a table, or a file written beside its target and put in
+    // place at the end.
+    std::unique_ptr<CQoOutputFilter> output(NewOutputFilter());
+    FitOutputColumns(*output, source);
+    switch (OutputKind()) {
+    case outputOdbc: {
+        // Any column name is taken by SQL in double quotes.
+        CQoString name;
+        for (int c = 0; c < output->NumCols(); ++c) {
+            output->GetColumnName(c, name);
+            output->ColumnName(c, Quoted(name));
         }
-        dao->UseDB(m_outputDatabase);
-        return dao.release();
+        static_cast<CQoOutputFilterODBC*>(output.get())->UseDB(m_outputConnect);
+        return output.release();
     }
-    if (OutputIsDatabase()) {
-        std::unique_ptr<CQoOutputFilterODBC> odbc(new CQoOutputFilterODBC);
-        odbc->SetTableName(m_outputTable);
-        odbc->NumCols(columns);
-        for (int c = 0; c < columns; ++c) {
-            source.GetColumnName(c, name);
-            odbc->ColumnName(c, Quoted(name));
-            odbc->SetType(c, CQoOutputFilterDB::dbtypeText);
-            odbc->SetLength(c, 255);
-        }
-        odbc->UseDB(m_outputConnect);
-        return odbc.release();
+    case outputDatabase:
+        static_cast<CQoOutputFilterDao*>(output.get())->UseDB(m_outputDatabase);
+        return output.release();
+    default:
+        temp = OpenOutputBeside(file, CQoFile::binary);
+        output->UseFile(&file, true);
+        return output.release();
     }
-    // The stored settings keep the lengths of the columns they know; a
-    // column the input has gained gets the filter's default.
-    std::unique_ptr<CQoOutputFilter> text(NewTextOutput());
-    text->NumCols(columns);
-    for (int c = 0; c < columns; ++c) {
-        source.GetColumnName(c, name);
-        text->ColumnName(c, name);
-    }
-    temp = OpenOutputBeside(file, CQoFile::binary);
-    text->UseFile(&file, true);
-    return text.release();
 }
 
 long CConversion::RunRecords()

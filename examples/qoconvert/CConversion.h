@@ -1,8 +1,8 @@
 // CConversion - one conversion job of the sample program: read the records
-// of a text file in one character set and write them in another, or move the
-// records of a delimited text file (names in the first line, ';' between
-// fields) into a table of an ODBC data source, or a table or query of one
-// into such a text file or another table.
+// of a delimited or fixed-length text file, a file of fixed-column lines, a
+// dBase file, a table or query of a file database or an ODBC source, and
+// write them as delimited or fixed-length text, a dBase file or a table of a
+// file database or an ODBC source.
 //
 // The job's settings live in the project's configuration file (section
 // "Eingabe" and "Ausgabe"), so that a project converts the same way
@@ -19,15 +19,18 @@
 // a table of an ODBC source ("ODBC") or of an Access-type database file
 // ("Datenbank"), both with "Tabelle".
 //
-// Text files read and written through the filters keep the filters' own
-// settings, as their configuration pages leave them, in two sections of the
-// project:
+// The filters keep their own settings, as their configuration pages leave
+// them, in two sections of the project; the kind of file is given by "Format":
 //
-//     [Eingabefilter]           the delimited input (delimiter, encloser,
-//                               escape, skip, character set, names in line 1)
-//     [Ausgabe]
-//     Format=1                  0 delimited text, 1 fixed-length text
-//     [Ausgabefilter]           the output filter's settings (lengths, ...)
+//     [Eingabe]                 [Ausgabe]
+//     Format=1                  Format=2
+//       0 delimited text          0 delimited text
+//       1 fixed-length records    1 fixed-length text
+//       2 fixed-column lines      2 dBase file
+//       3 dBase file
+//     [Eingabefilter]           [Ausgabefilter]
+//     the input filter's own    the output filter's own settings (lengths,
+//     settings                  field types, a table's name and columns)
 //
 // The output columns (which input columns, combined how, chosen and ordered
 // how) live in the sections of CColumnMapping. A project with neither filter
@@ -44,7 +47,6 @@
 #include "CColumnMapping.h"
 
 class CQoInputFilter;
-class CQoInputFilterTextVar;
 class CQoOutputFilter;
 class CQoOutputSource;
 
@@ -69,24 +71,49 @@ class CConversion
 public:
     // The character sets as the pages offer them: Windows Ansi, DOS Ascii, Ansi/Ascii.
     enum { charsetAnsi = 0, charsetAscii = 1, charsetMixed = 2 };
-    // The text outputs.
-    enum { formatDelimited = 0, formatFixed = 1 };
+    // The file inputs ([Eingabe] Format).
+    enum { inputDelimited = 0, inputFixed = 1, inputColumns = 2, inputDbase = 3 };
+    // The file outputs ([Ausgabe] Format).
+    enum { formatDelimited = 0, formatFixed = 1, formatDbase = 2 };
+    // What the window offers: the file kinds above, then a file database
+    // (Access-type, .mdb, .xlsx) and an ODBC source.
+    enum { inputDatabase = 4, inputOdbc = 5 };
+    enum { outputDatabase = 3, outputOdbc = 4 };
 
     CConversion();
 
     // Raises CQoException for a character set or format the program does
-    // not know.
+    // not know. Settings the project does not name are the defaults.
     void ReadConfig(CQoConfigFile& config);
     void WriteConfig(CQoConfigFile& config) const;
 
-    // The text filters as the project configures them (defaults for a
-    // project without their sections: ';', names in the first line, the
-    // character sets of "Zeichensatz"). The file is not opened.
-    void ConfigureInput(CQoInputFilterTextVar& filter) const;
-    // A new output filter of m_outputFormat, configured; the caller owns it.
-    CQoOutputFilter* NewTextOutput() const;
-    // Keeps the filters' settings for WriteConfig (what their pages set).
-    void TakeFilterSettings(CQoInputFilter& input, CQoOutputFilter& output);
+    // The kind of input or output as the window offers it, and where it is:
+    // a file, a database file or an ODBC connect string. Another kind
+    // forgets the settings of the previous kind's filter.
+    int InputKind() const;
+    int OutputKind() const;
+    void SetInput(int kind, const CQoString& location);
+    void SetOutput(int kind, const CQoString& location);
+
+    // A new input filter of the project's kind with the project's settings
+    // (defaults for a project without its section: ';' and names in the
+    // first line, the character set of "Zeichensatz"); the caller owns it.
+    CQoInputFilter* NewInputFilter() const;
+    // Opens it on the project's file, database or source; relative names
+    // are taken from `folder` (none: as they stand). `numbered`: its rows
+    // are reached by number (an ODBC source's rows are counted for it).
+    void OpenInputFilter(CQoInputFilter& filter, const CQoString& folder = CQoString(), bool numbered = false) const;
+    // A new output filter of the project's kind with the project's settings,
+    // not bound to its file or database; the caller owns it.
+    CQoOutputFilter* NewOutputFilter() const;
+    // Gives the output filter the source's columns: the settings of the
+    // columns it knows stay, a new column of a table is text wide enough for
+    // any value read.
+    void FitOutputColumns(CQoOutputFilter& output, CQoOutputSource& source) const;
+    // Keeps the filters' settings for WriteConfig (what their pages set),
+    // with the table a page picked or named.
+    void TakeInputSettings(CQoInputFilter& input);
+    void TakeOutputSettings(CQoOutputFilter& output);
 
     // Converts every record; returns the number of records written. Raises
     // CQoException when a file cannot be opened, read or written, or when
@@ -105,6 +132,7 @@ public:
     bool m_bSkipDefective;
 
     CQoString m_inputFile;
+    int m_inputFormat;
     int m_inputCharset;
     CQoString m_outputFile;
     int m_outputCharset;
@@ -119,12 +147,12 @@ public:
     CQoString m_outputDatabase;
     int m_outputFormat;
 
-    bool UsesTextFilters() const { return m_bTextFilters; }
     // The output columns; the window builds them over its preview's records,
     // a run over the records it converts.
     CColumnMapping& Columns() { return m_columns; }
 
-    // A file name of a project, relative to its folder unless absolute.
+    // A file name of a project, relative to its folder unless absolute (or
+    // no folder is given).
     static CQoString InFolder(const CQoString& folder, const CQoString& file);
     // Makes every file named by the project (files, database files, the
     // database file of a connect string) absolute against its folder.
@@ -134,7 +162,9 @@ public:
     bool OutputIsDatabase() const { return !m_outputConnect.IsEmpty() || !m_outputDatabase.IsEmpty(); }
 
 private:
-    CQoInputFilter* NewInput() const;
+    void Clear();
+    CQoInputFilter* MakeInputFilter(bool run) const;
+    CQoInputFilter* NewInput();
     CQoOutputFilter* NewOutput(CQoOutputSource& source, CQoFile& file, std::string& temp);
     long RunLines();
     long RunRecords();
@@ -144,10 +174,12 @@ private:
     void PutOutputInPlace(const std::string& temp);
     static int FileMode(int charset);
     static void ReadCharset(CQoConfigFile& config, const char* section, int& charset);
+    static void ReadFormat(CQoConfigFile& config, const char* section, int last, const char* allowed, int& format);
 
     // The two filter sections, as read or as the pages left them.
     CQoConfigFile m_filterSettings;
-    bool m_bTextFilters;
+    // The project configures its filters (else a plain copy of the lines).
+    bool m_bFilters;
     CConversionProgress* m_pProgress;
     long m_lSkipped;
     CColumnMapping m_columns;

@@ -2,7 +2,10 @@
 
 #include <afxdlgs.h>
 
-#include <CInputFilterConfigTextVar.h>
+#include <CDirectoryChooser.h>
+#include <CInputFilterConfig.h>
+#include <COutputFilterConfigDao.h>
+#include <COutputFilterConfigDbase.h>
 #include <COutputFilterConfigTextFix.h>
 #include <COutputFilterConfigTextVar.h>
 #include <CQoConfigFile.h>
@@ -10,6 +13,7 @@
 #include <CQoLog.h>
 
 #include "CColumnsDlg.h"
+#include "COdbcInputPage.h"
 #include "QoConvertApp.h"
 #include "QoConvertRun.h"
 
@@ -17,9 +21,13 @@
 
 BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
     ON_BN_CLICKED(IDC_CONVERT, OnConvert)
+    ON_BN_CLICKED(IDC_PROJECT_BROWSE, OnBrowseProject)
     ON_BN_CLICKED(IDC_INPUT_BROWSE, OnBrowseInput)
     ON_BN_CLICKED(IDC_OUTPUT_BROWSE, OnBrowseOutput)
     ON_EN_KILLFOCUS(IDC_INPUT_FILE, OnInputFileChanged)
+    ON_EN_KILLFOCUS(IDC_INPUT_TABLE, OnInputTableChanged)
+    ON_EN_KILLFOCUS(IDC_OUTPUT_FILE, OnOutputFileChanged)
+    ON_CBN_SELCHANGE(IDC_INPUT_KIND, OnInputKindChanged)
     ON_CBN_SELCHANGE(IDC_OUTPUT_FORMAT, OnFormatChanged)
     ON_BN_CLICKED(IDC_COLUMNS, OnColumns)
     ON_WM_DESTROY()
@@ -28,9 +36,25 @@ BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
     ON_MESSAGE(WM_QOCONVERT_PROGRESS, OnRunProgress)
 END_MESSAGE_MAP()
 
+namespace {
+// The kinds as the combos list them, in the order of CConversion's numbers.
+const char* const kInputKinds[] = {"Text mit Trennzeichen", "Text mit fester Satzl\xE4nge",
+                                   "Text mit festen Spalten", "dBase-Datei",
+                                   "Datenbankdatei (Access, Excel)", "ODBC-Datenquelle"};
+const char* const kOutputKinds[] = {"Text mit Trennzeichen", "Text mit fester L\xE4nge", "dBase-Datei",
+                                    "Datenbankdatei (Access)", "ODBC-Datenquelle"};
+
+bool IsStatement(const CString& text)
+{
+    CString start = text.Left(7);
+    start.MakeUpper();
+    return start == "SELECT ";
+}
+}
+
 CMainDlg::CMainDlg(CWnd* pParent)
     : CDialog(IDD, pParent), m_hCancel(NULL), m_llInputSize(-1), m_bCloseWhenDone(false),
-      m_outputFormat(CConversion::formatDelimited), m_records(&m_outputRows)
+      m_inputKind(0), m_outputKind(0), m_bRebuilding(false)
 {
     // The output page previews the first rows; it need not read the whole input.
     m_records.SetRowLimit(1000);
@@ -40,56 +64,86 @@ CMainDlg::~CMainDlg() = default;
 
 BOOL CMainDlg::OnInitDialog()
 {
-    CQoConfigFile config;
+    CComboBox* kinds = (CComboBox*)GetDlgItem(IDC_INPUT_KIND);
+    for (const char* kind : kInputKinds)
+        kinds->AddString(kind);
+    kinds = (CComboBox*)GetDlgItem(IDC_OUTPUT_FORMAT);
+    for (const char* kind : kOutputKinds)
+        kinds->AddString(kind);
+    CDialog::OnInitDialog();
+    GetDlgItem(IDC_PROGRESS)->SendMessage(PBM_SETRANGE32, 0, 10000);
+    LoadProject();
+    EnableForRun(false);
+    return TRUE;
+}
+
+void CMainDlg::LoadProject()
+{
     CString problem;
-    if (!config.Open(theApp.m_projectFile)) {
-        problem = "Die Projektdatei kann nicht gelesen werden.";
+    if (GetFileAttributesA(theApp.m_projectFile) == INVALID_FILE_ATTRIBUTES) {
+        problem = "Neues Projekt: es wird mit \"Konvertieren\" gespeichert.";
     } else {
-        try {
-            m_job.ReadConfig(config);
-        } catch (const CQoException& e) {
-            problem = e.Message();   // the user picks a valid set below
+        CQoConfigFile config;
+        if (!config.Open(theApp.m_projectFile)) {
+            problem = "Die Projektdatei kann nicht gelesen werden.";
+        } else {
+            try {
+                m_job.ReadConfig(config);
+            } catch (const CQoException& e) {
+                problem = e.Message();   // the user picks a valid set below
+            }
         }
     }
-    m_project = (const char*)theApp.m_projectFolder;
-    m_inputFile = (const char*)m_job.m_inputFile;
-    m_outputFile = (const char*)m_job.m_outputFile;
-    m_outputFormat = m_job.m_outputFormat;
-    m_inputDatabase = (const char*)m_job.m_inputDatabase;
-    m_inputTable = (const char*)m_job.m_inputTable;
-    m_outputDatabase = (const char*)m_job.m_outputDatabase;
-    m_outputTable = (const char*)m_job.m_outputTable;
-
-    CComboBox* format = (CComboBox*)GetDlgItem(IDC_OUTPUT_FORMAT);
-    format->AddString("Trennzeichen");
-    format->AddString("Feste L\xE4nge");
-    CDialog::OnInitDialog();
-
-    // The input page works on the project's filter settings.
-    m_job.ConfigureInput(m_input);
-    OpenInput();
-    m_inputPage.reset(new CInputFilterConfigTextVar(&m_input, idInputPage));
-    m_inputPage->Create(this);
-    m_inputPage->AddModifiedListener(this);
+    ShowJob();
+    MakeInputPage();
     MakeOutputPage();
-    GetDlgItem(IDC_PROGRESS)->SendMessage(PBM_SETRANGE32, 0, 10000);
-    EnableForRun(false);
     if (!problem.IsEmpty())
         Status(problem);
-    return TRUE;
+}
+
+void CMainDlg::ShowJob()
+{
+    m_project = (const char*)theApp.m_projectFolder;
+    m_inputKind = m_job.InputKind();
+    switch (m_inputKind) {
+    case CConversion::inputOdbc:     m_inputFile = (const char*)m_job.m_inputConnect; break;
+    case CConversion::inputDatabase: m_inputFile = (const char*)m_job.m_inputDatabase; break;
+    default:                         m_inputFile = (const char*)m_job.m_inputFile; break;
+    }
+    m_inputTable = (const char*)(m_job.m_inputSql.IsEmpty() ? m_job.m_inputTable : m_job.m_inputSql);
+    m_outputKind = m_job.OutputKind();
+    switch (m_outputKind) {
+    case CConversion::outputOdbc:     m_outputFile = (const char*)m_job.m_outputConnect; break;
+    case CConversion::outputDatabase: m_outputFile = (const char*)m_job.m_outputDatabase; break;
+    default:                          m_outputFile = (const char*)m_job.m_outputFile; break;
+    }
+    UpdateData(FALSE);
+    ShowKinds();
+}
+
+void CMainDlg::ShowKinds()
+{
+    const bool odbcIn = m_inputKind == CConversion::inputOdbc;
+    SetDlgItemText(IDC_INPUT_FILE_LABEL, odbcIn ? "Verbindung:"
+                                         : m_inputKind == CConversion::inputDatabase ? "Datenbank:" : "Datei:");
+    GetDlgItem(IDC_INPUT_TABLE_LABEL)->ShowWindow(odbcIn ? SW_SHOW : SW_HIDE);
+    GetDlgItem(IDC_INPUT_TABLE)->ShowWindow(odbcIn ? SW_SHOW : SW_HIDE);
+    GetDlgItem(IDC_INPUT_BROWSE)->EnableWindow(!odbcIn);
+    const bool odbcOut = m_outputKind == CConversion::outputOdbc;
+    SetDlgItemText(IDC_OUTPUT_FILE_LABEL, odbcOut ? "Verbindung:"
+                                          : m_outputKind == CConversion::outputDatabase ? "Datenbank:" : "Datei:");
+    GetDlgItem(IDC_OUTPUT_BROWSE)->EnableWindow(!odbcOut);
 }
 
 void CMainDlg::DoDataExchange(CDataExchange* pDX)
 {
     CDialog::DoDataExchange(pDX);
     DDX_Text(pDX, IDC_PROJECT, m_project);
+    DDX_CBIndex(pDX, IDC_INPUT_KIND, m_inputKind);
     DDX_Text(pDX, IDC_INPUT_FILE, m_inputFile);
-    DDX_Text(pDX, IDC_OUTPUT_FILE, m_outputFile);
-    DDX_CBIndex(pDX, IDC_OUTPUT_FORMAT, m_outputFormat);
-    DDX_Text(pDX, IDC_INPUT_DATABASE, m_inputDatabase);
     DDX_Text(pDX, IDC_INPUT_TABLE, m_inputTable);
-    DDX_Text(pDX, IDC_OUTPUT_DATABASE, m_outputDatabase);
-    DDX_Text(pDX, IDC_OUTPUT_TABLE, m_outputTable);
+    DDX_CBIndex(pDX, IDC_OUTPUT_FORMAT, m_outputKind);
+    DDX_Text(pDX, IDC_OUTPUT_FILE, m_outputFile);
 }
 
 void CMainDlg::OnDestroy()
@@ -117,28 +171,71 @@ void CMainDlg::Status(const CString& text)
     SetDlgItemText(IDC_STATUS, text);
 }
 
-void CMainDlg::OpenInput()
+void CMainDlg::TakeInputChoice()
 {
+    CQoString location((const char*)m_inputFile);
+    if (m_inputKind == CConversion::inputDatabase && strcmp(m_job.m_inputDatabase, location) != 0) {
+        // Another database has other tables.
+        m_job.m_inputTable.Empty();
+        m_job.m_inputSql.Empty();
+    }
+    m_job.SetInput(m_inputKind, location);
+    if (m_inputKind == CConversion::inputOdbc) {
+        m_job.m_inputTable.Empty();
+        m_job.m_inputSql.Empty();
+        (IsStatement(m_inputTable) ? m_job.m_inputSql : m_job.m_inputTable) = (const char*)m_inputTable;
+    }
+}
+
+void CMainDlg::TakeOutputChoice()
+{
+    m_job.SetOutput(m_outputKind, CQoString((const char*)m_outputFile));
+}
+
+void CMainDlg::MakeInputPage()
+{
+    m_bRebuilding = true;
+    if (m_inputPage && ::IsWindow(m_inputPage->m_hWnd))
+        m_inputPage->DestroyWindow();
+    m_inputPage.reset();
     Status("");
+    m_input.reset(m_job.NewInputFilter());
     try {
         if (!m_inputFile.IsEmpty())
-            m_input.Init(theApp.InProject(CQoString((const char*)m_inputFile)));
+            m_job.OpenInputFilter(*m_input, theApp.m_projectFolder);
     } catch (const CQoException& e) {
         Status(e.Message());
     }
+    if (m_inputKind == CConversion::inputOdbc)
+        m_inputPage.reset(new COdbcInputPage(m_input.get(), idInputPage));
+    else
+        m_inputPage.reset(CInputFilterConfig::GetAppropriateConfig(m_input.get(), idInputPage));
+    if (m_inputPage) {
+        m_inputPage->Create(this);
+        m_inputPage->AddModifiedListener(this);
+        // The file database's page selects the filter's table only now.
+        m_inputPage->UpdateInputFilter(0);
+    }
+    m_bRebuilding = false;
     FollowInput();
+    Arrange();
 }
 
 void CMainDlg::FollowInput()
 {
-    m_outputRows.CopyFrom(m_input);
+    // What the page set goes into the project's settings, and a filter of
+    // the same kind reads them for the output side: the output sees what a
+    // conversion of the project would read.
+    m_job.TakeInputSettings(*m_input);
+    std::unique_ptr<CQoInputFilter> rows(m_job.NewInputFilter());
     try {
-        if (*m_input.FileName() != '\0')
-            m_outputRows.Init(CQoString(m_input.FileName()));
+        if (!m_inputFile.IsEmpty())
+            m_job.OpenInputFilter(*rows, theApp.m_projectFolder, true);
     } catch (const CQoException&) {
-        // the input page shows why the file cannot be read
+        // the input page and the status line say why it cannot be read
     }
-    m_records.SetInputFilter(&m_outputRows);
+    m_records.SetInputFilter(rows.get());
+    m_outputRows = std::move(rows);
     // The output columns follow the input's.
     m_job.Columns().Build(m_records);
     if (m_outputPage && ::IsWindow(m_outputPage->m_hWnd))
@@ -150,12 +247,24 @@ void CMainDlg::MakeOutputPage()
     if (m_outputPage && ::IsWindow(m_outputPage->m_hWnd))
         m_outputPage->DestroyWindow();
     m_outputPage.reset();
-    m_job.m_outputFormat = m_outputFormat;
-    m_output.reset(m_job.NewTextOutput());
-    if (m_outputFormat == CConversion::formatFixed)
+    m_output.reset(m_job.NewOutputFilter());
+    m_job.FitOutputColumns(*m_output, m_job.Columns().View());
+    switch (m_outputKind) {
+    case CConversion::formatFixed:
         m_outputPage.reset(new COutputFilterConfigTextFix(idOutputPage, this));
-    else
+        break;
+    case CConversion::formatDbase:
+        m_outputPage.reset(new COutputFilterConfigDbase(idOutputPage, this));
+        break;
+    case CConversion::outputDatabase:
+    case CConversion::outputOdbc:
+        // Both are tables: name, field types, lengths and indexes.
+        m_outputPage.reset(new COutputFilterConfigDao(idOutputPage, this));
+        break;
+    default:
         m_outputPage.reset(new COutputFilterConfigTextVar(idOutputPage, this));
+        break;
+    }
     m_outputPage->SetSourceAndFilter(&m_job.Columns().View(), m_output.get());
     m_outputPage->Create(this);
     m_outputPage->UpdateOutputFilter(0);
@@ -251,37 +360,68 @@ void CMainDlg::Arrange()
 
 int CMainDlg::ModifiedListenerSetModified(int /*bModified*/, int nNotifierId)
 {
-    if (nNotifierId == idInputPage)
+    if (nNotifierId == idInputPage && !m_bRebuilding)
         FollowInput();
     return 1;
 }
 
-bool CMainDlg::Browse(CString& file, bool open)
+bool CMainDlg::Browse(CString& file, bool open, int kind, bool output)
 {
-    const char filter[] = "Textdateien (*.txt;*.csv)|*.txt;*.csv|Alle Dateien (*.*)|*.*||";
-    CFileDialog dialog(open, NULL, file, OFN_HIDEREADONLY | (open ? OFN_FILEMUSTEXIST : OFN_OVERWRITEPROMPT),
-                       filter, this);
+    const char* filter;
+    if ((!output && kind == CConversion::inputDbase) || (output && kind == CConversion::formatDbase))
+        filter = "dBase-Dateien (*.dbf)|*.dbf|Alle Dateien (*.*)|*.*||";
+    else if (!output && kind == CConversion::inputDatabase)
+        filter = "Datenbanken (*.mdb;*.accdb;*.xlsx)|*.mdb;*.accdb;*.xlsx|Alle Dateien (*.*)|*.*||";
+    else if (output && kind == CConversion::outputDatabase)
+        filter = "Datenbanken (*.mdb;*.accdb)|*.mdb;*.accdb|Alle Dateien (*.*)|*.*||";
+    else
+        filter = "Textdateien (*.txt;*.csv)|*.txt;*.csv|Alle Dateien (*.*)|*.*||";
+    // A table goes into an existing database file: no question of overwriting it.
+    DWORD flags = OFN_HIDEREADONLY;
+    if (open)
+        flags |= OFN_FILEMUSTEXIST;
+    else if (kind != CConversion::outputDatabase)
+        flags |= OFN_OVERWRITEPROMPT;
+    CFileDialog dialog(open, NULL, file, flags, filter, this);
     if (dialog.DoModal() != IDOK)
         return false;
     file = dialog.GetPathName();
     return true;
 }
 
+void CMainDlg::OnBrowseProject()
+{
+    CDirectoryChooser chooser("In welchem Ordner liegt das Projekt (qoconvert.ini)?", this,
+                              CString((const char*)theApp.m_projectFolder) + "\\");
+    if (chooser.DoModal() != IDOK)
+        return;
+    // A folder without a project starts with what is shown, its files
+    // named in full, as the previous project found them.
+    UpdateData(TRUE);
+    TakeInputChoice();
+    TakeOutputChoice();
+    m_job.PlaceInFolder(theApp.m_projectFolder);
+    theApp.SetProjectFolder(CQoString((const char*)chooser.GetDirectory()));
+    LoadProject();
+}
+
 void CMainDlg::OnBrowseInput()
 {
     UpdateData(TRUE);
-    if (!Browse(m_inputFile, true))
+    if (!Browse(m_inputFile, true, m_inputKind, false))
         return;
     UpdateData(FALSE);
-    OpenInput();
-    m_inputPage->UpdateInputFilter(0);
+    TakeInputChoice();
+    MakeInputPage();
 }
 
 void CMainDlg::OnBrowseOutput()
 {
     UpdateData(TRUE);
-    if (Browse(m_outputFile, false))
-        UpdateData(FALSE);
+    if (!Browse(m_outputFile, false, m_outputKind, true))
+        return;
+    UpdateData(FALSE);
+    TakeOutputChoice();
 }
 
 void CMainDlg::OnInputFileChanged()
@@ -290,13 +430,48 @@ void CMainDlg::OnInputFileChanged()
     UpdateData(TRUE);
     if (m_inputFile == before)
         return;
-    OpenInput();
-    m_inputPage->UpdateInputFilter(0);
+    // The settings made on the page so far stay for the new file.
+    if (m_inputPage && ::IsWindow(m_inputPage->m_hWnd)) {
+        m_bRebuilding = true;
+        m_inputPage->DefaultAction();
+        m_bRebuilding = false;
+        m_job.TakeInputSettings(*m_input);
+    }
+    TakeInputChoice();
+    MakeInputPage();
+}
+
+void CMainDlg::OnInputTableChanged()
+{
+    CString before = m_inputTable;
+    UpdateData(TRUE);
+    if (m_inputTable == before)
+        return;
+    TakeInputChoice();
+    MakeInputPage();
+}
+
+void CMainDlg::OnInputKindChanged()
+{
+    UpdateData(TRUE);
+    m_inputTable.Empty();
+    UpdateData(FALSE);
+    ShowKinds();
+    TakeInputChoice();
+    MakeInputPage();
+}
+
+void CMainDlg::OnOutputFileChanged()
+{
+    UpdateData(TRUE);
+    TakeOutputChoice();
 }
 
 void CMainDlg::OnFormatChanged()
 {
     UpdateData(TRUE);
+    ShowKinds();
+    TakeOutputChoice();
     MakeOutputPage();
 }
 
@@ -315,24 +490,32 @@ void CMainDlg::OnConvert()
     if (!UpdateData(TRUE))
         return;
     // What the pages show is what is converted.
-    m_inputPage->DefaultAction();
+    TakeInputChoice();
+    TakeOutputChoice();
+    if (m_inputPage) {
+        m_bRebuilding = true;
+        m_inputPage->DefaultAction();
+        m_bRebuilding = false;
+    }
+    m_job.TakeInputSettings(*m_input);
     m_outputPage->UpdateOutputFilter(1);
+    m_job.TakeOutputSettings(*m_output);
+    if (m_job.OutputIsDatabase() && m_job.m_outputTable.IsEmpty()) {
+        Status("Der Name der Ausgabetabelle fehlt (Tabellenname auf der Ausgabeseite).");
+        return;
+    }
+    if (m_job.InputIsDatabase() && m_job.m_inputTable.IsEmpty() && m_job.m_inputSql.IsEmpty()) {
+        Status("Es ist keine Eingabetabelle gew\xE4hlt.");
+        return;
+    }
 
     // The project keeps what the user chose. A project file that cannot be
     // read is not written over: its other settings would be lost.
     CQoConfigFile config;
-    if (!config.Open(theApp.m_projectFile)) {
+    if (GetFileAttributesA(theApp.m_projectFile) != INVALID_FILE_ATTRIBUTES && !config.Open(theApp.m_projectFile)) {
         Status("Die Projektdatei kann nicht gelesen werden.");
         return;
     }
-    m_job.m_inputFile = (const char*)m_inputFile;
-    m_job.m_outputFile = (const char*)m_outputFile;
-    m_job.m_outputFormat = m_outputFormat;
-    m_job.m_inputDatabase = (const char*)m_inputDatabase;
-    m_job.m_inputTable = (const char*)m_inputTable;
-    m_job.m_outputDatabase = (const char*)m_outputDatabase;
-    m_job.m_outputTable = (const char*)m_outputTable;
-    m_job.TakeFilterSettings(m_input, *m_output);
     m_job.WriteConfig(config);
     if (!config.Write(theApp.m_projectFile)) {
         Status("Projektdatei nicht gespeichert.");
@@ -363,11 +546,13 @@ void CMainDlg::OnConvert()
 
 void CMainDlg::EnableForRun(bool running)
 {
-    const int controls[] = {IDC_INPUT_FILE, IDC_INPUT_BROWSE, IDC_INPUT_DATABASE, IDC_INPUT_TABLE,
-                            IDC_OUTPUT_FILE, IDC_OUTPUT_BROWSE, IDC_OUTPUT_FORMAT, IDC_OUTPUT_DATABASE,
-                            IDC_OUTPUT_TABLE, IDC_COLUMNS, IDC_CONVERT};
+    const int controls[] = {IDC_PROJECT_BROWSE, IDC_INPUT_KIND, IDC_INPUT_FILE, IDC_INPUT_TABLE,
+                            IDC_OUTPUT_FORMAT, IDC_OUTPUT_FILE, IDC_COLUMNS, IDC_CONVERT};
     for (int id : controls)
         GetDlgItem(id)->EnableWindow(!running);
+    // Nothing to browse for an ODBC source.
+    GetDlgItem(IDC_INPUT_BROWSE)->EnableWindow(!running && m_inputKind != CConversion::inputOdbc);
+    GetDlgItem(IDC_OUTPUT_BROWSE)->EnableWindow(!running && m_outputKind != CConversion::outputOdbc);
     if (m_inputPage && ::IsWindow(m_inputPage->m_hWnd))
         m_inputPage->EnableWindow(!running);
     if (m_outputPage && ::IsWindow(m_outputPage->m_hWnd))

@@ -1,20 +1,20 @@
-// CMainDlg - the sample program's main window. The user picks the input file
-// and configures how it is read on the delimited-text page with its live
-// preview, picks the output file and its format (delimited or fixed-length
-// text) and configures it on its output page, whose preview shows the records
-// as they will be written, and converts. "Spalten..." opens the output
-// columns: composed of the input's columns (combinations such as street and
-// town in one column), chosen and ordered. The project keeps the filters'
-// settings, so that the same project converts from the command line.
-// A file database (Access-type, .mdb, .xlsx) and its table may be named
-// instead of a file; a project's ODBC settings are kept and used, though not
-// shown.
+// CMainDlg - the sample program's main window. The user picks what is read
+// (delimited or fixed-length text, fixed-column lines, a dBase file, a file
+// database - Access-type, .mdb, .xlsx - or an ODBC source) and configures it
+// on the library's page for its filter, with a live preview; picks what is
+// written (delimited or fixed-length text, a dBase file, a table of a file
+// database or an ODBC source) and configures it on its output page, whose
+// preview shows the records as they will be written; and converts.
+// "Spalten..." opens the output columns: composed of the input's columns
+// (combinations such as street and town in one column), chosen and ordered.
+// The project (a folder, chosen with "...") keeps the filters' settings, so
+// that the same project converts from the command line.
 #pragma once
 
 #include <afxwin.h>
 
 #include <CModifiedListener.h>
-#include <CQoInputFilterTextVar.h>
+#include <CQoInputFilter.h>
 #include <CQoOutputFilter.h>
 
 #include <algorithm>
@@ -24,7 +24,7 @@
 #include "CInputRecords.h"
 #include "resource.h"
 
-class CInputFilterConfigTextVar;
+class CInputFilterConfig;
 class COutputFilterConfig;
 
 class CMainDlg : public CDialog, public CModifiedListener
@@ -50,7 +50,11 @@ protected:
     afx_msg void OnConvert();
     afx_msg void OnBrowseInput();
     afx_msg void OnBrowseOutput();
+    afx_msg void OnBrowseProject();
     afx_msg void OnInputFileChanged();
+    afx_msg void OnInputKindChanged();
+    afx_msg void OnInputTableChanged();
+    afx_msg void OnOutputFileChanged();
     afx_msg void OnFormatChanged();
     afx_msg void OnColumns();
     afx_msg void OnDestroy();
@@ -61,15 +65,24 @@ protected:
     DECLARE_MESSAGE_MAP()
 
 private:
-    // Opens the input file with the page's settings and shows it; a file
-    // that cannot be read is named in the status line.
-    void OpenInput();
-    // The output side reads its own copy of the input filter.
+    // Reads the project of the program's folder into the job and shows it;
+    // a folder without a project keeps what is shown.
+    void LoadProject();
+    void ShowJob();
+    // A new input filter of the job's kind on its file or source, with its
+    // page; what cannot be read is named in the status line.
+    void MakeInputPage();
+    // The output side reads its own filter of the same kind and settings.
     void FollowInput();
     void MakeOutputPage();
+    // The window's fields into the job.
+    void TakeInputChoice();
+    void TakeOutputChoice();
+    // The labels and fields that the kinds of input and output need.
+    void ShowKinds();
     // Places the pages below their file rows and fits the window around them.
     void Arrange();
-    bool Browse(CString& file, bool open);
+    bool Browse(CString& file, bool open, int kind, bool output);
     void Status(const CString& text);
     // While a conversion runs only "Abbrechen" takes input.
     void EnableForRun(bool running);
@@ -80,18 +93,17 @@ private:
 
     CConversion m_job;
     CString m_project;
-    CString m_inputFile;
-    CString m_outputFile;
-    int m_outputFormat;
-    CString m_inputDatabase;
-    CString m_inputTable;
-    CString m_outputDatabase;
-    CString m_outputTable;
+    int m_inputKind;
+    CString m_inputFile;     // a file, a database file or a connect string
+    CString m_inputTable;    // of an ODBC source: a table or a SELECT
+    int m_outputKind;
+    CString m_outputFile;    // a file, a database file or a connect string
+    bool m_bRebuilding;      // the pages' notifications are not followed
 
-    CQoInputFilterTextVar m_input;        // configured on the input page
-    CQoInputFilterTextVar m_outputRows;   // the same records for the output side
+    std::unique_ptr<CQoInputFilter> m_input;        // configured on the input page
+    std::unique_ptr<CQoInputFilter> m_outputRows;   // the same records for the output side
     CInputRecords m_records;
     std::unique_ptr<CQoOutputFilter> m_output;
-    std::unique_ptr<CInputFilterConfigTextVar> m_inputPage;
+    std::unique_ptr<CInputFilterConfig> m_inputPage;
     std::unique_ptr<COutputFilterConfig> m_outputPage;
 };

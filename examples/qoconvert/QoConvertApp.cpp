@@ -43,18 +43,25 @@ CQoConvertApp::CQoConvertApp()
 
 void CQoConvertApp::ParseArguments()
 {
+    CQoString folder;
     for (int i = 1; i < __argc; ++i) {
         const char* arg = __argv[i];
         if (_stricmp(arg, "/batch") == 0 || _stricmp(arg, "-batch") == 0)
             m_batch = true;
         else
-            m_projectFolder = arg;
+            folder = arg;
     }
-    if (m_projectFolder.IsEmpty()) {
+    if (folder.IsEmpty()) {
         char current[MAX_PATH];
         GetCurrentDirectoryA(MAX_PATH, current);
-        m_projectFolder = current;
+        folder = current;
     }
+    SetProjectFolder(folder);
+}
+
+void CQoConvertApp::SetProjectFolder(const CQoString& folder)
+{
+    m_projectFolder = folder;
     char full[MAX_PATH];
     DWORD n = GetFullPathNameA(m_projectFolder, MAX_PATH, full, NULL);
     if (n > 0 && n < MAX_PATH)
@@ -63,6 +70,7 @@ void CQoConvertApp::ParseArguments()
            && (m_projectFolder.Right(1) == "\\" || m_projectFolder.Right(1) == "/"))
         m_projectFolder = m_projectFolder.Left(m_projectFolder.GetLength() - 1);
     m_projectFile = m_projectFolder + "\\qoconvert.ini";
+    _theLog.Open(m_projectFolder + "\\qoconvert.log");
 }
 
 BOOL CQoConvertApp::InitInstance()
@@ -73,8 +81,6 @@ BOOL CQoConvertApp::InitInstance()
     if (!m_batch && !CSingleWinApp::InitInstance())
         return FALSE;
 
-    CQoString log = m_projectFolder + "\\qoconvert.log";
-    _theLog.Open(log);
     _theLog << "qoconvert gestartet, Projekt " << (const char*)m_projectFolder
             << (m_batch ? " (Batch)" : "") << CQoLog::endl;
 

@@ -34,6 +34,9 @@ public:
     virtual BOOL InitInstance();
     virtual int ExitInstance();
 
+    // Makes `folder` (relative to the current folder unless absolute) the
+    // project's, with its configuration file; the log moves with it.
+    void SetProjectFolder(const CQoString& folder);
     // A file name of the project, relative to its folder unless absolute.
     CQoString InProject(const CQoString& file) const;
     // Starts the conversion module on an executer thread. `progress` gets its

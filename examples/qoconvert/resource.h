@@ -5,16 +5,14 @@
 #define IDR_MAINFRAME        128
 #define IDD_MAIN             130
 #define IDD_COLUMNS          131
+#define IDD_ODBC_INPUT       132
 
 #define IDC_PROJECT          1000
 #define IDC_INPUT_FILE       1001
 #define IDC_OUTPUT_FILE      1003
 #define IDC_CONVERT          1005
 #define IDC_STATUS           1006
-#define IDC_INPUT_DATABASE   1007
 #define IDC_INPUT_TABLE      1008
-#define IDC_OUTPUT_DATABASE  1009
-#define IDC_OUTPUT_TABLE     1010
 #define IDC_INPUT_BROWSE     1011
 #define IDC_OUTPUT_BROWSE    1012
 #define IDC_OUTPUT_FORMAT    1013
@@ -27,6 +25,13 @@
 #define IDC_COLUMNS          1020
 #define IDC_COMPOSE_PAGE     1021
 #define IDC_SELECT_PAGE      1022
+#define IDC_PROJECT_BROWSE   1023
+#define IDC_INPUT_KIND       1024
+#define IDC_INPUT_FILE_LABEL 1025
+#define IDC_OUTPUT_FILE_LABEL 1026
+#define IDC_INPUT_TABLE_LABEL 1027
+#define IDC_ODBC_TEXT        1028
+#define IDC_ODBC_PREVIEW     1029
 
 #define IDS_APP_TITLE        5000
 #define IDS_DONE             5001

@@ -209,6 +209,42 @@ if(NOT rc EQUAL 0 OR NOT differs EQUAL 0)
   message(FATAL_ERROR "from a workbook: exit ${rc}, differs ${differs}\n${err}\nlog:\n${log}")
 endif()
 
+# Every other kind of file in one chain, each read back by the filter that
+# reads such files: delimited text into a dBase file, that into a table of an
+# Access-type database, that into fixed-length records without line breaks
+# and into fixed-length lines, which come back as delimited text. The values
+# arrive unchanged (the column names are the ones each kind can keep).
+set(lengths "columns=4\ncolumn0_len=3\ncolumn1_len=10\ncolumn2_len=18\ncolumn3_len=12\n")
+set(widths "charset=32\ncolumns=4\ncollen0=3\ncollen1=10\ncollen2=18\ncollen3=12\n")
+set(chain
+    "[Eingabe]\nDatei=kunden.txt\nZeichensatz=0\n[Ausgabe]\nDatei=kette.dbf\nFormat=2\n"
+    "[Eingabe]\nDatei=kette.dbf\nFormat=3\n[Ausgabe]\nDatenbank=kette.mdb\nTabelle=Kette\n"
+    "[Eingabe]\nDatenbank=kette.mdb\nTabelle=Kette\n[Ausgabe]\nDatei=kette.fix\nFormat=1\n[Ausgabefilter]\ncharset=32\ncrlf=0\n${lengths}"
+    "[Eingabe]\nDatenbank=kette.mdb\nTabelle=Kette\n[Ausgabe]\nDatei=kette.lines\nFormat=1\n[Ausgabefilter]\ncharset=32\ncrlf=1\n${lengths}"
+    "[Eingabe]\nDatei=kette.fix\nFormat=1\n[Eingabefilter]\nrecordlen=43\n${widths}[Ausgabe]\nDatei=kette1.txt\n"
+    "[Eingabe]\nDatei=kette.lines\nFormat=2\n[Eingabefilter]\n${widths}[Ausgabe]\nDatei=kette2.txt\n")
+set(step 0)
+foreach(ini IN LISTS chain)
+  math(EXPR step "${step} + 1")
+  file(WRITE ${project}/qoconvert.ini "${ini}")
+  execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
+                  RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+  if(NOT rc EQUAL 0)
+    file(READ ${project}/qoconvert.log log)
+    message(FATAL_ERROR "chain step ${step}: exit ${rc}\n${ini}\n${err}\nlog:\n${log}")
+  endif()
+endforeach()
+execute_process(COMMAND sh -c "tail -n +2 expected-ansi.txt > expected-values.txt; for f in kette1 kette2; do tail -n +2 $f.txt > $f.values; done"
+                WORKING_DIRECTORY ${project})
+foreach(result kette1 kette2)
+  execute_process(COMMAND ${CMAKE_COMMAND} -E compare_files ${project}/${result}.values ${project}/expected-values.txt
+                  RESULT_VARIABLE differs)
+  if(NOT differs EQUAL 0)
+    file(READ ${project}/${result}.txt got)
+    message(FATAL_ERROR "chain: ${result}.txt differs from the input's values:\n${got}")
+  endif()
+endforeach()
+
 # The large sample with its four defective records: a batch run converts the
 # rest, names each defective record in the log and ends with 3 (converted,
 # records left out).
