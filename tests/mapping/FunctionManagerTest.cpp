@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <functional>
 
 using Function = CFunctionManager::CFunction;
 using Part = CFunctionManager::CCombiPart;
@@ -30,46 +31,28 @@ std::vector<long> Ids(const CFunctionManager& manager)
 
 } // namespace
 
-// --- id ranges and next ids ------------------------------------------------
-
-TEST(FunctionManagerIds, DefaultRangesClassifyIdsAtTheirBounds)
+TEST(FunctionManagerIds, RangesClassifyIdsAtTheirBoundsAndGapsHaveNoType)
 {
+    const auto pre = CFunctionManager::predefinedType, user = CFunctionManager::userdefinedType,
+               combi = CFunctionManager::combiType, file = CFunctionManager::fileType, none = CFunctionManager::noType;
     CFunctionManager m;
-    EXPECT_EQ(CFunctionManager::predefinedType, m.Id2Type(0));
-    EXPECT_EQ(CFunctionManager::predefinedType, m.Id2Type(9999));
-    EXPECT_EQ(CFunctionManager::userdefinedType, m.Id2Type(10000));
-    EXPECT_EQ(CFunctionManager::userdefinedType, m.Id2Type(19999));
-    EXPECT_EQ(CFunctionManager::combiType, m.Id2Type(20000));
-    EXPECT_EQ(CFunctionManager::combiType, m.Id2Type(29999));
-    EXPECT_EQ(CFunctionManager::fileType, m.Id2Type(30000));
-    EXPECT_EQ(CFunctionManager::fileType, m.Id2Type(2000000000L));
-    EXPECT_EQ(CFunctionManager::noType, m.Id2Type(-1));
-    EXPECT_EQ(0L, CFunctionManager::unusedFunction);
-}
+    const std::pair<long, CFunctionManager::type> defaults[] = {
+        {0, pre}, {9999, pre}, {10000, user}, {19999, user}, {20000, combi},
+        {29999, combi}, {30000, file}, {2000000000L, file}, {-1, none}};
+    for (const auto& c : defaults)
+        EXPECT_EQ(c.second, m.Id2Type(c.first)) << c.first;
 
-TEST(FunctionManagerIds, GapsBetweenChangedRangesHaveNoType)
-{
-    CFunctionManager m;
+    // Changed ranges leave gaps; where they overlap, the earlier kind in the
+    // order predefined, user-defined, combination wins.
     m.SetMaxPredefinedId(99);
-    EXPECT_EQ(99L, m.GetMaxPredefinedId());
-    EXPECT_EQ(CFunctionManager::noType, m.Id2Type(500));
-    EXPECT_EQ(CFunctionManager::predefinedType, m.Id2Type(99));
-
     m.SetMinUnusedFileId(50000);
-    EXPECT_EQ(CFunctionManager::noType, m.Id2Type(30000));
-    EXPECT_EQ(CFunctionManager::fileType, m.Id2Type(50000));
-
     m.SetMinCombiId(25000);
     m.SetMaxCombiId(26000);
-    EXPECT_EQ(CFunctionManager::noType, m.Id2Type(24999));
-    EXPECT_EQ(CFunctionManager::combiType, m.Id2Type(26000));
-    EXPECT_EQ(CFunctionManager::noType, m.Id2Type(26001));
-
-    // Overlapping ranges: the earlier kind in the order predefined,
-    // user-defined, combination wins.
     m.SetMinUserdefinedId(50);
-    EXPECT_EQ(CFunctionManager::predefinedType, m.Id2Type(60));
-    EXPECT_EQ(CFunctionManager::userdefinedType, m.Id2Type(100));
+    const std::pair<long, CFunctionManager::type> changed[] = {
+        {99, pre}, {60, pre}, {100, user}, {24999, none}, {26000, combi}, {26001, none}, {30000, none}, {50000, file}};
+    for (const auto& c : changed)
+        EXPECT_EQ(c.second, m.Id2Type(c.first)) << c.first;
 }
 
 TEST(FunctionManagerIds, PredefinedNextIdIsAlwaysTakenOthersOnlyOnRequest)
@@ -77,73 +60,41 @@ TEST(FunctionManagerIds, PredefinedNextIdIsAlwaysTakenOthersOnlyOnRequest)
     CFunctionManager m;
     EXPECT_EQ(0L, m.GetNextPredefinedId());
     EXPECT_EQ(1L, m.GetNextPredefinedId());
-
-    EXPECT_EQ(10000L, m.GetNextUserdefinedId(false));
     EXPECT_EQ(10000L, m.GetNextUserdefinedId(false));
     EXPECT_EQ(10000L, m.GetNextUserdefinedId(true));
     EXPECT_EQ(10001L, m.GetNextUserdefinedId(false));
-
-    EXPECT_EQ(20000L, m.GetNextCombiId(false));
     EXPECT_EQ(20000L, m.GetNextCombiId(true));
     EXPECT_EQ(20001L, m.GetNextCombiId(true));
 
     m.SetNextPredefinedId(42);
-    m.SetNextUserdefinedId(10500);
     m.SetNextCombiId(29999);
     EXPECT_EQ(42L, m.GetNextPredefinedId());
-    EXPECT_EQ(10500L, m.GetNextUserdefinedId(true));
     // Nothing stops a next id at its range's end.
     EXPECT_EQ(29999L, m.GetNextCombiId(true));
     EXPECT_EQ(30000L, m.GetNextCombiId(false));
 }
 
-// --- the registry ------------------------------------------------------------
-
-TEST(FunctionManagerRegistry, FunctionsComeInAscendingIdOrder)
+TEST(FunctionManagerRegistry, FunctionsInIdOrderReplacedByIdFoundByNameInAnyCase)
 {
     CFunctionManager m;
     Add(m, 20001, "Name komplett");
-    Add(m, 3, "Strasse");
+    Add(m, 3, "Straße");
     Add(m, 10000, "Kunde");
-    Add(m, 1, "Name");
-    EXPECT_EQ(4, m.GetNumFunctions());
+    Add(m, 1, "Änderung");
+    Add(m, 10000, "Kundennummer");
     EXPECT_EQ((std::vector<long>{1, 3, 10000, 20001}), Ids(m));
 
     Function f(-7, "unverändert");
-    EXPECT_FALSE(m.GetFunctionAt(-1, f));
     EXPECT_FALSE(m.GetFunctionAt(4, f));
     EXPECT_FALSE(m.GetFunction(2, f));
     EXPECT_EQ(-7L, f.GetId());
-    EXPECT_STREQ("unverändert", f.GetName());
-
     ASSERT_TRUE(m.GetFunction(10000, f));
-    EXPECT_STREQ("Kunde", f.GetName());
-}
-
-TEST(FunctionManagerRegistry, AddingUnderAnExistingIdReplacesThatFunction)
-{
-    CFunctionManager m;
-    Add(m, 10000, "Kunde");
-    Add(m, 10000, "Kundennummer");
-    EXPECT_EQ(1, m.GetNumFunctions());
-    Function f(0, "");
-    ASSERT_TRUE(m.GetFunctionAt(0, f));
     EXPECT_STREQ("Kundennummer", f.GetName());
-    EXPECT_FALSE(m.ExistsFunction("Kunde"));
-}
 
-TEST(FunctionManagerRegistry, ExistsFunctionIgnoresCaseIncludingUmlauts)
-{
-    CFunctionManager m;
-    Add(m, 1, "Kunde");
-    Add(m, 2, "Straße");
-    Add(m, 3, "Änderung");
-    EXPECT_TRUE(m.ExistsFunction("kunde"));
-    EXPECT_TRUE(m.ExistsFunction("KUNDE"));
-    EXPECT_TRUE(m.ExistsFunction("straße"));
-    EXPECT_TRUE(m.ExistsFunction("änderung"));
-    EXPECT_FALSE(m.ExistsFunction("Kunden"));
-    EXPECT_FALSE(m.ExistsFunction(""));
+    for (const char* name : {"kundennummer", "KUNDENNUMMER", "straße", "änderung"})
+        EXPECT_TRUE(m.ExistsFunction(name)) << name;
+    for (const char* name : {"Kunde", "Kunden", ""})
+        EXPECT_FALSE(m.ExistsFunction(name)) << name;
 }
 
 TEST(FunctionManagerRegistry, CombinationsKeepTheirPartsAndAreFoundByPart)
@@ -158,128 +109,74 @@ TEST(FunctionManagerRegistry, CombinationsKeepTheirPartsAndAreFoundByPart)
 
     Function read(0, "");
     ASSERT_TRUE(m.GetFunction(20000, read));
-    std::vector<Part> parts = read.GetCombination();
-    ASSERT_EQ(2u, parts.size());
-    EXPECT_EQ(1L, parts[0].GetFunctionId());
-    EXPECT_STREQ("", parts[0].GetSeparator());
-    EXPECT_FALSE(parts[0].GetAlwaysSeparate());
-    EXPECT_EQ(2L, parts[1].GetFunctionId());
-    EXPECT_STREQ(" ", parts[1].GetSeparator());
-    EXPECT_TRUE(parts[1].GetAlwaysSeparate());
-
-    EXPECT_TRUE(m.ExistsCombiWithId(1));
-    EXPECT_TRUE(m.ExistsCombiWithId(2));
-    EXPECT_FALSE(m.ExistsCombiWithId(3));
-    EXPECT_FALSE(m.ExistsCombiWithId(20000));
+    std::string parts;
+    for (const Part& p : read.GetCombination())
+        parts += std::to_string(p.GetFunctionId()) + "|" + (const char*)p.GetSeparator() + "|" +
+                 std::to_string(p.GetAlwaysSeparate()) + ";";
+    EXPECT_EQ("1||0;2| |1;", parts);
+    EXPECT_TRUE(m.ExistsCombiWithId(1) && m.ExistsCombiWithId(2));
+    EXPECT_FALSE(m.ExistsCombiWithId(3) || m.ExistsCombiWithId(20000));
 
     // The copy handed out is the caller's: changing it leaves the stored one.
-    parts.clear();
-    read.SetCombination(parts);
+    read.SetCombination({});
     ASSERT_TRUE(m.GetFunction(20000, read));
     EXPECT_EQ(2u, read.GetCombination().size());
-
     m.DeleteFunction(20000);
     EXPECT_FALSE(m.ExistsCombiWithId(1));
 }
 
-// --- deleting and restoring ------------------------------------------------
-
-TEST(FunctionManagerDelete, ReAddedNameOfTheSameKindGetsItsOldIdBack)
+// A deleted name added again takes its old id back when it is of the same kind
+// and no function holds that id now.
+TEST(FunctionManagerDelete, ReAddedNameGetsItsOldIdBackOnlyWhereThatIsSafe)
 {
+    const struct {
+        const char* what;
+        std::function<void(CFunctionManager&)> before;  // Kunde 10003 was deleted first
+        long added;                                     // the id "KUNDE" is added with
+        long expected;
+    } cases[] = {
+        {"same kind", [](CFunctionManager&) {}, 10007, 10003},
+        {"another kind", [](CFunctionManager&) {}, 20005, 20005},
+        {"the old id held by another function", [](CFunctionManager& m) { Add(m, 10003, "Lieferant"); }, 10008, 10008},
+        {"another kind added and deleted in between",
+         [](CFunctionManager& m) {
+             Add(m, 20005, "Kunde");
+             m.DeleteFunction(20005);
+         },
+         10009, 10009},
+        {"cleared, not deleted, functions are forgotten", [](CFunctionManager& m) { m.ClearFunctions(); }, 10010,
+         10003},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.what);
+        CFunctionManager m;
+        Add(m, 10003, "Kunde");
+        Add(m, 1, "Name");
+        m.DeleteFunction(10003);
+        EXPECT_TRUE(m.IsDeleted("KUNDE"));
+        EXPECT_FALSE(m.ExistsFunction("Kunde"));
+        c.before(m);
+        Function f(c.added, "KUNDE");
+        m.AddFunction(f);
+        EXPECT_EQ(c.expected, f.GetId());
+        EXPECT_FALSE(m.IsDeleted("kunde"));
+        Function stored(0, "");
+        EXPECT_TRUE(m.GetFunction(c.expected, stored) && stored.GetName() == "KUNDE");
+    }
+    // The manager itself does not enforce unique names: the last deletion of a
+    // name wins. Cleared functions were not deleted: their names bring nothing back.
     CFunctionManager m;
-    Add(m, 10003, "Kunde");
-    Add(m, 10004, "Lieferant");
-    m.DeleteFunction(10003);
-    EXPECT_EQ(1, m.GetNumFunctions());
-    EXPECT_TRUE(m.IsDeleted("kunde"));
-    EXPECT_TRUE(m.IsDeleted("KUNDE"));
-    EXPECT_FALSE(m.ExistsFunction("Kunde"));
-
-    Function f(10007, "KUNDE");
-    m.AddFunction(f);
-    EXPECT_EQ(10003L, f.GetId());
-    EXPECT_FALSE(m.IsDeleted("kunde"));
-    Function stored(0, "");
-    ASSERT_TRUE(m.GetFunction(10003, stored));
-    EXPECT_STREQ("KUNDE", stored.GetName());
-    EXPECT_FALSE(m.GetFunction(10007, stored));
-    EXPECT_EQ((std::vector<long>{10003, 10004}), Ids(m));
-}
-
-TEST(FunctionManagerDelete, ReAddedNameOfAnotherKindKeepsItsNewId)
-{
-    CFunctionManager m;
-    Add(m, 10003, "Kunde");
-    m.DeleteFunction(10003);
-    Function f(20005, "Kunde");
-    m.AddFunction(f);
-    EXPECT_EQ(20005L, f.GetId());
-    EXPECT_FALSE(m.IsDeleted("Kunde"));
-    EXPECT_EQ((std::vector<long>{20005}), Ids(m));
-
-    // The memory was used up: deleting the combination and adding a
-    // user-defined Kunde again now goes by the combination's id.
-    m.DeleteFunction(20005);
-    Function g(10009, "Kunde");
-    m.AddFunction(g);
-    EXPECT_EQ(10009L, g.GetId());
-}
-
-TEST(FunctionManagerDelete, OldIdIsNotTakenFromAFunctionThatHoldsItNow)
-{
-    CFunctionManager m;
-    Add(m, 10003, "Kunde");
-    m.DeleteFunction(10003);
-    Add(m, 10003, "Lieferant");   // the host reused the free id
-
-    Function f(10008, "Kunde");
-    m.AddFunction(f);
-    EXPECT_EQ(10008L, f.GetId());
-    EXPECT_FALSE(m.IsDeleted("kunde"));
-    Function stored(0, "");
-    ASSERT_TRUE(m.GetFunction(10003, stored));
-    EXPECT_STREQ("Lieferant", stored.GetName());
-    EXPECT_EQ(2, m.GetNumFunctions());
-}
-
-TEST(FunctionManagerDelete, LastDeletionOfANameWinsAndUnknownIdsAreIgnored)
-{
-    CFunctionManager m;
-    // The manager itself does not enforce unique names.
     Add(m, 10001, "Kunde");
     Add(m, 10002, "KUNDE");
+    Add(m, 1, "Name");
     m.DeleteFunction(10001);
     m.DeleteFunction(10002);
-    m.DeleteFunction(12345);   // unknown: nothing happens
-    EXPECT_EQ(0, m.GetNumFunctions());
-
-    Function f(10050, "kunde");
-    m.AddFunction(f);
-    EXPECT_EQ(10002L, f.GetId());
-}
-
-TEST(FunctionManagerDelete, ClearKeepsTheMemoryOfDeletedNames)
-{
-    CFunctionManager m;
-    Add(m, 10003, "Kunde");
-    Add(m, 1, "Name");
-    m.DeleteFunction(10003);
+    m.DeleteFunction(12345);  // unknown: nothing happens
     m.ClearFunctions();
     EXPECT_EQ(0, m.GetNumFunctions());
-    Function f(0, "");
-    EXPECT_FALSE(m.GetFunctionAt(0, f));
-    EXPECT_TRUE(m.IsDeleted("Kunde"));
-
-    Function again(10010, "kunde");
-    m.AddFunction(again);
-    EXPECT_EQ(10003L, again.GetId());
-    // Cleared functions were not deleted: their names bring nothing back.
-    Function name(10011, "Name");
-    m.AddFunction(name);
-    EXPECT_EQ(10011L, name.GetId());
+    EXPECT_EQ(10002L, Add(m, 10050, "kunde").GetId());
+    EXPECT_EQ(11L, Add(m, 11, "Name").GetId());
 }
-
-// --- copies ----------------------------------------------------------------------
 
 TEST(FunctionManagerCopy, CopyAndAssignmentTakeFunctionsDeletedNamesAndSettings)
 {
@@ -293,19 +190,14 @@ TEST(FunctionManagerCopy, CopyAndAssignmentTakeFunctionsDeletedNamesAndSettings)
     CFunctionManager copy(m);
     Add(copy, 6, "Vorname");
     EXPECT_EQ(1, m.GetNumFunctions());
-    EXPECT_EQ(2, copy.GetNumFunctions());
-    EXPECT_EQ(99L, copy.GetMaxPredefinedId());
     EXPECT_EQ(10020L, copy.GetNextUserdefinedId(true));
     EXPECT_EQ(10020L, m.GetNextUserdefinedId(false));
-    EXPECT_TRUE(copy.IsDeleted("kunde"));
 
     CFunctionManager target;
     target = copy;
     EXPECT_EQ((std::vector<long>{5, 6}), Ids(target));
     EXPECT_EQ(10021L, target.GetNextUserdefinedId(false));
     EXPECT_EQ(CFunctionManager::noType, target.Id2Type(500));
-    Function f(10077, "KUNDE");
-    target.AddFunction(f);
-    EXPECT_EQ(10003L, f.GetId());
+    EXPECT_EQ(10003L, Add(target, 10077, "KUNDE").GetId());
     EXPECT_TRUE(copy.IsDeleted("kunde"));
 }

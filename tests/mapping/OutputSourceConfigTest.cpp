@@ -224,7 +224,6 @@ TEST(PrefixDialogTest, TheSeparatorAndTheSwitchAsTheUserLeftThem)
         std::string separator;
         BOOL always;
     } const cases[] = {
-        {"OK without input", "", FALSE, "", false, IDOK, IDOK, "", FALSE},
         {"blanks and a dash, ticked", "", FALSE, " - ", true, IDOK, IDOK, " - ", TRUE},
         {"preset shown and kept", ";", TRUE, "", false, IDOK, IDOK, ";", TRUE},
         {"cancelled", ",", FALSE, "/", true, IDCANCEL, IDCANCEL, ",", FALSE},
