@@ -22,33 +22,16 @@
 
 #include <afxtempl.h>
 
-#include "CColoredListCtrl.h"
-#include "COutputFilterConfig.h"
+#include "COutputFilterConfigColumns.h"
 #include "QoMfcExtApi.h"
 
-class COutputFilterConfigDao;
 class CQoOutputFilterDB;
 
-// The column list of the page: name, type, length (text fields only) and
-// whether the column is indexed. It keeps no rows and asks the page for each
-// cell; a row the page does not have is painted empty.
-class COutputFilterConfigDaoClrListCtrl : public CColoredListCtrl
-{
-public:
-    enum : DWORD { clrText = 0x000000, clrSelectedText = 0xFFFFFF };
+// The page's column list: name, type, length (text fields only) and whether
+// the column is indexed (one list serves every page of columns).
+typedef COutputFilterConfigColumnsClrListCtrl COutputFilterConfigDaoClrListCtrl;
 
-    explicit COutputFilterConfigDaoClrListCtrl(COutputFilterConfigDao* pPage);
-    ~COutputFilterConfigDaoClrListCtrl() override;
-
-    int GetColoredItem(int row, int col, CString& text, DWORD& clrTextOut, DWORD& clrSelectedTextOut,
-                       bool& bold) override;
-    void ItemChanged() override;
-
-private:
-    COutputFilterConfigDao* m_pPage;  // not owned; null: every cell answers 1 and nothing else
-};
-
-class QOMFCEXT_API COutputFilterConfigDao : public COutputFilterConfig
+class QOMFCEXT_API COutputFilterConfigDao : public COutputFilterConfigColumns
 {
     DECLARE_DYNAMIC(COutputFilterConfigDao)
 
@@ -70,48 +53,29 @@ public:
     virtual ~COutputFilterConfigDao();
 
     // COutputFilterConfig
-    virtual void Enable(bool bOn);
-    virtual void DefaultAction();
-    virtual void RefreshDisplay();
     virtual void UpdateOutputFilter(int nSave);
-    virtual int Create(CWnd* pParent);
-    using COutputFilterConfig::Create;
 
-    // The list calls it whenever an item's state changed.
-    void ListItemChanged();
-
-    int GetColumnCount() const { return static_cast<int>(m_arrColumns.GetSize()); }
+    virtual int GetColumnCount() const { return static_cast<int>(m_arrColumns.GetSize()); }
     // False and `col` untouched for an index outside the columns.
-    bool GetColumn(int index, SCol& col) const;
+    bool GetColumn(int index, SCol& col) const { return ColumnAt(m_arrColumns, index, col); }
     const CString& GetTableName() const { return m_strTableName; }
+    virtual bool CellText(int row, int col, CString& text) const;
 
 protected:
     virtual void DoDataExchange(CDataExchange* pDX);
     virtual BOOL OnInitDialog();
-    virtual void OnOK();
-
-    // The columns anew from the source, keeping the settings of columns whose
-    // names stay; false (after telling the user) when the source fails.
-    bool LoadColumnsFromSource();
-
-    afx_msg void OnItemchangedList(NMHDR* pNMHDR, LRESULT* pResult);
-    afx_msg void OnSelchangeType();
-    afx_msg void OnApply();
+    virtual bool FilterFits() const;
+    virtual void ShowColumn(int row);
+    virtual bool TakeSelectedColumn();
+    virtual bool LoadColumnsFromSource();
     DECLARE_MESSAGE_MAP()
 
     CString m_strTableName;
-    int m_nFieldLen;
-    int m_nFieldType;  // combo index: 0 text, 1 numeric
     BOOL m_bIndexed;
-    int m_nSelIndex;
-    COutputFilterConfigDaoClrListCtrl m_list;
     CArray<SCol, SCol&> m_arrColumns;
 
 private:
     CQoOutputFilterDB* Filter() const;
-    // Takes the fields at the right into the selected column; false (after
-    // telling the user) when they are refused.
-    bool TakeSelectedColumn();
     // The page into the filter; false (after telling the user) when a setting
     // is refused, and then the filter is untouched.
     bool WriteToFilter();

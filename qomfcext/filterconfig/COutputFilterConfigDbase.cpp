@@ -15,122 +15,46 @@
 
 namespace {
 
-// The type combo: index 0 text (type 2), index 1 numeric (type 1).
-int TypeIndex(int type) { return type == 2 ? 0 : 1; }
-int TypeOfIndex(int index) { return index == 0 ? 2 : 1; }
-
-CString TypeText(int type)
-{
-    CString text;
-    if (type == 1)
-        text.LoadString(IDS_TYPE_NUMERIC);
-    else if (type == 2)
-        text.LoadString(IDS_TYPE_TEXT);
-    return text;
-}
+// The page's controls: the list of the columns, and what Enable switches.
+const COutputFilterConfigColumns::SLayout layout = {
+    IDD_OUTPUT_DBASE,
+    IDC_OUTDBF_LIST,
+    IDC_OUTDBF_FIELDLEN,
+    IDC_OUTDBF_TYPE,
+    {{MAKEINTRESOURCE(IDS_COL_FIELD), LVCFMT_LEFT, 60},
+     {MAKEINTRESOURCE(IDS_COL_TYPE), LVCFMT_LEFT, 20},
+     {MAKEINTRESOURCE(IDS_COL_LENGTH), LVCFMT_RIGHT, 20}},
+    {IDC_OUTDBF_INSTRUCTION, IDC_OUTDBF_INSTRUCTION2, IDC_OUTDBF_LBL_TYPE, IDC_OUTDBF_LBL_FIELDLEN, IDC_OUTDBF_TYPE,
+     IDC_OUTDBF_FIELDLEN, IDC_OUTDBF_APPLY, IDC_OUTDBF_LIST}};
 
 }  // namespace
 
-// ---------------------------------------------------------------------------
-// The column list
+IMPLEMENT_DYNAMIC(COutputFilterConfigDbase, COutputFilterConfigColumns)
 
-COutputFilterConfigDbaseClrListCtrl::COutputFilterConfigDbaseClrListCtrl(COutputFilterConfigDbase* pPage)
-    : m_pPage(pPage)
-{
-}
-
-COutputFilterConfigDbaseClrListCtrl::~COutputFilterConfigDbaseClrListCtrl() {}
-
-int COutputFilterConfigDbaseClrListCtrl::GetColoredItem(int row, int col, CString& text, DWORD& clrTextOut,
-                                                        DWORD& clrSelectedTextOut, bool& bold)
-{
-    if (m_pPage == NULL)
-        return 1;
-    bold = false;
-    clrTextOut = clrText;
-    clrSelectedTextOut = clrSelectedText;
-    text.Empty();
-    COutputFilterConfigDbase::SCol column;
-    if (!m_pPage->GetColumn(row, column))
-        return 1;
-    switch (col) {
-    case 0:
-        text = column.strName;
-        break;
-    case 1:
-        text = TypeText(column.nType);
-        break;
-    case 2:
-        if (column.nType == 2)
-            text.Format("%d", column.nLength);
-        break;
-    }
-    return 1;
-}
-
-void COutputFilterConfigDbaseClrListCtrl::ItemChanged()
-{
-    if (m_pPage != NULL)
-        m_pPage->ListItemChanged();
-}
-
-// ---------------------------------------------------------------------------
-// The page
-
-IMPLEMENT_DYNAMIC(COutputFilterConfigDbase, COutputFilterConfig)
-
-BEGIN_MESSAGE_MAP(COutputFilterConfigDbase, COutputFilterConfig)
+BEGIN_MESSAGE_MAP(COutputFilterConfigDbase, COutputFilterConfigColumns)
     ON_BN_CLICKED(IDC_OUTDBF_APPLY, OnApply)
     ON_NOTIFY(LVN_ITEMCHANGED, IDC_OUTDBF_LIST, OnItemchangedList)
     ON_CBN_SELCHANGE(IDC_OUTDBF_TYPE, OnSelchangeType)
 END_MESSAGE_MAP()
 
 COutputFilterConfigDbase::COutputFilterConfigDbase(int nNotifierId, CWnd* pParent)
-    : COutputFilterConfig(nNotifierId, IDD_OUTPUT_DBASE, pParent), m_nFieldLen(0), m_nFieldType(-1),
-      m_nSelIndex(-1), m_list(this)
+    : COutputFilterConfigColumns(nNotifierId, layout, pParent)
 {
 }
 
 COutputFilterConfigDbase::~COutputFilterConfigDbase() {}
 
-int COutputFilterConfigDbase::Create(CWnd* pParent)
-{
-    return CDialog::Create(IDD_OUTPUT_DBASE, pParent);
-}
-
 void COutputFilterConfigDbase::DoDataExchange(CDataExchange* pDX)
 {
-    COutputFilterConfig::DoDataExchange(pDX);
+    COutputFilterConfigColumns::DoDataExchange(pDX);
     DDX_Text(pDX, IDC_OUTDBF_FIELDLEN, m_nFieldLen);
     DDX_CBIndex(pDX, IDC_OUTDBF_TYPE, m_nFieldType);
 }
 
 BOOL COutputFilterConfigDbase::OnInitDialog()
 {
-    CDialog::OnInitDialog();
-    m_list.SubclassDlgItem(IDC_OUTDBF_LIST, this);
-    m_list.Init();
-
-    CRect rc;
-    m_list.GetClientRect(&rc);
-    const int w = rc.Width() - 16;  // room for a vertical scroll bar
-    CString caption;
-    caption.LoadString(IDS_COL_FIELD);
-    m_list.InsertColumn(0, caption, LVCFMT_LEFT, w * 60 / 100);
-    caption.LoadString(IDS_COL_TYPE);
-    m_list.InsertColumn(1, caption, LVCFMT_LEFT, w * 20 / 100);
-    caption.LoadString(IDS_COL_LENGTH);
-    m_list.InsertColumn(2, caption, LVCFMT_RIGHT, w * 20 / 100);
-    // Columns set before the window existed (a host may refresh first).
-    m_list.SetItemCountEx(GetColumnCount(), 0);
-
-    CComboBox* pType = static_cast<CComboBox*>(GetDlgItem(IDC_OUTDBF_TYPE));
-    pType->ResetContent();
-    pType->AddString(TypeText(2));
-    pType->AddString(TypeText(1));
-    pType->SetCurSel(0);
-    pType->EnableWindow(FALSE);
-    GetDlgItem(IDC_OUTDBF_FIELDLEN)->EnableWindow(FALSE);
+    COutputFilterConfigColumns::OnInitDialog();
+    InitTypeCombo();
     return TRUE;
 }
 
@@ -139,145 +63,42 @@ CQoOutputFilterDbase* COutputFilterConfigDbase::Filter() const
     return dynamic_cast<CQoOutputFilterDbase*>(m_pOutputFilter);
 }
 
-bool COutputFilterConfigDbase::GetColumn(int index, SCol& col) const
+bool COutputFilterConfigDbase::FilterFits() const
 {
-    if (index < 0 || index >= GetColumnCount())
-        return false;
-    col = m_arrColumns[index];
-    return true;
+    return Filter() != NULL;
 }
 
-void COutputFilterConfigDbase::Enable(bool bOn)
+bool COutputFilterConfigDbase::CellText(int row, int col, CString& text) const
 {
-    if (!::IsWindow(m_hWnd))
-        return;
-    static const int ids[] = {IDC_OUTDBF_INSTRUCTION, IDC_OUTDBF_INSTRUCTION2, IDC_OUTDBF_LBL_TYPE,
-                              IDC_OUTDBF_LBL_FIELDLEN, IDC_OUTDBF_TYPE,        IDC_OUTDBF_FIELDLEN,
-                              IDC_OUTDBF_APPLY,        IDC_OUTDBF_LIST};
-    for (int id : ids)
-        if (CWnd* pCtrl = GetDlgItem(id))
-            pCtrl->EnableWindow(bOn);
-    // The fields at the right follow the selection.
-    if (bOn)
-        ListItemChanged();
+    const SCol& column = m_arrColumns[row];
+    TypedCellText(col, column.strName, column.nType, column.nLength, text);
+    return false;
 }
 
-void COutputFilterConfigDbase::DefaultAction()
+void COutputFilterConfigDbase::ShowColumn(int row)
 {
-    OnApply();
-}
-
-void COutputFilterConfigDbase::OnOK()
-{
-    DefaultAction();
-}
-
-void COutputFilterConfigDbase::ListItemChanged()
-{
-    OnItemchangedList(NULL, NULL);
-}
-
-void COutputFilterConfigDbase::OnItemchangedList(NMHDR* pNMHDR, LRESULT* pResult)
-{
-    (void)pNMHDR;
-    if (::IsWindow(m_hWnd) && ::IsWindow(m_list.m_hWnd)) {
-        const int row = ListView_GetNextItem(m_list.m_hWnd, -1, LVNI_SELECTED);
-        CComboBox* pType = static_cast<CComboBox*>(GetDlgItem(IDC_OUTDBF_TYPE));
-        if (row < 0 || row >= GetColumnCount()) {
-            // Nothing selected: an apply now leaves every column as it is.
-            m_nSelIndex = -1;
-            pType->EnableWindow(FALSE);
-            GetDlgItem(IDC_OUTDBF_FIELDLEN)->EnableWindow(FALSE);
-        } else {
-            m_nFieldType = TypeIndex(m_arrColumns[row].nType);
-            m_nFieldLen = m_arrColumns[row].nLength;
-            m_nSelIndex = row;
-            UpdateData(FALSE);
-            pType->EnableWindow(TRUE);
-            GetDlgItem(IDC_OUTDBF_FIELDLEN)->EnableWindow(m_nFieldType == 0);
-        }
-    }
-    if (pResult != NULL)
-        *pResult = 0;
-}
-
-void COutputFilterConfigDbase::OnSelchangeType()
-{
-    m_nFieldType = static_cast<CComboBox*>(GetDlgItem(IDC_OUTDBF_TYPE))->GetCurSel();
-    GetDlgItem(IDC_OUTDBF_FIELDLEN)->EnableWindow(m_nFieldType == 0);
+    ShowTypeAndLength(row, row >= 0 ? m_arrColumns[row].nType : 0, row >= 0 ? m_arrColumns[row].nLength : 0);
 }
 
 bool COutputFilterConfigDbase::TakeSelectedColumn()
 {
     SCol& col = m_arrColumns[m_nSelIndex];
-    if (m_nFieldType == 0 && (m_nFieldLen < 1 || m_nFieldLen > maxTextLen)) {
-        CString prompt;
-        prompt.Format("Die L\xE4nge des Textfeldes '%s' muss zwischen 1 und %d liegen.",
-                      static_cast<const char*>(col.strName), static_cast<int>(maxTextLen));
-        AfxMessageBox(prompt, MB_ICONEXCLAMATION);
-        CWnd* pLen = GetDlgItem(IDC_OUTDBF_FIELDLEN);
-        GotoDlgCtrl(pLen);
-        pLen->SendMessage(EM_SETSEL, 0, -1);
+    if (!CheckTypeAndLength(col.strName, maxTextLen))
         return false;
-    }
     col.nType = TypeOfIndex(m_nFieldType);
     // A numeric field is always numericLen wide: the text length stays for a
     // later change back to text.
     if (col.nType == 2)
         col.nLength = m_nFieldLen;
-    m_list.RedrawWindow(NULL, NULL, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
     return true;
 }
 
-void COutputFilterConfigDbase::OnApply()
+bool COutputFilterConfigDbase::LoadColumnsFromSource()
 {
-    if (::IsWindow(m_hWnd)) {
-        // A refused entry has been told once; nothing of it is applied.
-        if (!UpdateData(TRUE))
-            return;
-        if (m_nSelIndex >= 0 && m_nSelIndex < GetColumnCount() && !TakeSelectedColumn())
-            return;
-    }
-    UpdateOutputFilter(1);
-}
-
-void COutputFilterConfigDbase::RefreshDisplay()
-{
-    if (m_pOutputSource == NULL || Filter() == NULL)
-        return;
-    CArray<SCol, SCol&> columns;
-    try {
-        const int n =
-            qolimits::Checked("Spalten", m_pOutputSource->GetNumColumns(), 0, qolimits::maxColumns);
-        for (int i = 0; i < n; ++i) {
-            SCol col;
-            CQoString name;
-            m_pOutputSource->GetColumnName(i, name);
-            col.strName = name.GetString();
-            col.nDataLength = m_pOutputSource->GetDataLength(i);
-            col.nLength = defaultLen;
-            col.nType = defaultType;
-            for (int k = 0; k < GetColumnCount(); ++k)
-                if (m_arrColumns[k].strName == col.strName) {
-                    col.nLength = m_arrColumns[k].nLength;
-                    col.nType = m_arrColumns[k].nType;
-                    break;
-                }
-            columns.Add(col);
-        }
-    } catch (CQoException const& e) {
-        AfxMessageBox(e.Message(), MB_ICONEXCLAMATION);
-        return;
-    }
-    m_arrColumns.Copy(columns);
-    m_nSelIndex = -1;
-    if (::IsWindow(m_list.m_hWnd)) {
-        m_list.DeleteAllItems();
-        m_list.SetItemCountEx(GetColumnCount(), 0);
-        m_list.Invalidate();
-    }
-    if (::IsWindow(m_hWnd))
-        ListItemChanged();
+    SCol fresh;
+    fresh.nLength = defaultLen;
+    fresh.nType = defaultType;
+    return LoadColumns(m_arrColumns, fresh, false);
 }
 
 void COutputFilterConfigDbase::UpdateOutputFilter(int nSave)
@@ -332,11 +153,9 @@ bool COutputFilterConfigDbase::WriteToFilter()
             m_pOutputSource->GetColumnName(i, name);
             const bool numeric = i < GetColumnCount() && m_arrColumns[i].nType == 1;
             const int length = numeric ? numericLen : i < GetColumnCount() ? m_arrColumns[i].nLength : defaultLen;
-            if (!numeric && (length < 1 || length > maxTextLen)) {
-                CString prompt;
-                prompt.Format("Die L\xE4nge des Textfeldes '%s' muss zwischen 1 und %d liegen.", name.GetString(),
-                              static_cast<int>(maxTextLen));
-                AfxMessageBox(prompt, MB_ICONEXCLAMATION);
+            const CString problem = numeric ? CString() : TextLengthProblem(name.GetString(), length, maxTextLen);
+            if (!problem.IsEmpty()) {
+                AfxMessageBox(problem, MB_ICONEXCLAMATION);
                 return false;
             }
             fields.Add(CDbaseField(name.GetString(), numeric ? 'N' : 'C', length));

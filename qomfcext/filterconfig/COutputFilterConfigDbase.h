@@ -20,33 +20,16 @@
 
 #include <afxtempl.h>
 
-#include "CColoredListCtrl.h"
-#include "COutputFilterConfig.h"
+#include "COutputFilterConfigColumns.h"
 #include "QoMfcExtApi.h"
 
-class COutputFilterConfigDbase;
 class CQoOutputFilterDbase;
 
-// The column list of the page: name, type and length (text fields only). It
-// keeps no rows and asks the page for each cell; a row the page does not have
-// is painted empty.
-class COutputFilterConfigDbaseClrListCtrl : public CColoredListCtrl
-{
-public:
-    enum : DWORD { clrText = 0x000000, clrSelectedText = 0xFFFFFF };
+// The page's column list: name, type and length (text fields only); one list
+// serves every page of columns.
+typedef COutputFilterConfigColumnsClrListCtrl COutputFilterConfigDbaseClrListCtrl;
 
-    explicit COutputFilterConfigDbaseClrListCtrl(COutputFilterConfigDbase* pPage);
-    ~COutputFilterConfigDbaseClrListCtrl() override;
-
-    int GetColoredItem(int row, int col, CString& text, DWORD& clrTextOut, DWORD& clrSelectedTextOut,
-                       bool& bold) override;
-    void ItemChanged() override;
-
-private:
-    COutputFilterConfigDbase* m_pPage;  // not owned; null: every cell answers 1 and nothing else
-};
-
-class QOMFCEXT_API COutputFilterConfigDbase : public COutputFilterConfig
+class QOMFCEXT_API COutputFilterConfigDbase : public COutputFilterConfigColumns
 {
     DECLARE_DYNAMIC(COutputFilterConfigDbase)
 
@@ -67,38 +50,25 @@ public:
     virtual ~COutputFilterConfigDbase();
 
     // COutputFilterConfig
-    virtual void Enable(bool bOn);
-    virtual void DefaultAction();
-    virtual void RefreshDisplay();
     virtual void UpdateOutputFilter(int nSave);
-    virtual int Create(CWnd* pParent);
-    using COutputFilterConfig::Create;
 
-    // The list calls it whenever an item's state changed.
-    void ListItemChanged();
-
-    int GetColumnCount() const { return static_cast<int>(m_arrColumns.GetSize()); }
+    virtual int GetColumnCount() const { return static_cast<int>(m_arrColumns.GetSize()); }
     // False and `col` untouched for an index outside the columns.
-    bool GetColumn(int index, SCol& col) const;
+    bool GetColumn(int index, SCol& col) const { return ColumnAt(m_arrColumns, index, col); }
+    virtual bool CellText(int row, int col, CString& text) const;
 
 protected:
     virtual void DoDataExchange(CDataExchange* pDX);
     virtual BOOL OnInitDialog();
-    virtual void OnOK();
-
-    afx_msg void OnApply();
-    afx_msg void OnItemchangedList(NMHDR* pNMHDR, LRESULT* pResult);
-    afx_msg void OnSelchangeType();
+    virtual bool FilterFits() const;
+    virtual void ShowColumn(int row);
+    virtual bool TakeSelectedColumn();
+    virtual bool LoadColumnsFromSource();
     DECLARE_MESSAGE_MAP()
 
-    int m_nFieldLen;
-    int m_nFieldType;  // combo index: 0 text, 1 numeric
-    int m_nSelIndex;
-    COutputFilterConfigDbaseClrListCtrl m_list;
     CArray<SCol, SCol&> m_arrColumns;
 
 private:
     CQoOutputFilterDbase* Filter() const;
-    bool TakeSelectedColumn();
     bool WriteToFilter();
 };

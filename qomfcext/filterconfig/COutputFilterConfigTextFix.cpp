@@ -23,32 +23,38 @@ int CharSetIndex(int charSet) { return charSet == CQoFile::ascii ? 1 : 0; }
 
 int CharSetOfIndex(int index) { return index == 1 ? CQoFile::ascii : CQoFile::ansi; }
 
+// The page's controls: the list of the columns, and what Enable switches.
+const COutputFilterConfigColumns::SLayout layout = {
+    IDD_OUTPUT_TEXTFIX,
+    IDC_OUTFIX_LIST,
+    IDC_OUTFIX_FIELDLEN,
+    0,
+    {{MAKEINTRESOURCE(IDS_COL_FIELD), LVCFMT_LEFT, 50},
+     {MAKEINTRESOURCE(IDS_COL_OFFSET), LVCFMT_RIGHT, 20},
+     {MAKEINTRESOURCE(IDS_COL_LENGTH), LVCFMT_RIGHT, 30}},
+    {IDC_OUTFIX_INSTRUCTION, IDC_OUTFIX_LBL_CHARSET, IDC_OUTFIX_LBL_RECLEN, IDC_OUTFIX_LBL_FIELDLEN, IDC_OUTFIX_CHARSET,
+     IDC_OUTFIX_RECLEN, IDC_OUTFIX_FIELDLEN, IDC_OUTFIX_APPLY, IDC_OUTFIX_CRLF, IDC_OUTFIX_LIST}};
+
 }  // namespace
 
-IMPLEMENT_DYNAMIC(COutputFilterConfigTextFix, COutputFilterConfig)
+IMPLEMENT_DYNAMIC(COutputFilterConfigTextFix, COutputFilterConfigColumns)
 
-BEGIN_MESSAGE_MAP(COutputFilterConfigTextFix, COutputFilterConfig)
+BEGIN_MESSAGE_MAP(COutputFilterConfigTextFix, COutputFilterConfigColumns)
     ON_NOTIFY(LVN_ITEMCHANGED, IDC_OUTFIX_LIST, OnItemchangedList)
     ON_BN_CLICKED(IDC_OUTFIX_APPLY, OnApply)
     ON_EN_KILLFOCUS(IDC_OUTFIX_RECLEN, OnKillfocusReclen)
 END_MESSAGE_MAP()
 
 COutputFilterConfigTextFix::COutputFilterConfigTextFix(int nNotifierId, CWnd* pParent)
-    : COutputFilterConfig(nNotifierId, IDD_OUTPUT_TEXTFIX, pParent), m_nFieldLen(0), m_nRecLen(0), m_bCrLf(TRUE),
-      m_nCharSet(0), m_nSelIndex(-1), m_list(this)
+    : COutputFilterConfigColumns(nNotifierId, layout, pParent), m_nRecLen(0), m_bCrLf(TRUE), m_nCharSet(0)
 {
 }
 
 COutputFilterConfigTextFix::~COutputFilterConfigTextFix() {}
 
-int COutputFilterConfigTextFix::Create(CWnd* pParent)
-{
-    return CDialog::Create(IDD_OUTPUT_TEXTFIX, pParent);
-}
-
 void COutputFilterConfigTextFix::DoDataExchange(CDataExchange* pDX)
 {
-    COutputFilterConfig::DoDataExchange(pDX);
+    COutputFilterConfigColumns::DoDataExchange(pDX);
     DDX_Text(pDX, IDC_OUTFIX_FIELDLEN, m_nFieldLen);
     DDX_Text(pDX, IDC_OUTFIX_RECLEN, m_nRecLen);
     DDX_Check(pDX, IDC_OUTFIX_CRLF, m_bCrLf);
@@ -57,23 +63,7 @@ void COutputFilterConfigTextFix::DoDataExchange(CDataExchange* pDX)
 
 BOOL COutputFilterConfigTextFix::OnInitDialog()
 {
-    CDialog::OnInitDialog();
-    m_list.SubclassDlgItem(IDC_OUTFIX_LIST, this);
-    m_list.Init();
-
-    CRect rc;
-    m_list.GetClientRect(&rc);
-    const int w = rc.Width() - 16;  // room for a vertical scroll bar
-    CString caption;
-    caption.LoadString(IDS_COL_FIELD);
-    m_list.InsertColumn(0, caption, LVCFMT_LEFT, w * 50 / 100);
-    caption.LoadString(IDS_COL_OFFSET);
-    m_list.InsertColumn(1, caption, LVCFMT_RIGHT, w * 20 / 100);
-    caption.LoadString(IDS_COL_LENGTH);
-    m_list.InsertColumn(2, caption, LVCFMT_RIGHT, w * 30 / 100);
-    // Columns set before the window existed (a host may refresh first).
-    m_list.SetItemCountEx(GetColumnCount(), 0);
-
+    COutputFilterConfigColumns::OnInitDialog();
     CComboBox* pCharSet = static_cast<CComboBox*>(GetDlgItem(IDC_OUTFIX_CHARSET));
     pCharSet->ResetContent();
     pCharSet->AddString("Windows Ansi");
@@ -89,12 +79,20 @@ CQoOutputFilterTextFix* COutputFilterConfigTextFix::Filter() const
     return dynamic_cast<CQoOutputFilterTextFix*>(m_pOutputFilter);
 }
 
-bool COutputFilterConfigTextFix::GetColumn(int index, SCol& col) const
+bool COutputFilterConfigTextFix::FilterFits() const
 {
-    if (index < 0 || index >= GetColumnCount())
-        return false;
-    col = m_arrColumns[index];
-    return true;
+    return Filter() != NULL;
+}
+
+bool COutputFilterConfigTextFix::CellText(int row, int col, CString& text) const
+{
+    const SCol& column = m_arrColumns[row];
+    if (col == 0)
+        text = column.strName;
+    else if (col == 1 || col == 2)
+        text.Format("%d", col == 1 ? column.nOffset : column.nLength);
+    // The offsets follow from the lengths: nobody types them.
+    return col == 1;
 }
 
 void COutputFilterConfigTextFix::CalcOffsets()
@@ -109,61 +107,19 @@ void COutputFilterConfigTextFix::CalcOffsets()
     m_nRecLen = static_cast<int>(sum < INT_MAX ? sum : INT_MAX);
 }
 
-void COutputFilterConfigTextFix::Enable(bool bOn)
+void COutputFilterConfigTextFix::ShowColumn(int row)
 {
-    if (!::IsWindow(m_hWnd))
+    CWnd* pFieldLen = GetDlgItem(IDC_OUTFIX_FIELDLEN);
+    pFieldLen->EnableWindow(row >= 0);
+    if (row < 0)
         return;
-    static const int ids[] = {IDC_OUTFIX_INSTRUCTION, IDC_OUTFIX_LBL_CHARSET, IDC_OUTFIX_LBL_RECLEN,
-                              IDC_OUTFIX_LBL_FIELDLEN, IDC_OUTFIX_CHARSET,    IDC_OUTFIX_RECLEN,
-                              IDC_OUTFIX_FIELDLEN,     IDC_OUTFIX_APPLY,      IDC_OUTFIX_CRLF,
-                              IDC_OUTFIX_LIST};
-    for (int id : ids)
-        if (CWnd* pCtrl = GetDlgItem(id))
-            pCtrl->EnableWindow(bOn);
-    // The field length is editable only while a row is selected.
-    if (bOn)
-        ListItemChanged();
+    m_strSelField = m_arrColumns[row].strName;
+    m_nFieldLen = m_arrColumns[row].nLength;
+    // Only the length: the other controls may hold changes not yet applied.
+    SetDlgItemInt(IDC_OUTFIX_FIELDLEN, static_cast<UINT>(m_nFieldLen), TRUE);
 }
 
-void COutputFilterConfigTextFix::DefaultAction()
-{
-    OnApply();
-}
-
-void COutputFilterConfigTextFix::OnOK()
-{
-    DefaultAction();
-}
-
-void COutputFilterConfigTextFix::ListItemChanged()
-{
-    OnItemchangedList(NULL, NULL);
-}
-
-void COutputFilterConfigTextFix::OnItemchangedList(NMHDR* pNMHDR, LRESULT* pResult)
-{
-    (void)pNMHDR;
-    if (::IsWindow(m_hWnd) && ::IsWindow(m_list.m_hWnd)) {
-        const int row = ListView_GetNextItem(m_list.m_hWnd, -1, LVNI_SELECTED);
-        CWnd* pFieldLen = GetDlgItem(IDC_OUTFIX_FIELDLEN);
-        if (row < 0 || row >= GetColumnCount()) {
-            // Nothing selected: an apply now leaves every length as it is.
-            m_nSelIndex = -1;
-            pFieldLen->EnableWindow(FALSE);
-        } else {
-            m_strSelField = m_arrColumns[row].strName;
-            m_nFieldLen = m_arrColumns[row].nLength;
-            m_nSelIndex = row;
-            pFieldLen->EnableWindow(TRUE);
-            // Only the length: the other controls may hold changes not yet applied.
-            SetDlgItemInt(IDC_OUTFIX_FIELDLEN, static_cast<UINT>(m_nFieldLen), TRUE);
-        }
-    }
-    if (pResult != NULL)
-        *pResult = 0;
-}
-
-bool COutputFilterConfigTextFix::TakeFieldLength()
+bool COutputFilterConfigTextFix::TakeSelectedColumn()
 {
     // The filter refuses a record longer than the base library's limit, so a
     // column may have what the others leave of it, and at least 1.
@@ -179,29 +135,13 @@ bool COutputFilterConfigTextFix::TakeFieldLength()
         high.Format("%lld", room);
         CString prompt;
         AfxFormatString2(prompt, AFX_IDP_PARSE_INT_RANGE, "1", high);
-        AfxMessageBox(prompt, MB_ICONEXCLAMATION, AFX_IDP_PARSE_INT_RANGE);
-        CWnd* pFieldLen = GetDlgItem(IDC_OUTFIX_FIELDLEN);
-        GotoDlgCtrl(pFieldLen);
-        pFieldLen->SendMessage(EM_SETSEL, 0, -1);
+        Refuse(prompt, IDC_OUTFIX_FIELDLEN, AFX_IDP_PARSE_INT_RANGE);
         return false;
     }
     m_arrColumns[m_nSelIndex].nLength = m_nFieldLen;
     CalcOffsets();
-    m_list.RedrawWindow(NULL, NULL, RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW);
     UpdateData(FALSE);
     return true;
-}
-
-void COutputFilterConfigTextFix::OnApply()
-{
-    if (::IsWindow(m_hWnd)) {
-        // A refused entry has been told once; nothing of it is applied.
-        if (!UpdateData(TRUE))
-            return;
-        if (m_nSelIndex >= 0 && m_nSelIndex < GetColumnCount() && !TakeFieldLength())
-            return;
-    }
-    UpdateOutputFilter(1);
 }
 
 void COutputFilterConfigTextFix::OnKillfocusReclen()
@@ -211,47 +151,23 @@ void COutputFilterConfigTextFix::OnKillfocusReclen()
     SetDlgItemInt(IDC_OUTFIX_RECLEN, static_cast<UINT>(m_nRecLen), TRUE);
 }
 
+bool COutputFilterConfigTextFix::LoadColumnsFromSource()
+{
+    SCol fresh;
+    fresh.nLength = defaultLen;
+    // More columns than any output may have are not taken into the page; the
+    // filter names the limit when they are written.
+    if (!LoadColumns(m_arrColumns, fresh, true))
+        return false;
+    CalcOffsets();
+    return true;
+}
+
 void COutputFilterConfigTextFix::RefreshDisplay()
 {
-    if (m_pOutputSource == NULL || Filter() == NULL)
-        return;
-    CArray<SCol, SCol&> columns;
-    try {
-        int n = m_pOutputSource->GetNumColumns();
-        // More columns than any output may have are not taken into the page;
-        // the filter names the limit when they are written.
-        if (n > qolimits::maxColumns)
-            n = qolimits::maxColumns;
-        for (int i = 0; i < n; ++i) {
-            SCol col;
-            CQoString name;
-            m_pOutputSource->GetColumnName(i, name);
-            col.strName = name.GetString();
-            col.nDataLength = m_pOutputSource->GetDataLength(i);
-            col.nLength = defaultLen;
-            for (int k = 0; k < GetColumnCount(); ++k)
-                if (m_arrColumns[k].strName == col.strName) {
-                    col.nLength = m_arrColumns[k].nLength;
-                    break;
-                }
-            columns.Add(col);
-        }
-    } catch (CQoException const& e) {
-        AfxMessageBox(e.Message(), MB_ICONEXCLAMATION);
-        return;
-    }
-    m_arrColumns.Copy(columns);
-    CalcOffsets();
-    m_nSelIndex = -1;
-    if (::IsWindow(m_list.m_hWnd)) {
-        m_list.DeleteAllItems();
-        m_list.SetItemCountEx(GetColumnCount(), 0);
-        m_list.Invalidate();
-    }
-    if (::IsWindow(m_hWnd)) {
-        ListItemChanged();
+    COutputFilterConfigColumns::RefreshDisplay();
+    if (::IsWindow(m_hWnd))
         SetDlgItemInt(IDC_OUTFIX_RECLEN, static_cast<UINT>(m_nRecLen), TRUE);
-    }
 }
 
 void COutputFilterConfigTextFix::UpdateOutputFilter(int nSave)

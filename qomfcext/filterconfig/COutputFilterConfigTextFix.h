@@ -23,13 +23,15 @@
 
 #include <afxtempl.h>
 
-#include "COutputFilterConfig.h"
-#include "COutputFilterConfigTextFixClrListCtrl.h"
+#include "COutputFilterConfigColumns.h"
 #include "QoMfcExtApi.h"
 
 class CQoOutputFilterTextFix;
 
-class QOMFCEXT_API COutputFilterConfigTextFix : public COutputFilterConfig
+// The page's column list (one list serves every page of columns).
+typedef COutputFilterConfigColumnsClrListCtrl COutputFilterConfigTextFixClrListCtrl;
+
+class QOMFCEXT_API COutputFilterConfigTextFix : public COutputFilterConfigColumns
 {
     DECLARE_DYNAMIC(COutputFilterConfigTextFix)
 
@@ -49,49 +51,39 @@ public:
     virtual ~COutputFilterConfigTextFix();
 
     // COutputFilterConfig
-    virtual void Enable(bool bOn);
-    virtual void DefaultAction();
     virtual void RefreshDisplay();
     virtual void UpdateOutputFilter(int nSave);
-    virtual int Create(CWnd* pParent);
-    using COutputFilterConfig::Create;
-
-    // The list calls it whenever an item's state changed.
-    void ListItemChanged();
 
     // What the page holds (for the list and for the host).
-    int GetColumnCount() const { return static_cast<int>(m_arrColumns.GetSize()); }
+    virtual int GetColumnCount() const { return static_cast<int>(m_arrColumns.GetSize()); }
     // False and `col` untouched for an index outside the columns.
-    bool GetColumn(int index, SCol& col) const;
+    bool GetColumn(int index, SCol& col) const { return ColumnAt(m_arrColumns, index, col); }
     int GetRecordLength() const { return m_nRecLen; }
+    virtual bool CellText(int row, int col, CString& text) const;
 
 protected:
     virtual void DoDataExchange(CDataExchange* pDX);
     virtual BOOL OnInitDialog();
-    virtual void OnOK();
+    virtual bool FilterFits() const;
+    virtual void ShowColumn(int row);
+    // The typed length into the selected column, if it fits into the record.
+    virtual bool TakeSelectedColumn();
+    virtual bool LoadColumnsFromSource();
 
     // Offsets from the lengths, and the record length (their sum).
     void CalcOffsets();
 
-    afx_msg void OnItemchangedList(NMHDR* pNMHDR, LRESULT* pResult);
-    afx_msg void OnApply();
     afx_msg void OnKillfocusReclen();
     DECLARE_MESSAGE_MAP()
 
     CString m_strSelField;
-    int m_nFieldLen;
     int m_nRecLen;
     BOOL m_bCrLf;
     int m_nCharSet;
-    int m_nSelIndex;
-    COutputFilterConfigTextFixClrListCtrl m_list;
     CArray<SCol, SCol&> m_arrColumns;
 
 private:
     CQoOutputFilterTextFix* Filter() const;
-    // Takes the typed length into the selected column; false (after telling
-    // the user) when it is refused.
-    bool TakeFieldLength();
     // The page's columns into the filter; false (after telling the user) when
     // the filter refuses them.
     bool WriteToFilter();
