@@ -146,12 +146,21 @@ if(NOT rc EQUAL 1 OR NOT err MATCHES "Der Projektordner '[^']*fehlt' existiert n
   message(FATAL_ERROR "missing project folder: exit ${rc}, console:\n${err}")
 endif()
 
-# Through a database: the delimited file into a table of an SQLite file, and
-# the table back into a delimited file; the records arrive unchanged.
+# Through a database: the delimited file into a table of an SQLite file (its
+# columns as the project's output section sets them: the number an integer
+# column, indexed), and the table back into a delimited file; the records
+# arrive unchanged.
 file(WRITE ${project}/qoconvert.ini
-     "[Eingabe]\nDatei=kunden.txt\nZeichensatz=0\n[Ausgabe]\nODBC=Driver=SQLite3;Database=kunden.db\nTabelle=Kunden\n")
+     "[Eingabe]\nDatei=kunden.txt\nZeichensatz=0\n[Ausgabe]\nODBC=Driver=SQLite3;Database=kunden.db\nTabelle=Kunden\n"
+     "[Ausgabefilter]\ncolumns=4\ncolumn0_type=1\ncolumn0_index=1\ncolumn1_type=2\ncolumn1_len=40\n"
+     "column2_type=2\ncolumn2_len=40\ncolumn3_type=2\ncolumn3_len=40\n")
 execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
                 RESULT_VARIABLE rc OUTPUT_QUIET ERROR_VARIABLE err TIMEOUT 120)
+execute_process(COMMAND sqlite3 ${project}/kunden.db "select typeof(Nr) from Kunden limit 1; select count(*) from sqlite_master where type='index' and tbl_name='Kunden'"
+                OUTPUT_VARIABLE schema)
+if(NOT schema MATCHES "^integer\n1\n")
+  message(FATAL_ERROR "the project's column settings did not reach the table:\n${schema}")
+endif()
 file(WRITE ${project}/qoconvert.ini
      "[Eingabe]\nODBC=Driver=SQLite3;Database=kunden.db\nSQL=select * from Kunden\n[Ausgabe]\nDatei=zurueck.txt\nZeichensatz=0\n")
 execute_process(COMMAND ${EMULATOR} ${PROGRAM} /batch ${project}
