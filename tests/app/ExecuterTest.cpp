@@ -82,13 +82,15 @@ TEST(ExecuterTest, TheCodeAndTheUserValueArePostedAndLibraryModePutsTheModuleFol
 {
     const std::string strModule = ModuleDir() + "\\qo_test_module.dll";
     const std::string strOut = TempFile("qo_exec_args.txt");
+    const std::string strLog = TempFile("qo_exec_throw.log");
     const struct {
         const char* pszCase;
         bool bProcess;
         std::vector<std::string> args;
         int nExpected;
     } cases[] = {
-        {"QoMain returns 7", false, {strModule, strOut, "7", "mit Leerzeichen"}, 7},
+        {"QoMain throws", false, {strModule, TempFile("qo_exec_throw.txt"), "throw"}, CExecuter::errEntryException},
+        {"QoMain returns 7 (the module was unloaded)", false, {strModule, strOut, "7", "mit Leerzeichen"}, 7},
         {"QoMain returns -5", false, {strModule, strOut, "-5", "mit Leerzeichen"}, -5},
         {"missing module", false, {ModuleDir() + "\\fehlt.dll"}, -1},
         {"module without QoMain", false, {ModuleDir() + "\\qo_test_nomain.dll", "x"}, -2},
@@ -97,12 +99,13 @@ TEST(ExecuterTest, TheCodeAndTheUserValueArePostedAndLibraryModePutsTheModuleFol
         {"program that does not exist", true, {BinDir() + "\\fehlt.exe"}, -2},
     };
     long lUser = -100;
+    _theLog.Open(strLog.c_str());
     for (const auto& c : cases) {
         SCOPED_TRACE(c.pszCase);
         const std::string strPathBefore = Path();
         Result r = RunJob(c.bProcess, c.args, ++lUser, AfxGetApp());
         EXPECT_TRUE(r.bEnded);
-        ASSERT_TRUE(r.bPosted);
+        EXPECT_TRUE(r.bPosted);
         EXPECT_EQ(c.nExpected, r.nCode);
         EXPECT_EQ(lUser, r.lUser);
         if (c.args.size() < 4) continue;
@@ -110,6 +113,13 @@ TEST(ExecuterTest, TheCodeAndTheUserValueArePostedAndLibraryModePutsTheModuleFol
         EXPECT_EQ((std::vector<std::string>{"4", strModule, strOut, c.args[2], "mit Leerzeichen", "(null)"}),
                   ReadLines(strOut));
     }
+    _theLog.Close();
+    // The exception is logged with the module and its message; the module is unloaded.
+    int nLogged = 0;
+    for (const std::string& line : ReadLines(strLog))
+        nLogged += line.find(strModule) != std::string::npos && line.find("Eingabedatei nicht lesbar") != std::string::npos;
+    EXPECT_EQ(1, nLogged);
+    EXPECT_EQ(NULL, ::GetModuleHandleA(strModule.c_str()));
 }
 
 TEST(ExecuterTest, ProcessModeQuotesEveryArgumentAndWaitsForTheProgram)
@@ -134,26 +144,6 @@ TEST(ExecuterTest, WithoutTargetThreadNothingRunsAndNothingIsPosted)
     EXPECT_TRUE(r.bEnded);
     EXPECT_FALSE(r.bPosted);
     EXPECT_EQ(INVALID_FILE_ATTRIBUTES, ::GetFileAttributesA(strOut.c_str())) << "the module ran";
-}
-
-TEST(ExecuterTest, ExceptionOutOfQoMainIsReportedAndLogged)
-{
-    const std::string strLog = TempFile("qo_exec_throw.log");
-    const std::string strModule = ModuleDir() + "\\qo_test_module.dll";
-    _theLog.Open(strLog.c_str());
-    Result r = RunJob(false, {strModule, TempFile("qo_exec_throw.txt"), "throw"}, 9, AfxGetApp());
-    _theLog.Close();
-    EXPECT_TRUE(r.bEnded);
-    ASSERT_TRUE(r.bPosted);
-    EXPECT_EQ(CExecuter::errEntryException, r.nCode);
-    EXPECT_EQ(9, r.lUser);
-    const std::vector<std::string> lines = ReadLines(strLog);
-    ASSERT_EQ(1u, lines.size());
-    EXPECT_NE(std::string::npos, lines[0].find(strModule)) << lines[0];
-    EXPECT_NE(std::string::npos, lines[0].find("Eingabedatei nicht lesbar")) << lines[0];
-    // The module is unloaded again and can be run once more.
-    EXPECT_EQ(NULL, ::GetModuleHandleA(strModule.c_str()));
-    EXPECT_EQ(3, RunJob(false, {strModule, TempFile("qo_exec_again.txt"), "3"}, 0, AfxGetApp()).nCode);
 }
 
 } // namespace

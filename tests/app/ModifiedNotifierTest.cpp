@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -10,25 +11,17 @@
 
 namespace {
 
-struct Call {
-    std::string name;
-    int flag;
-    int id;
-    bool operator==(const Call& o) const { return name == o.name && flag == o.flag && id == o.id; }
-};
+using Names = std::vector<std::string>;
 
-std::ostream& operator<<(std::ostream& os, const Call& c)
-{
-    return os << c.name << "(" << c.flag << "," << c.id << ")";
-}
-
+// Logs "name" (or "name(flag,id)" when asked to) for every call it gets.
 class Recorder : public CModifiedListener {
 public:
-    Recorder(std::vector<Call>& log, const char* name, int answer = 1)
+    Recorder(std::vector<std::string>& log, const char* name, int answer = 1)
         : m_log(log), m_name(name), m_answer(answer) {}
     int ModifiedListenerSetModified(int bModified, int nNotifierId) override
     {
-        m_log.push_back({m_name, bModified, nNotifierId});
+        m_log.push_back(m_bDetails ? m_name + "(" + std::to_string(bModified) + "," + std::to_string(nNotifierId) + ")"
+                                   : m_name);
         if (m_onCall) {
             auto action = m_onCall;
             m_onCall = nullptr;  // once
@@ -36,144 +29,96 @@ public:
         }
         return m_answer;
     }
-    std::vector<Call>& m_log;
+    std::vector<std::string>& m_log;
     std::string m_name;
     int m_answer;
+    bool m_bDetails = false;
     std::function<void()> m_onCall;
 };
 
-std::vector<std::string> Names(const std::vector<Call>& log)
+TEST(ModifiedNotifier, ListenersHearFlagOneAndTheNotifiersIdInTheOrderTheyCame)
 {
-    std::vector<std::string> names;
-    for (const Call& c : log) names.push_back(c.name);
-    return names;
-}
-
-using Names_t = std::vector<std::string>;
-
-TEST(ModifiedNotifier, EveryListenerHearsFlagOneAndItsNotifiersId)
-{
-    std::vector<Call> log;
-    Recorder a(log, "a"), b(log, "b");
+    Names log;
+    Recorder a(log, "a"), b(log, "b"), c(log, "c"), stranger(log, "x");
+    a.m_bDetails = b.m_bDetails = true;
     CModifiedNotifier page(7), list(42);
     page.AddModifiedListener(&a);
     page.AddModifiedListener(&b);
     list.AddModifiedListener(&a);
-
     EXPECT_EQ(1, page.NotifyListeners());
     EXPECT_EQ(1, list.NotifyListeners());
-    EXPECT_EQ((std::vector<Call>{{"a", 1, 7}, {"b", 1, 7}, {"a", 1, 42}}), log);
+    EXPECT_EQ((Names{"a(1,7)", "b(1,7)", "a(1,42)"}), log);
+    EXPECT_EQ(1, CModifiedNotifier(3).NotifyListeners()) << "nobody to ask";
 
-    CModifiedNotifier nobody(3);
-    EXPECT_EQ(1, nobody.NotifyListeners());
-}
-
-TEST(ModifiedNotifier, RegistrationKeepsOrderAndIgnoresNullRepeatsAndStrangers)
-{
-    std::vector<Call> log;
-    Recorder a(log, "a"), b(log, "b"), c(log, "c"), stranger(log, "x");
+    // Null, repeats and strangers are ignored; a listener added again comes last.
+    a.m_bDetails = b.m_bDetails = false;
     CModifiedNotifier n(1);
-    n.AddModifiedListener(&a);
-    n.AddModifiedListener(NULL);
-    n.AddModifiedListener(&b);
-    n.AddModifiedListener(&a);
-    n.AddModifiedListener(&c);
+    for (Recorder* r : {&a, (Recorder*)nullptr, &b, &a, &c}) n.AddModifiedListener(r);
     n.RemoveModifiedListener(&stranger);
     n.RemoveModifiedListener(NULL);
-    n.NotifyListeners();
-    EXPECT_EQ((Names_t{"a", "b", "c"}), Names(log));
-
-    log.clear();
-    n.RemoveModifiedListener(&b);
-    n.RemoveModifiedListener(&b);
-    n.NotifyListeners();
-    EXPECT_EQ((Names_t{"a", "c"}), Names(log));
-
-    log.clear();
-    n.AddModifiedListener(&b);  // back at the end
-    n.NotifyListeners();
-    EXPECT_EQ((Names_t{"a", "c", "b"}), Names(log));
+    const struct {
+        std::function<void()> change;
+        Names told;
+    } steps[] = {
+        {[] {}, {"a", "b", "c"}},
+        {[&] { n.RemoveModifiedListener(&b), n.RemoveModifiedListener(&b); }, {"a", "c"}},
+        {[&] { n.AddModifiedListener(&b); }, {"a", "c", "b"}},
+    };
+    for (const auto& s : steps) {
+        log.clear();
+        s.change();
+        n.NotifyListeners();
+        EXPECT_EQ(s.told, log);
+    }
 }
 
 TEST(ModifiedNotifier, ARefusalStopsThePassAndTheNextPassStartsAgain)
 {
-    std::vector<Call> log;
+    Names log;
     Recorder a(log, "a"), b(log, "b", 0), c(log, "c");
     CModifiedNotifier n(5);
-    n.AddModifiedListener(&a);
-    n.AddModifiedListener(&b);
-    n.AddModifiedListener(&c);
-
-    EXPECT_EQ(0, n.NotifyListeners());
-    EXPECT_EQ((Names_t{"a", "b"}), Names(log));
-
-    log.clear();
-    EXPECT_EQ(0, n.NotifyListeners());
-    EXPECT_EQ((Names_t{"a", "b"}), Names(log));
-
-    log.clear();
-    b.m_answer = 1;
-    EXPECT_EQ(1, n.NotifyListeners());
-    EXPECT_EQ((Names_t{"a", "b", "c"}), Names(log));
-
-    log.clear();
-    Recorder firstRefuses(log, "f", 0);
-    CModifiedNotifier m(6);
-    m.AddModifiedListener(&firstRefuses);
-    m.AddModifiedListener(&a);
-    EXPECT_EQ(0, m.NotifyListeners());
-    EXPECT_EQ((Names_t{"f"}), Names(log));
+    for (Recorder* r : {&a, &b, &c}) n.AddModifiedListener(r);
+    for (int answer : {0, 0, 1}) {
+        log.clear();
+        b.m_answer = answer;
+        EXPECT_EQ(answer, n.NotifyListeners());
+        EXPECT_EQ(answer ? (Names{"a", "b", "c"}) : (Names{"a", "b"}), log);
+    }
 }
 
-// The list changing under a pass: (what the listener named "during" does while
-// it is told, which listeners the pass reaches, who the next pass reaches).
+// The list changing under a pass: what b does while it is told, which
+// listeners that pass reaches, and which the next pass reaches. "+x" adds x,
+// "-x" removes it.
 TEST(ModifiedNotifier, ListenersChangingTheListWhileTold)
 {
-    struct Case {
-        const char* what;
-        std::function<void(CModifiedNotifier&, Recorder& a, Recorder& b, Recorder& c, Recorder& d)> act;
-        Names_t thisPass;
-        Names_t nextPass;
+    const struct {
+        Names act;
+        Names thisPass, nextPass;
+    } cases[] = {
+        {{"+d"}, {"a", "b", "c", "d"}, {"a", "b", "c", "d"}},
+        {{"+a"}, {"a", "b", "c"}, {"a", "b", "c"}},
+        {{"-b"}, {"a", "b", "c"}, {"a", "c"}},
+        {{"-a"}, {"a", "b", "c"}, {"b", "c"}},
+        {{"-a", "-b"}, {"a", "b", "c"}, {"c"}},
+        {{"-c"}, {"a", "b"}, {"a", "b"}},
+        {{"-b", "+b"}, {"a", "b", "c"}, {"a", "c", "b"}},
     };
-    const std::vector<Case> cases = {
-        {"b registers d", [](CModifiedNotifier& n, Recorder&, Recorder&, Recorder&, Recorder& d) {
-             n.AddModifiedListener(&d); },
-         {"a", "b", "c", "d"}, {"a", "b", "c", "d"}},
-        {"b registers a again", [](CModifiedNotifier& n, Recorder& a, Recorder&, Recorder&, Recorder&) {
-             n.AddModifiedListener(&a); },
-         {"a", "b", "c"}, {"a", "b", "c"}},
-        {"b removes itself", [](CModifiedNotifier& n, Recorder&, Recorder& b, Recorder&, Recorder&) {
-             n.RemoveModifiedListener(&b); },
-         {"a", "b", "c"}, {"a", "c"}},
-        {"b removes a", [](CModifiedNotifier& n, Recorder& a, Recorder&, Recorder&, Recorder&) {
-             n.RemoveModifiedListener(&a); },
-         {"a", "b", "c"}, {"b", "c"}},
-        {"b removes a and itself", [](CModifiedNotifier& n, Recorder& a, Recorder& b, Recorder&, Recorder&) {
-             n.RemoveModifiedListener(&a);
-             n.RemoveModifiedListener(&b); },
-         {"a", "b", "c"}, {"c"}},
-        {"b removes c", [](CModifiedNotifier& n, Recorder&, Recorder&, Recorder& c, Recorder&) {
-             n.RemoveModifiedListener(&c); },
-         {"a", "b"}, {"a", "b"}},
-        {"b removes and re-adds itself", [](CModifiedNotifier& n, Recorder&, Recorder& b, Recorder&, Recorder&) {
-             n.RemoveModifiedListener(&b);
-             n.AddModifiedListener(&b); },
-         {"a", "b", "c"}, {"a", "c", "b"}},
-    };
-    for (const Case& k : cases) {
-        SCOPED_TRACE(k.what);
-        std::vector<Call> log;
+    for (const auto& k : cases) {
+        SCOPED_TRACE(::testing::PrintToString(k.act));
+        Names log;
         Recorder a(log, "a"), b(log, "b"), c(log, "c"), d(log, "d");
+        std::map<char, Recorder*> by = {{'a', &a}, {'b', &b}, {'c', &c}, {'d', &d}};
         CModifiedNotifier n(9);
-        n.AddModifiedListener(&a);
-        n.AddModifiedListener(&b);
-        n.AddModifiedListener(&c);
-        b.m_onCall = [&] { k.act(n, a, b, c, d); };
+        for (Recorder* r : {&a, &b, &c}) n.AddModifiedListener(r);
+        b.m_onCall = [&] {
+            for (const std::string& op : k.act)
+                op[0] == '+' ? n.AddModifiedListener(by[op[1]]) : n.RemoveModifiedListener(by[op[1]]);
+        };
         EXPECT_EQ(1, n.NotifyListeners());
-        EXPECT_EQ(k.thisPass, Names(log));
+        EXPECT_EQ(k.thisPass, log);
         log.clear();
         EXPECT_EQ(1, n.NotifyListeners());
-        EXPECT_EQ(k.nextPass, Names(log));
+        EXPECT_EQ(k.nextPass, log);
     }
 }
 
