@@ -198,6 +198,19 @@ void CConversion::WriteConfig(CQoConfigFile& config) const
     m_columns.WriteConfig(config);
 }
 
+namespace {
+// Where a kind of input or output is: a connect string, a database file or
+// a file; the other two are empty.
+void Place(int kind, int odbc, int database, const CQoString& location, CQoString& file, CQoString& databaseFile,
+           CQoString& connect)
+{
+    file.Empty();
+    databaseFile.Empty();
+    connect.Empty();
+    (kind == odbc ? connect : kind == database ? databaseFile : file) = location;
+}
+}
+
 int CConversion::InputKind() const
 {
     if (!m_inputConnect.IsEmpty())
@@ -212,6 +225,16 @@ int CConversion::OutputKind() const
     return m_outputDatabase.IsEmpty() ? m_outputFormat : int(outputDatabase);
 }
 
+const CQoString& CConversion::InputLocation() const
+{
+    return !m_inputConnect.IsEmpty() ? m_inputConnect : !m_inputDatabase.IsEmpty() ? m_inputDatabase : m_inputFile;
+}
+
+const CQoString& CConversion::OutputLocation() const
+{
+    return !m_outputConnect.IsEmpty() ? m_outputConnect : !m_outputDatabase.IsEmpty() ? m_outputDatabase : m_outputFile;
+}
+
 void CConversion::SetInput(int kind, const CQoString& location)
 {
     if (kind != InputKind()) {
@@ -219,17 +242,9 @@ void CConversion::SetInput(int kind, const CQoString& location)
         m_inputTable.Empty();
         m_inputSql.Empty();
     }
-    m_inputFile.Empty();
-    m_inputDatabase.Empty();
-    m_inputConnect.Empty();
-    if (kind == inputOdbc) {
-        m_inputConnect = location;
-    } else if (kind == inputDatabase) {
-        m_inputDatabase = location;
-    } else {
-        m_inputFile = location;
-        m_inputFormat = kind >= inputDelimited && kind <= inputDbase ? kind : int(inputDelimited);
-    }
+    Place(kind, inputOdbc, inputDatabase, location, m_inputFile, m_inputDatabase, m_inputConnect);
+    if (kind < inputDatabase)
+        m_inputFormat = kind >= 0 ? kind : int(inputDelimited);
     m_bFilters = true;
 }
 
@@ -237,17 +252,9 @@ void CConversion::SetOutput(int kind, const CQoString& location)
 {
     if (kind != OutputKind())
         m_filterSettings.DeleteSection(kOutputFilter);
-    m_outputFile.Empty();
-    m_outputDatabase.Empty();
-    m_outputConnect.Empty();
-    if (kind == outputOdbc) {
-        m_outputConnect = location;
-    } else if (kind == outputDatabase) {
-        m_outputDatabase = location;
-    } else {
-        m_outputFile = location;
-        m_outputFormat = kind >= formatDelimited && kind <= formatDbase ? kind : int(formatDelimited);
-    }
+    Place(kind, outputOdbc, outputDatabase, location, m_outputFile, m_outputDatabase, m_outputConnect);
+    if (kind < outputDatabase)
+        m_outputFormat = kind >= 0 ? kind : int(formatDelimited);
     m_bFilters = true;
 }
 

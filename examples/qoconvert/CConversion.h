@@ -92,6 +92,8 @@ public:
     // forgets the settings of the previous kind's filter.
     int InputKind() const;
     int OutputKind() const;
+    const CQoString& InputLocation() const;
+    const CQoString& OutputLocation() const;
     void SetInput(int kind, const CQoString& location);
     void SetOutput(int kind, const CQoString& location);
 

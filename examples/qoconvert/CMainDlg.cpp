@@ -24,8 +24,8 @@ BEGIN_MESSAGE_MAP(CMainDlg, CDialog)
     ON_BN_CLICKED(IDC_PROJECT_BROWSE, OnBrowseProject)
     ON_BN_CLICKED(IDC_INPUT_BROWSE, OnBrowseInput)
     ON_BN_CLICKED(IDC_OUTPUT_BROWSE, OnBrowseOutput)
-    ON_EN_KILLFOCUS(IDC_INPUT_FILE, OnInputFileChanged)
-    ON_EN_KILLFOCUS(IDC_INPUT_TABLE, OnInputTableChanged)
+    ON_EN_KILLFOCUS(IDC_INPUT_FILE, OnInputPlaceChanged)
+    ON_EN_KILLFOCUS(IDC_INPUT_TABLE, OnInputPlaceChanged)
     ON_EN_KILLFOCUS(IDC_OUTPUT_FILE, OnOutputFileChanged)
     ON_CBN_SELCHANGE(IDC_INPUT_KIND, OnInputKindChanged)
     ON_CBN_SELCHANGE(IDC_OUTPUT_FORMAT, OnFormatChanged)
@@ -105,18 +105,10 @@ void CMainDlg::ShowJob()
 {
     m_project = (const char*)theApp.m_projectFolder;
     m_inputKind = m_job.InputKind();
-    switch (m_inputKind) {
-    case CConversion::inputOdbc:     m_inputFile = (const char*)m_job.m_inputConnect; break;
-    case CConversion::inputDatabase: m_inputFile = (const char*)m_job.m_inputDatabase; break;
-    default:                         m_inputFile = (const char*)m_job.m_inputFile; break;
-    }
+    m_inputFile = (const char*)m_job.InputLocation();
     m_inputTable = (const char*)(m_job.m_inputSql.IsEmpty() ? m_job.m_inputTable : m_job.m_inputSql);
     m_outputKind = m_job.OutputKind();
-    switch (m_outputKind) {
-    case CConversion::outputOdbc:     m_outputFile = (const char*)m_job.m_outputConnect; break;
-    case CConversion::outputDatabase: m_outputFile = (const char*)m_job.m_outputDatabase; break;
-    default:                          m_outputFile = (const char*)m_job.m_outputFile; break;
-    }
+    m_outputFile = (const char*)m_job.OutputLocation();
     UpdateData(FALSE);
     ShowKinds();
 }
@@ -424,29 +416,24 @@ void CMainDlg::OnBrowseOutput()
     TakeOutputChoice();
 }
 
-void CMainDlg::OnInputFileChanged()
+void CMainDlg::ApplyInputPage()
 {
-    CString before = m_inputFile;
-    UpdateData(TRUE);
-    if (m_inputFile == before)
-        return;
-    // The settings made on the page so far stay for the new file.
     if (m_inputPage && ::IsWindow(m_inputPage->m_hWnd)) {
         m_bRebuilding = true;
         m_inputPage->DefaultAction();
         m_bRebuilding = false;
-        m_job.TakeInputSettings(*m_input);
     }
-    TakeInputChoice();
-    MakeInputPage();
+    m_job.TakeInputSettings(*m_input);
 }
 
-void CMainDlg::OnInputTableChanged()
+void CMainDlg::OnInputPlaceChanged()
 {
-    CString before = m_inputTable;
+    CString file = m_inputFile, table = m_inputTable;
     UpdateData(TRUE);
-    if (m_inputTable == before)
+    if (m_inputFile == file && m_inputTable == table)
         return;
+    // The settings made on the page so far stay for the new file.
+    ApplyInputPage();
     TakeInputChoice();
     MakeInputPage();
 }
@@ -492,12 +479,7 @@ void CMainDlg::OnConvert()
     // What the pages show is what is converted.
     TakeInputChoice();
     TakeOutputChoice();
-    if (m_inputPage) {
-        m_bRebuilding = true;
-        m_inputPage->DefaultAction();
-        m_bRebuilding = false;
-    }
-    m_job.TakeInputSettings(*m_input);
+    ApplyInputPage();
     m_outputPage->UpdateOutputFilter(1);
     m_job.TakeOutputSettings(*m_output);
     if (m_job.OutputIsDatabase() && m_job.m_outputTable.IsEmpty()) {

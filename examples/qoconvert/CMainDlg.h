@@ -51,9 +51,8 @@ protected:
     afx_msg void OnBrowseInput();
     afx_msg void OnBrowseOutput();
     afx_msg void OnBrowseProject();
-    afx_msg void OnInputFileChanged();
+    afx_msg void OnInputPlaceChanged();
     afx_msg void OnInputKindChanged();
-    afx_msg void OnInputTableChanged();
     afx_msg void OnOutputFileChanged();
     afx_msg void OnFormatChanged();
     afx_msg void OnColumns();
@@ -75,6 +74,8 @@ private:
     // The output side reads its own filter of the same kind and settings.
     void FollowInput();
     void MakeOutputPage();
+    // Takes what the input page shows into the job, as its own apply would.
+    void ApplyInputPage();
     // The window's fields into the job.
     void TakeInputChoice();
     void TakeOutputChoice();
