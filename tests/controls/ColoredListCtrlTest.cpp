@@ -8,9 +8,6 @@
 #include <string>
 
 #include "CColoredListCtrl.h"
-#include "Capture.h"
-#include "DialogDriver.h"
-#include "Input.h"
 #include "MfcTestHost.h"
 
 namespace {
@@ -78,20 +75,8 @@ protected:
         qotest::DestroyHostFrame(m_pFrame);
     }
 
-    void Repaint()
-    {
-        m_list.Invalidate();
-        m_list.UpdateWindow();
-        qotest::PumpFor(100);
-    }
-
-    qotest::Image Capture()
-    {
-        Repaint();
-        qotest::Image img;
-        EXPECT_TRUE(qotest::CaptureImage(m_list.m_hWnd, img, true));
-        return img;
-    }
+    void Repaint() { qotest::Screen(m_list.m_hWnd); }
+    qotest::Image Capture() { return qotest::Screen(m_list.m_hWnd); }
 
     CRect Cell(int row, int col)
     {
@@ -104,10 +89,7 @@ protected:
 
     static bool Contains(const qotest::Image& img, const CRect& rc, COLORREF colour)
     {
-        for (int y = rc.top; y < rc.bottom; ++y)
-            for (int x = rc.left; x < rc.right; ++x)
-                if (img.Pixel(x, y) == colour) return true;
-        return false;
+        return qotest::CountPixels(img, rc, colour) > 0;
     }
 
     static int Ink(const qotest::Image& img, const CRect& rc, COLORREF background)
