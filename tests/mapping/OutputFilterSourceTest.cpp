@@ -24,46 +24,24 @@ std::string Out(COutputFilterSource& source, long row, int col)
 
 } // namespace
 
-// --- selection and order ------------------------------------------------------
-
-TEST(OutputFilterSourceView, FreshSourceShowsAllInnerColumnsInInnerOrder)
+TEST(OutputFilterSourceView, SelectionAndOrderOverTheInnerColumns)
 {
     TableSource s = Addresses();
-    EXPECT_EQ(3, s.GetNumColumns());
     EXPECT_EQ(2L, s.GetNumRows());
-    EXPECT_EQ("Name,Ort,Plz", s.OutputNames());
-    EXPECT_EQ("35390", Out(s, 1, 2));
-    EXPECT_EQ(1L, s.lastRow);   // row numbers reach the host unchanged
-}
-
-TEST(OutputFilterSourceView, UnselectedColumnsDropOutOfTheOutputIndexes)
-{
-    TableSource s = Addresses();
     s.SetSelected("Ort", false);   // before the first read: kept
-    EXPECT_EQ(2, s.GetNumColumns());
+    s.SetSelected("ort", false);   // names compare exactly
     EXPECT_EQ("Name,Plz", s.OutputNames());
-    EXPECT_EQ("50667", Out(s, 0, 1));
+    EXPECT_EQ("35390", Out(s, 1, 1));
+    EXPECT_EQ(1L, s.lastRow);   // row numbers reach the host unchanged
     EXPECT_EQ("Name,-Ort,Plz", s.Entries());
 
     s.SelectAll(false);
     EXPECT_EQ(0, s.GetNumColumns());
-    EXPECT_EQ("", Out(s, 0, 0));
     s.SelectAll(true);
-    EXPECT_EQ(3, s.NumColumns());
-    s.SetSelected("ort", false);   // names compare exactly
-    EXPECT_EQ(3, s.NumColumns());
-}
-
-TEST(OutputFilterSourceView, ToFrontMovesOneEntryAndKeepsTheOthersOrder)
-{
-    TableSource s = Addresses();
     s.ToFront("Plz");
-    EXPECT_EQ("Plz,Name,Ort", s.Entries());
-    EXPECT_EQ("Plz,Name,Ort", s.OutputNames());
-    EXPECT_EQ("35390", Out(s, 1, 0));
-    EXPECT_EQ("Gießen", Out(s, 1, 2));
-
     s.ToFront("Strasse");   // unknown: nothing moves
+    EXPECT_EQ("Plz,Name,Ort", s.OutputNames());
+    EXPECT_EQ("Gießen", Out(s, 1, 2));
     s.ToFront("Ort");
     EXPECT_EQ("Ort,Plz,Name", s.Entries());
 }
@@ -71,55 +49,35 @@ TEST(OutputFilterSourceView, ToFrontMovesOneEntryAndKeepsTheOthersOrder)
 TEST(OutputFilterSourceView, EditsActOnTheFirstOfTwoEqualNames)
 {
     TableSource s({"A", "B", "A"}, {{"1", "2", "3"}});
-    EXPECT_EQ(0, s.SearchEntry("A"));
     EXPECT_EQ(-1, s.SearchEntry("C"));
     s.SetSelected("A", false);
     EXPECT_EQ("-A,B,A", s.Entries());
     EXPECT_EQ("2", Out(s, 0, 0));
-    EXPECT_EQ("3", Out(s, 0, 1));
-
     s.SelectAll(true);
     s.ToFront("B");
     s.ToFront("A");   // the first A is the inner column 0
-    EXPECT_EQ("1", Out(s, 0, 0));
-    EXPECT_EQ("2", Out(s, 0, 1));
-    EXPECT_EQ("3", Out(s, 0, 2));
+    EXPECT_EQ("1|2|3", Out(s, 0, 0) + "|" + Out(s, 0, 1) + "|" + Out(s, 0, 2));
 }
 
-TEST(OutputFilterSourceView, ListIsBuiltOnceUntilInitArray)
+TEST(OutputFilterSourceView, ListIsBuiltOnceUntilInitArrayAndKeepsItsNames)
 {
     TableSource s = Addresses();
     s.SetSelected("Plz", false);
     s.ToFront("Ort");
     s.AddColumn("Land", "D");
-    EXPECT_EQ(2, s.GetNumColumns());   // the new host column is not noticed
-    EXPECT_EQ("Ort,Name,-Plz", s.Entries());
-
-    s.InitArray();   // selection and order are gone, the new column is there
-    EXPECT_EQ("Name,Ort,Plz,Land", s.Entries());
-    EXPECT_EQ("D", Out(s, 1, 3));
-}
-
-TEST(OutputFilterSourceView, NamesComeFromTheHostEachTimeButEntriesKeepTheirs)
-{
-    TableSource s = Addresses();
-    EXPECT_EQ(3, s.NumColumns());
     s.Rename(1, "Wohnort");
-    EXPECT_EQ("Name,Wohnort,Plz", s.OutputNames());
-    EXPECT_EQ("Name,Ort,Plz", s.Entries());
-    // Selection goes by the entry's stored name.
-    s.SetSelected("Wohnort", false);
-    EXPECT_EQ(3, s.NumColumns());
-    s.SetSelected("Ort", false);
+    EXPECT_EQ("Wohnort,Name", s.OutputNames()) << "names come from the host each time";
+    EXPECT_EQ("Ort,Name,-Plz", s.Entries()) << "the new host column is not noticed";
+    s.SetSelected("Wohnort", false);   // selection goes by the entry's stored name
     EXPECT_EQ(2, s.NumColumns());
-
     CString name;
     s.GetName(0, name, 7);
-    EXPECT_STREQ("Name", name);
     EXPECT_EQ(7, s.lastFlag);   // passed through to the host
-}
 
-// --- columns that do not exist ----------------------------------------------------
+    s.InitArray();   // selection and order are gone, the new column is there
+    EXPECT_EQ("Name,Wohnort,Plz,Land", s.Entries());
+    EXPECT_EQ("D", Out(s, 1, 3));
+}
 
 TEST(OutputFilterSourceView, MissingOutputColumnsYieldNoText)
 {
@@ -127,9 +85,7 @@ TEST(OutputFilterSourceView, MissingOutputColumnsYieldNoText)
     s.SetSelected("Plz", false);
     CString value("vorher");
     s.GetValue(0, 2, value);
-    EXPECT_STREQ("vorher", value);
     s.GetValue(0, -1, value);
-    EXPECT_STREQ("vorher", value);
     s.GetName(5, value, 0);
     EXPECT_STREQ("vorher", value);
     EXPECT_EQ(0, s.valueCalls);
@@ -139,10 +95,7 @@ TEST(OutputFilterSourceView, MissingOutputColumnsYieldNoText)
     CQoString name("vorher");
     s.GetColumnName(2, name);
     EXPECT_STREQ("", name);
-    EXPECT_EQ(-1, s.GetDataLength(0));
 }
-
-// --- conversions ---------------------------------------------------------------------
 
 TEST(OutputFilterSourceConversion, UmlautsAreReplacedBeforeUpperCasing)
 {
@@ -150,56 +103,38 @@ TEST(OutputFilterSourceConversion, UmlautsAreReplacedBeforeUpperCasing)
     EXPECT_EQ("Müller-Weiß, Öde Äcker", Out(s, 0, 0));
     s.SetNoUmlaute(true);
     EXPECT_EQ("Mueller-Weiss, Oede Aecker", Out(s, 0, 0));
-
     s.SetUseCapitals(true);
     EXPECT_EQ("MUELLER-WEISS, OEDE AECKER", Out(s, 0, 0));
     // Capitals alone upper-case the letters of the code page; ß has no
     // capital there and stays.
     s.SetNoUmlaute(false);
     EXPECT_EQ("MÜLLER-WEIß, ÖDE ÄCKER", Out(s, 0, 0));
-    // Names are never converted.
-    s.SetNoUmlaute(true);
-    CQoString name;
+    CQoString name;   // names are never converted
     s.GetColumnName(0, name);
     EXPECT_STREQ("Name", name);
 }
 
-// --- direct access to the entry list ----------------------------------------------
-
-TEST(OutputFilterSourceEntries, ReadingBuildsAndEntriesAreCopies)
+TEST(OutputFilterSourceEntries, EntriesAreCopiesAndAListWrittenByTheUserIsKept)
 {
     TableSource s = Addresses();
-    EXPECT_EQ(3, s.GetEntryCount());
     COutputFilterSource::CEntry e(99, "x", false);
     EXPECT_FALSE(s.GetEntry(3, e));
-    EXPECT_EQ(99, e.GetColumn());
-    ASSERT_TRUE(s.GetEntry(2, e));
+    ASSERT_TRUE(s.GetEntry(2, e));   // reading builds the list
     EXPECT_EQ(2, e.GetColumn());
     EXPECT_STREQ("Plz", e.GetName());
-    EXPECT_TRUE(e.GetSelected());
-
     e.SetSelected(false);   // a copy: the source is unchanged
     EXPECT_EQ(3, s.NumColumns());
     ASSERT_TRUE(s.SetEntry(2, e));
     EXPECT_EQ(2, s.NumColumns());
     EXPECT_FALSE(s.SetEntry(3, e));
-}
 
-TEST(OutputFilterSourceEntries, AListWrittenByTheUserIsKept)
-{
-    TableSource s = Addresses();
-    // As the page does it: empty the list, then append its items.
-    s.RemoveAllEntries();
-    s.AddEntry(COutputFilterSource::CEntry(2, "Plz", true));
-    s.AddEntry(COutputFilterSource::CEntry(0, "Name", false));
-    EXPECT_EQ("Plz,-Name", s.Entries());
-    EXPECT_EQ(1, s.GetNumColumns());
-    EXPECT_EQ("35390", Out(s, 1, 0));
-
-    // Written before anything was read: not replaced by a later build.
+    // As the page does it: empty the list, then append its items; written
+    // before anything was read, it is not replaced by a later build.
     TableSource t = Addresses();
     t.RemoveAllEntries();
     EXPECT_EQ(0, t.GetNumColumns());
-    t.AddEntry(COutputFilterSource::CEntry(1, "Ort", true));
-    EXPECT_EQ("Ort", t.OutputNames());
+    t.AddEntry(COutputFilterSource::CEntry(2, "Plz", true));
+    t.AddEntry(COutputFilterSource::CEntry(0, "Name", false));
+    EXPECT_EQ("Plz,-Name", t.Entries());
+    EXPECT_EQ("35390", Out(t, 1, 0));
 }
