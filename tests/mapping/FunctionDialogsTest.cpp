@@ -154,6 +154,7 @@ TEST(CombiColumnConfig, ComposesCombinationFromChosenFunctionsAndSeparators)
 {
     const CFunctionManager original = Sample();
     CCombiColumnConfig dlg(original, false);
+    bool cancelled = false;
     std::vector<DialogScript> scripts =
         Composing({{"PLZ", nullptr, false}, {"Ort", " ", true}, {"Filiale", " & ", false}}, [&](Dialog& d) {
             // Neither combinations nor "no function" (0) can be parts.
@@ -162,9 +163,19 @@ TEST(CombiColumnConfig, ComposesCombinationFromChosenFunctionsAndSeparators)
             EXPECT_EQ((Texts{"/PLZ/false", " /Ort/true", " & /Filiale/false"}), Rows(d));
             EXPECT_EQ("PLZ Ort & Filiale", d.Text(IDC_COMBI_NAME));
             EXPECT_NE(0, ::GetWindowLongA(d.Item(IDC_COMBI_NAME), GWL_STYLE) & SS_NOPREFIX);  // "&" shown as is
+            // Cancelling the separator question adds nothing.
+            d.SelectText(IDC_COMBI_FUNCTIONS, "Kunde");
+            d.Press(IDC_COMBI_ADD);
+            EXPECT_TRUE(qotest::WaitFor([&] { return cancelled; }, 3000));
+            qotest::PumpFor(100);
+            EXPECT_EQ(3u, Rows(d).size());
             qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("combination-4040.png").c_str());
             d.Press(IDOK);
         });
+    scripts.push_back([&cancelled](Dialog& p) {
+        p.Press(IDCANCEL);
+        cancelled = true;
+    });
     Answering(scripts, [&] { EXPECT_EQ(IDOK, dlg.DoModal()); }, 8000);
 
     std::string expected = Dump(Sample());

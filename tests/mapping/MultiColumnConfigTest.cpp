@@ -114,11 +114,16 @@ protected:
     // The page over a delimited file with names in its first row. Read mode splits
     // the file's columns; write mode composes from it as the application's source
     // (one column per plain function, in id order), given before the window exists.
-    void Open(bool read, const std::string& contents, std::vector<long> functions = {})
+    void Open(bool read, std::vector<long> functions = {})
     {
         m_file.Delimiter(';');
         m_file.SetFirstRowHasNames(true);
-        m_file.Init(qotest::WriteTempFile("qo_multi.csv", contents).c_str());
+        m_file.Init(qotest::WriteTempFile("qo_multi.csv",
+                                          read ? "Kunde;Anschrift;Telefon\r\nMeier, Hans;50667 K\xf6ln;0221 12345\r\n"
+                                                 "Wei\xdf, Eva;89073 Ulm;0731 5555\r\n"
+                                               : "Name;Vorname;PLZ;Ort;Telefon\r\nMeier;Hans;50667;K\xf6ln;0221 12345\r\n"
+                                                 "Wei\xdf;;89073;Ulm;0731 5555\r\n")
+                        .c_str());
         m_page = new CTestPage(m_manager, m_sorter, read);
         m_page->SetOuterColumnFunctions(functions);
         if (!read) m_page->SetOutputSource(&m_source);
@@ -127,18 +132,10 @@ protected:
         qotest::ShowChild(*m_page, 5, 5);
         if (read) m_page->SetInputFilter(&m_file);
     }
-    void OpenReader(std::vector<long> functions)
-    {
-        Open(true, "Kunde;Anschrift;Telefon\r\nMeier, Hans;50667 K\xf6ln;0221 12345\r\nWei\xdf, Eva;89073 Ulm;0731 5555\r\n",
-             functions);
-    }
-    void OpenWriter()
-    {
-        Open(false, "Name;Vorname;PLZ;Ort;Telefon\r\nMeier;Hans;50667;K\xf6ln;0221 12345\r\nWei\xdf;;89073;Ulm;0731 5555\r\n");
-    }
     // Output columns made in code, as an application restoring its project does.
     void Columns(std::vector<std::pair<const char*, long>> columns)
     {
+        while (m_page->GetNumOuterColumns() > 0) m_page->RemoveOuterColumn(0);
         for (const auto& c : columns) {
             m_page->AddOuterColumn(c.first);
             m_page->SetOuterColumnFunction(m_page->GetNumOuterColumns() - 1, c.second);
@@ -167,51 +164,49 @@ protected:
         };
     }
 
-    // n texts joined by '|'.
-    template <class Text>
-    static std::string Join(int n, Text text)
+    // Texts joined by '|': a row of the composed output or its names (row -1), a
+    // row of the split file, the captions in the preview's first row, the functions.
+    static void Append(std::string& line, int i, const char* text) { line += (i ? "|" : "") + std::string(text); }
+    std::string Output(long row)
     {
+        CQoOutputSource* out = m_page->GetOutputSource();
         std::string line;
-        for (int i = 0; i < n; ++i) {
-            CQoString value;
-            text(i, value);
-            line += (i ? "|" : "") + std::string(value.GetString());
+        for (int c = 0; c < out->GetNumColumns(); ++c) {
+            CQoString v;
+            row < 0 ? out->GetColumnName(c, v) : out->GetValue(row, c, v);
+            Append(line, c, v.GetString());
         }
         return line;
-    }
-    // A row of the composed output (write mode) or of the split file (read mode).
-    std::string OutputRow(long row)
-    {
-        CQoOutputSource* out = m_page->GetOutputSource();
-        return Join(out->GetNumColumns(), [&](int c, CQoString& v) { out->GetValue(row, c, v); });
-    }
-    std::string OutputNames()
-    {
-        CQoOutputSource* out = m_page->GetOutputSource();
-        return Join(out->GetNumColumns(), [&](int c, CQoString& v) { out->GetColumnName(c, v); });
     }
     std::string InnerRow(long row)
     {
         CQoInputFilter* in = m_page->GetInnerInputFilter();
         EXPECT_TRUE(in->AbsoluteRow(row));
-        return Join(in->NumCols(), [&](int c, CQoString& v) { in->Value(c, v); });
+        std::string line;
+        for (int c = 0; c < in->NumCols(); ++c) {
+            CQoString v;
+            in->Value(c, v);
+            Append(line, c, v.GetString());
+        }
+        return line;
     }
-    // The captions in the preview's first row.
     std::string Captions()
     {
-        return Join(m_page->Preview().GetHeaderCtrl()->GetItemCount(), [&](int c, CQoString& v) {
+        std::string line;
+        for (int c = 0; c < m_page->Preview().GetHeaderCtrl()->GetItemCount(); ++c) {
             CString text;
             DWORD clr = 0, clrSel = 0;
             bool bold = false;
             m_page->Preview().GetColoredItem(0, c, text, clr, clrSel, bold);
-            v = text.GetString();
-        });
+            Append(line, c, text);
+        }
+        return line;
     }
     std::string Functions()
     {
         std::string line;
         for (int i = 0; i < m_page->GetNumOuterColumns(); ++i)
-            line += (i ? "|" : "") + std::to_string(m_page->GetOuterFunction(i));
+            Append(line, i, std::to_string(m_page->GetOuterFunction(i)).c_str());
         return line;
     }
     std::string FunctionName(long id)
@@ -244,7 +239,7 @@ TEST_F(MultiColumnConfigTest, ReadModeSplitsEachColumnIntoThePartsOfItsFunction)
 {
     // Kunde holds a combination of two, Anschrift one of two, Telefon nothing
     // (the manager has no function 0).
-    OpenReader({kNameFirst, kZipTown});
+    Open(true, {kNameFirst, kZipTown});
     EXPECT_EQ((std::vector<std::string>{"Kunde", "Anschrift", "Telefon"}), Items(m_page->Names()));
     EXPECT_EQ((std::vector<std::string>{"Name", "Name, Vorname", "Ort", "PLZ", "PLZ Ort", "Telefon", "Vorname"}),
               Items(m_page->Functions()));
@@ -306,21 +301,21 @@ TEST_F(MultiColumnConfigTest, ReadModeSplitsEachColumnIntoThePartsOfItsFunction)
 
 TEST_F(MultiColumnConfigTest, WriteModeComposesTheOutputColumnsAsTheUserNamesThem)
 {
-    OpenWriter();
+    Open(false);
     EXPECT_EQ(0, m_page->GetOutputSource()->GetNumColumns());
     for (const char* name : {"Kunde", "Anschrift"}) {
         std::string proposed;
         qotest::Answering({Rename(name, &proposed)}, [&] { Click(IDC_MULTI_NEW); });
         EXPECT_EQ("Neue_Spalte", proposed);
     }
-    EXPECT_EQ("Kunde|Anschrift", OutputNames());
+    EXPECT_EQ("Kunde|Anschrift", Output(-1));
     EXPECT_EQ(-1, m_page->Functions().GetCurSel());
     Choose(m_page->Names(), "Kunde");
     Choose(m_page->Functions(), "Name, Vorname");
     Choose(m_page->Names(), "Anschrift");
     Choose(m_page->Functions(), "PLZ Ort");
-    EXPECT_EQ("Meier, Hans|50667 K\xf6ln", OutputRow(0));
-    EXPECT_EQ("Wei\xdf|89073 Ulm", OutputRow(1)) << "no separator before an empty part";
+    EXPECT_EQ("Meier, Hans|50667 K\xf6ln", Output(0));
+    EXPECT_EQ("Wei\xdf|89073 Ulm", Output(1)) << "no separator before an empty part";
     EXPECT_EQ("Name, Vorname|PLZ Ort", Captions());
     EXPECT_STREQ("Anschrift", qotest::ColumnTitle(m_page->Preview(), 1));
     qotest::CaptureWindow(m_page->m_hWnd, qotest::CapturePath("multicolumn-4038.png").c_str());
@@ -328,13 +323,13 @@ TEST_F(MultiColumnConfigTest, WriteModeComposesTheOutputColumnsAsTheUserNamesThe
     // Deleting the selected column.
     Choose(m_page->Names(), "Kunde");
     Click(IDC_MULTI_DELETE);
-    EXPECT_EQ("Anschrift", OutputNames());
-    EXPECT_EQ("50667 K\xf6ln", OutputRow(0));
+    EXPECT_EQ("Anschrift", Output(-1));
+    EXPECT_EQ("50667 K\xf6ln", Output(0));
 }
 
 TEST_F(MultiColumnConfigTest, ARenameThatClashesInAnyCaseChangesNothing)
 {
-    OpenWriter();
+    Open(false);
     Columns({{"Kunde", kNameFirst}, {"Anschrift", kZipTown}});
     struct Case {
         const char* typed;
@@ -356,18 +351,18 @@ TEST_F(MultiColumnConfigTest, ARenameThatClashesInAnyCaseChangesNothing)
         if (*c.message) scripts.push_back(qotest::Reading(message));
         qotest::Answering(scripts, [&] { Click(IDC_MULTI_EDIT_NAME); });
         EXPECT_EQ(c.message, message);
-        EXPECT_EQ(std::string("Kunde|") + c.column, OutputNames());
+        EXPECT_EQ(std::string("Kunde|") + c.column, Output(-1));
         EXPECT_EQ(c.function, FunctionName(kZipTown));
         EXPECT_EQ(*c.message ? 0 : 1, m_listener.m_nCalls);
         EXPECT_EQ((std::vector<std::string>{"Kunde", c.column}), Items(m_page->Names()));
     }
     EXPECT_EQ("Name, Vorname|PLZ Ort", Captions()) << "a combination is captioned by its parts";
-    EXPECT_EQ("Meier, Hans|50667 K\xf6ln", OutputRow(0));
+    EXPECT_EQ("Meier, Hans|50667 K\xf6ln", Output(0));
 }
 
 TEST_F(MultiColumnConfigTest, FunctionNamesBecomeColumnNamesUnlessTwoWouldClash)
 {
-    OpenWriter();
+    Open(false);
     struct Case {
         const char* what;
         std::vector<std::pair<const char*, long>> columns;
@@ -384,7 +379,6 @@ TEST_F(MultiColumnConfigTest, FunctionNamesBecomeColumnNamesUnlessTwoWouldClash)
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.what);
-        while (m_page->GetNumOuterColumns() > 0) m_page->RemoveOuterColumn(0);
         Columns(c.columns);
         std::string message;
         std::vector<qotest::DialogScript> scripts{[&](qotest::Dialog& d) {
@@ -395,13 +389,13 @@ TEST_F(MultiColumnConfigTest, FunctionNamesBecomeColumnNamesUnlessTwoWouldClash)
         if (*c.message) scripts.push_back(qotest::Reading(message));
         qotest::Answering(scripts, [&] { Click(IDC_MULTI_FUNC_TO_NAMES); });
         EXPECT_EQ(c.message, message);
-        EXPECT_EQ(c.names, OutputNames());
+        EXPECT_EQ(c.names, Output(-1));
     }
 }
 
 TEST_F(MultiColumnConfigTest, AllColumnsReplaceTheUsersOnlyAfterYes)
 {
-    OpenWriter();
+    Open(false);
     Columns({{"Kunde", kNameFirst}});
     for (int answer : {IDNO, IDYES}) {
         SCOPED_TRACE(answer);
@@ -411,15 +405,15 @@ TEST_F(MultiColumnConfigTest, AllColumnsReplaceTheUsersOnlyAfterYes)
                   "berschreibt Ihre bisherigen Einstellungen.\nSind Sie sicher?",
                   message);
     }
-    EXPECT_EQ("Feld 1|Feld 2|Feld 3|Feld 4|Feld 5|Feld 6|Feld 7", OutputNames());
-    EXPECT_EQ("Meier|Hans|50667|K\xf6ln|0221 12345|Meier, Hans|50667 K\xf6ln", OutputRow(0));
+    EXPECT_EQ("Feld 1|Feld 2|Feld 3|Feld 4|Feld 5|Feld 6|Feld 7", Output(-1));
+    EXPECT_EQ("Meier|Hans|50667|K\xf6ln|0221 12345|Meier, Hans|50667 K\xf6ln", Output(0));
     EXPECT_EQ("1|2|3|4|5|20000|20001", Functions());
     EXPECT_EQ(1 + 7, m_listener.m_nCalls) << "one removal and seven additions";
 }
 
 TEST_F(MultiColumnConfigTest, DraggingAHeaderToTheFrontMovesTheColumnWithItsFunction)
 {
-    OpenWriter();
+    Open(false);
     Columns({{"Nachname", kName}, {"Vorname", kFirst}, {"Anschrift", kZipTown}});
     qotest::PumpApp(200);  // the first paint learns the order
     CHeaderCtrl* header = m_page->Preview().GetHeaderCtrl();
@@ -432,8 +426,8 @@ TEST_F(MultiColumnConfigTest, DraggingAHeaderToTheFrontMovesTheColumnWithItsFunc
         << "the drag was not noticed";
     qotest::PumpApp(300);  // the order put back is painted and noticed too
 
-    EXPECT_EQ("Anschrift|Nachname|Vorname", OutputNames());
-    EXPECT_EQ("50667 K\xf6ln|Meier|Hans", OutputRow(0));
+    EXPECT_EQ("Anschrift|Nachname|Vorname", Output(-1));
+    EXPECT_EQ("50667 K\xf6ln|Meier|Hans", Output(0));
     EXPECT_EQ("20001|1|2", Functions());
     int order[3] = {-1, -1, -1};
     m_page->Preview().GetColumnOrderArray(order, 3);
