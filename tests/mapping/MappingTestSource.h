@@ -37,7 +37,6 @@ public:
     }
     void GetSourceName(int column, CString& name, int flag) override
     {
-        ++nameCalls;
         lastFlag = flag;
         name = m_names.at(column).c_str();
     }
@@ -85,7 +84,6 @@ public:
     using COutputFilterSource::SearchEntry;
 
     int valueCalls = 0;
-    int nameCalls = 0;
     long lastRow = -1;
     int lastFlag = -1;
 
