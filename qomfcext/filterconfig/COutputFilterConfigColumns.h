@@ -22,6 +22,8 @@
 
 #include <afxtempl.h>
 
+#include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "CColoredListCtrl.h"
@@ -171,14 +173,14 @@ bool COutputFilterConfigColumns::LoadColumns(CArray<TCol, TCol&>& columns, const
     std::vector<SSourceColumn> source;
     if (!ReadSourceColumns(source, bCutAtLimit))
         return false;
+    // By name, the first column of a name (sources of thousands of columns).
+    std::unordered_map<std::string, int> byName;
+    for (int k = 0; k < columns.GetSize(); ++k)
+        byName.emplace(std::string((const char*)columns[k].strName), k);
     CArray<TCol, TCol&> merged;
     for (const SSourceColumn& src : source) {
-        TCol col = fresh;
-        for (int k = 0; k < columns.GetSize(); ++k)
-            if (columns[k].strName == src.strName) {
-                col = columns[k];
-                break;
-            }
+        auto known = byName.find(std::string((const char*)src.strName));
+        TCol col = known != byName.end() ? columns[known->second] : fresh;
         col.strName = src.strName;
         col.nDataLength = src.nDataLength;
         merged.Add(col);
