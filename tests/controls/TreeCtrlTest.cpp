@@ -19,7 +19,6 @@ class CRecordingNode : public CQoTreeNode {
 public:
     using CQoTreeNode::CQoTreeNode;
     CQoTreeNode* m_pLocked = NULL;
-    bool m_bThrow = false;
     int m_nExpanding = 0;
     std::vector<std::string> m_log;
 

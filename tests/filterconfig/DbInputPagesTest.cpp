@@ -8,7 +8,6 @@
 #include <afxcmn.h>
 #include <afxdao.h>
 
-#include <cstdint>
 #include <string>
 #include <vector>
 

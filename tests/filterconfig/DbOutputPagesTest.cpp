@@ -14,7 +14,6 @@
 #include <CQoOutputFilterDbase.h>
 
 #include <string>
-#include <vector>
 
 #include "FileSource.h"
 #include "MfcTestHost.h"
