@@ -105,7 +105,8 @@ void CQoTreeNode::AddChild(CQoTreeNode* pNode)
 
 void CQoTreeNode::InsertChild(int nIndex, CQoTreeNode* pNode)
 {
-    if (pNode == NULL || nIndex < 0 || nIndex > NumChildren()) return;
+    // A node listed twice would be freed twice.
+    if (pNode == NULL || nIndex < 0 || nIndex > NumChildren() || FindChild(pNode) >= 0) return;
     m_children.InsertAt(nIndex, pNode);
     TellCtrlModified();
 }

@@ -73,7 +73,8 @@ public:
     // that is already a child here, or this node's own ancestor, is ignored.
     void AddChild(CQoTreeNode* pNode);
     // Puts a child of this node back at an index (0 .. NumChildren()); it keeps
-    // its parent and items as they are. New children come with AddChild.
+    // its parent and items as they are; one that is still a child is ignored.
+    // New children come with AddChild.
     void InsertChild(int nIndex, CQoTreeNode* pNode);
     // Takes a child out (its parent field stays) and frees it if bDelete.
     void RemoveChild(CQoTreeNode* pNode, bool bDelete);

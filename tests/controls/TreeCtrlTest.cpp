@@ -98,6 +98,8 @@ TEST_F(TreeCtrlTest, ViewFollowsEveryNodeChangeItemByItem)
         {"first up", [&] { m_pRoot->ShiftUp(Child(0), true); }, {"A neu", "c"}},
         {"last down", [&] { m_pRoot->ShiftDown(Child(1), true); }, {"A neu", "c"}},
         {"foreign node", [&] { m_pRoot->RemoveChild(&stranger, false); }, {"A neu", "c"}},
+        // Listed twice, it would be freed twice.
+        {"child put back again", [&] { m_pRoot->InsertChild(0, Child(1)); }, {"A neu", "c"}},
     };
     for (const Step& step : steps) {
         step.change();
