@@ -39,45 +39,41 @@ TEST_F(BatchMessageBox, ShowsNothingAndReturnsThePreset)
     EXPECT_EQ(std::vector<std::string>{"E:2001 Weiter?, Autoreturn: no"}, Entries());
 }
 
-TEST_F(BatchMessageBox, PrefixDependsOnTheNumberRange)
+TEST_F(BatchMessageBox, LogLineHasPrefixTextAndThePresetAnswer)
 {
-    const int numbers[] = {999, 1000, 1999, 2000, 2999, 3000, -1500, 0};
-    for (int n : numbers)
-        QoBatchMessageBox(n, IDOK, "t", MB_OK, 0);
-    std::vector<std::string> expected = {
-        " t, Autoreturn: ok",      "H:1000 t, Autoreturn: ok", "H:1999 t, Autoreturn: ok",
-        "E:2000 t, Autoreturn: ok", "E:2999 t, Autoreturn: ok", " t, Autoreturn: ok",
-        " t, Autoreturn: ok",      " t, Autoreturn: ok"};
-    EXPECT_EQ(expected, Entries());
-}
-
-TEST_F(BatchMessageBox, EveryAnswerHasItsName)
-{
-    const UINT answers[] = {IDOK, IDCANCEL, IDABORT, IDRETRY, IDIGNORE, IDYES, IDNO, 0, 42};
-    for (UINT a : answers)
-        EXPECT_EQ((int)a, QoBatchMessageBox(1, a, "x", MB_OK, 0));
-    std::vector<std::string> expected = {
-        " x, Autoreturn: ok",     " x, Autoreturn: cancel", " x, Autoreturn: abort",
-        " x, Autoreturn: retry",  " x, Autoreturn: ignore", " x, Autoreturn: yes",
-        " x, Autoreturn: no",     " x, Autoreturn: unknown", " x, Autoreturn: unknown"};
-    EXPECT_EQ(expected, Entries());
-}
-
-TEST_F(BatchMessageBox, LineBreaksAreFlattenedInTheLog)
-{
-    QoBatchMessageBox(1001, IDOK, "a\r\nb\nc\rd", MB_OK, 0);
-    EXPECT_EQ(std::vector<std::string>{"H:1001 a b cd, Autoreturn: ok"}, Entries());
-}
-
-TEST_F(BatchMessageBox, StringIdFormLoadsTheLibraryText)
-{
-    // The test program has no string table of its own: the text comes from the
-    // library through the resource chain, in batch mode too.
-    QoBatchMessageBox(2500, IDOK, (UINT)IDS_LOG_DELETE, MB_OK, 0);
-    QoBatchMessageBox(2501, IDOK, (UINT)59999, MB_OK, 0);
-    std::vector<std::string> expected = {
-        "E:2500 L\xF6sche Verzeichnis/Datei , Autoreturn: ok",
-        "E:2501 , Autoreturn: ok"};
+    struct Case
+    {
+        int number;
+        UINT answer;
+        const char* text;  // null: the text of textId
+        UINT textId;
+        const char* logged;
+    };
+    const Case cases[] = {
+        // The prefix follows the number range.
+        {999, IDOK, "t", 0, " t, Autoreturn: ok"}, {1000, IDOK, "t", 0, "H:1000 t, Autoreturn: ok"},
+        {1999, IDOK, "t", 0, "H:1999 t, Autoreturn: ok"}, {2000, IDOK, "t", 0, "E:2000 t, Autoreturn: ok"},
+        {2999, IDOK, "t", 0, "E:2999 t, Autoreturn: ok"}, {3000, IDOK, "t", 0, " t, Autoreturn: ok"},
+        {-1500, IDOK, "t", 0, " t, Autoreturn: ok"}, {0, IDOK, "t", 0, " t, Autoreturn: ok"},
+        // Every answer has its name.
+        {1, IDCANCEL, "x", 0, " x, Autoreturn: cancel"}, {1, IDABORT, "x", 0, " x, Autoreturn: abort"},
+        {1, IDRETRY, "x", 0, " x, Autoreturn: retry"}, {1, IDIGNORE, "x", 0, " x, Autoreturn: ignore"},
+        {1, IDYES, "x", 0, " x, Autoreturn: yes"}, {1, IDNO, "x", 0, " x, Autoreturn: no"},
+        {1, 0, "x", 0, " x, Autoreturn: unknown"}, {1, 42, "x", 0, " x, Autoreturn: unknown"},
+        // Line breaks are flattened.
+        {1001, IDOK, "a\r\nb\nc\rd", 0, "H:1001 a b cd, Autoreturn: ok"},
+        // The test program has no string table of its own: the text comes from
+        // the library through the resource chain, in batch mode too.
+        {2500, IDOK, nullptr, IDS_LOG_DELETE, "E:2500 L\xF6sche Verzeichnis/Datei , Autoreturn: ok"},
+        {2501, IDOK, nullptr, 59999, "E:2501 , Autoreturn: ok"},
+    };
+    std::vector<std::string> expected;
+    for (const Case& c : cases) {
+        int answer = c.text ? QoBatchMessageBox(c.number, c.answer, c.text, MB_OK, 0)
+                            : QoBatchMessageBox(c.number, c.answer, c.textId, MB_OK, 0);
+        EXPECT_EQ((int)c.answer, answer) << c.logged;
+        expected.push_back(c.logged);
+    }
     EXPECT_EQ(expected, Entries());
 }
 
@@ -86,14 +82,20 @@ TEST_F(InteractiveMessageBox, ShowsTheUnalteredTextAndLogsTheAnswer)
     qotest::DialogDriver driver;
     driver.Expect([](qotest::Dialog& d) {
         EXPECT_EQ("a\r\nb", d.MessageText());
-        std::vector<int> buttons = d.ButtonIds();
-        EXPECT_EQ((std::vector<int>{IDYES, IDNO}), buttons);
+        EXPECT_EQ((std::vector<int>{IDYES, IDNO}), d.ButtonIds());
         d.Press(IDYES);
     });
+    driver.Expect([](qotest::Dialog& d) {
+        EXPECT_EQ("ODBC Datenbanken m\xFCssen schon angelegt sein!", d.MessageText());
+        d.Press(IDOK);
+    });
     EXPECT_EQ(IDYES, QoBatchMessageBox(2001, IDNO, "a\r\nb", MB_YESNO, 0));
+    EXPECT_EQ(IDOK, QoBatchMessageBox(3000, IDCANCEL, (UINT)IDS_ODBC_MUST_EXIST, MB_OK, 0));
     EXPECT_TRUE(driver.Done());
     EXPECT_EQ(0, driver.Unanswered());
-    EXPECT_EQ(std::vector<std::string>{"E:2001 a b, Return: yes"}, Entries());
+    EXPECT_EQ((std::vector<std::string>{"E:2001 a b, Return: yes",
+                                        " ODBC Datenbanken m\xFCssen schon angelegt sein!, Return: ok"}),
+              Entries());
 }
 
 TEST_F(InteractiveMessageBox, PendingPiecesWaitWhileTheBoxIsOpen)
@@ -109,17 +111,4 @@ TEST_F(InteractiveMessageBox, PendingPiecesWaitWhileTheBoxIsOpen)
     EXPECT_EQ(IDCANCEL, QoBatchMessageBox(1500, IDOK, "Abbrechen?", MB_OKCANCEL, 0));
     EXPECT_EQ("", seenWhileOpen);
     EXPECT_EQ(std::vector<std::string>{"H:1500 Abbrechen?, Return: cancel"}, Entries());
-}
-
-TEST_F(InteractiveMessageBox, StringIdFormShowsTheLibraryText)
-{
-    qotest::DialogDriver driver;
-    driver.Expect([](qotest::Dialog& d) {
-        EXPECT_EQ("ODBC Datenbanken m\xFCssen schon angelegt sein!", d.MessageText());
-        d.Press(IDOK);
-    });
-    EXPECT_EQ(IDOK, QoBatchMessageBox(3000, IDCANCEL, (UINT)IDS_ODBC_MUST_EXIST, MB_OK, 0));
-    EXPECT_TRUE(driver.Done());
-    EXPECT_EQ(std::vector<std::string>{" ODBC Datenbanken m\xFCssen schon angelegt sein!, Return: ok"},
-              Entries());
 }

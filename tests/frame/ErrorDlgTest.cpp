@@ -28,13 +28,13 @@ protected:
         LogFixture::TearDown();
     }
 
-    // Shows the error and returns what the window showed.
+    // Shows the error and returns what the window showed; captures it when `png` is given.
     struct Seen
     {
         std::string title, message, info;
         bool cancelVisible = true, okVisible = false, hasIcon = false;
     };
-    Seen Show(int code, const char* info)
+    Seen Show(int code, const char* info, const char* png = nullptr)
     {
         Seen seen;
         qotest::DialogDriver driver;
@@ -46,6 +46,9 @@ protected:
             seen.okVisible = d.IsVisible(IDOK);
             // The first static without an id is the icon.
             seen.hasIcon = d.Send(-1, STM_GETICON) != 0;
+            if (png) {
+                EXPECT_TRUE(qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath(png).c_str()));
+            }
             d.Press(IDOK);
         });
         CQoErrorDlg::ShowError(code, info);
@@ -59,33 +62,26 @@ protected:
 
 TEST_F(ErrorDlg, ShowsNumberRegisteredTextAndInformation)
 {
-    Seen seen = Show(20001, "erste Zeile\nzweite Zeile");
+    Seen seen = Show(20001, "Datei: C:\\daten\\kunden.txt\nZeile 17", "error-dialog-4037.png");
     EXPECT_EQ("Fehler", seen.title);
     EXPECT_EQ(std::string("Es ist der Fehler 20001 aufgetreten.\n") + kBuiltIn, seen.message);
-    EXPECT_EQ("erste Zeile\r\nzweite Zeile", seen.info);
+    EXPECT_EQ("Datei: C:\\daten\\kunden.txt\r\nZeile 17", seen.info);
     EXPECT_TRUE(seen.okVisible);
     EXPECT_FALSE(seen.cancelVisible);
     EXPECT_TRUE(seen.hasIcon);
 
     std::vector<std::string> expected = {
         std::string("ERR: Es ist der Fehler 20001 aufgetreten.;") + kBuiltIn,
-        "ERR: erste Zeile;zweite Zeile"};
+        "ERR: Datei: C:\\daten\\kunden.txt;Zeile 17"};
     EXPECT_EQ(expected, Entries());
 }
 
-TEST_F(ErrorDlg, InformationWithCrLfKeepsOneBreakPerLine)
+TEST_F(ErrorDlg, LineBreaksShowAsCrLfAndLogAsSemicolons)
 {
-    Seen seen = Show(20001, "a\r\nb\nc");
-    EXPECT_EQ("a\r\nb\r\nc", seen.info);
-    EXPECT_EQ("ERR: a;b;c", Entries().at(1));
-}
-
-TEST_F(ErrorDlg, UnregisteredNumberEndsAfterTheLineBreak)
-{
-    Seen seen = Show(777, "");
-    EXPECT_EQ("Es ist der Fehler 777 aufgetreten.\n", seen.message);
-    EXPECT_EQ("", seen.info);
-    std::vector<std::string> expected = {"ERR: Es ist der Fehler 777 aufgetreten.;", "ERR: "};
+    CQoErrorDlg::AddMessage(2200, "Zeile eins\r\nZeile zwei\nZeile drei");
+    EXPECT_EQ("a\r\nb\r\nc", Show(2200, "a\r\nb\nc").info);
+    std::vector<std::string> expected = {
+        "ERR: Es ist der Fehler 2200 aufgetreten.;Zeile eins;Zeile zwei;Zeile drei", "ERR: a;b;c"};
     EXPECT_EQ(expected, Entries());
 }
 
@@ -93,22 +89,20 @@ TEST_F(ErrorDlg, RegistrationsReplaceClearAndVanish)
 {
     CQoErrorDlg::AddMessage(2107, "Die Eingabedatei fehlt.");
     CQoErrorDlg::AddMessage(2107, "Die Eingabedatei ist leer.");
-    EXPECT_EQ("Es ist der Fehler 2107 aufgetreten.\nDie Eingabedatei ist leer.",
-              Show(2107, "x").message);
+    EXPECT_EQ("Es ist der Fehler 2107 aufgetreten.\nDie Eingabedatei ist leer.", Show(2107, "x").message);
 
+    // Without a registered text the message ends after the line break.
     CQoErrorDlg::ClearMessage(2107);
-    EXPECT_EQ("Es ist der Fehler 2107 aufgetreten.\n", Show(2107, "x").message);
+    Seen seen = Show(2107, "");
+    EXPECT_EQ("Es ist der Fehler 2107 aufgetreten.\n", seen.message);
+    EXPECT_EQ("", seen.info);
+    std::vector<std::string> entries = Entries();
+    ASSERT_EQ(4u, entries.size());
+    EXPECT_EQ("ERR: Es ist der Fehler 2107 aufgetreten.;", entries[2]);
+    EXPECT_EQ("ERR: ", entries[3]);
 
     CQoErrorDlg::ClearAllMessages();
     EXPECT_EQ("Es ist der Fehler 20001 aufgetreten.\n", Show(20001, "x").message);
-}
-
-TEST_F(ErrorDlg, MessageTextWithLineBreaksIsOneLogLine)
-{
-    CQoErrorDlg::AddMessage(2200, "Zeile eins\r\nZeile zwei\nZeile drei");
-    Show(2200, "info");
-    EXPECT_EQ("ERR: Es ist der Fehler 2200 aufgetreten.;Zeile eins;Zeile zwei;Zeile drei",
-              Entries().at(0));
 }
 
 TEST_F(ErrorDlg, StringIdFormAndBatchModeStillShow)
@@ -124,17 +118,4 @@ TEST_F(ErrorDlg, StringIdFormAndBatchModeStillShow)
     EXPECT_EQ(1, driver.Seen());
     EXPECT_EQ("Offset", info);
     EXPECT_EQ("ERR: Offset", Entries().at(1));
-}
-
-TEST_F(ErrorDlg, CaptureOfTheDialog)
-{
-    std::string png;
-    qotest::DialogDriver driver;
-    driver.Expect([&](qotest::Dialog& d) {
-        png = qotest::CapturePath("error-dialog-4037.png");
-        EXPECT_TRUE(qotest::CaptureWindow(d.Hwnd(), png.c_str()));
-        d.Press(IDOK);
-    });
-    CQoErrorDlg::ShowError(20001, "Datei: C:\\daten\\kunden.txt\nZeile 17");
-    EXPECT_TRUE(FileExists(png));
 }

@@ -5,6 +5,8 @@
 
 #include <cctype>
 #include <cstdio>
+#include <fstream>
+#include <iterator>
 
 #include <CQoLog.h>
 
@@ -33,24 +35,14 @@ ScratchDir::~ScratchDir()
 
 std::string ReadFile(const std::string& path)
 {
-    std::string bytes;
-    FILE* f = fopen(path.c_str(), "rb");
-    if (!f)
-        return bytes;
-    char buffer[4096];
-    size_t n;
-    while ((n = fread(buffer, 1, sizeof buffer, f)) > 0)
-        bytes.append(buffer, n);
-    fclose(f);
-    return bytes;
+    std::ifstream in(path, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
 }
 
 void WriteFile(const std::string& path, const std::string& bytes)
 {
-    FILE* f = fopen(path.c_str(), "wb");
-    ASSERT_NE(nullptr, f) << path;
-    fwrite(bytes.data(), 1, bytes.size(), f);
-    fclose(f);
+    std::ofstream out(path, std::ios::binary);
+    ASSERT_TRUE(out.write(bytes.data(), bytes.size())) << path;
 }
 
 bool FileExists(const std::string& path)

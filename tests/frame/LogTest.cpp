@@ -15,11 +15,9 @@ using Log = LogFixture;
 TEST_F(Log, EntryIsOneLineWithTimePrefixAndCrLf)
 {
     _theLog << "Konvertierung " << 42L << " von " << -7L << CQoLog::endl;
-    _theLog << "zweite" << CQoLog::endl;
-    std::vector<std::string> entries = Entries();
-    ASSERT_EQ(2u, entries.size());
-    EXPECT_EQ("Konvertierung 42 von -7", entries[0]);
-    EXPECT_EQ("zweite", entries[1]);
+    _theLog << "a" << static_cast<CQoLog::specials>(1) << "b" << CQoLog::endl;  // other manipulators do nothing
+    _theLog << CQoLog::endl;                                                      // the prefix alone
+    EXPECT_EQ((std::vector<std::string>{"Konvertierung 42 von -7", "ab", ""}), Entries());
 }
 
 TEST_F(Log, PrefixIsTheLocalTimeOfTheFinish)
@@ -41,31 +39,15 @@ TEST_F(Log, PrefixIsTheLocalTimeOfTheFinish)
     EXPECT_TRUE(matched) << line;
 }
 
-TEST_F(Log, EmptyEntryWritesPrefixOnly)
-{
-    _theLog << CQoLog::endl;
-    std::vector<std::string> entries = Entries();
-    ASSERT_EQ(1u, entries.size());
-    EXPECT_EQ("", entries[0]);
-}
-
-TEST_F(Log, OtherManipulatorValuesDoNothing)
-{
-    _theLog << "a" << static_cast<CQoLog::specials>(1) << "b" << CQoLog::endl;
-    EXPECT_EQ(std::vector<std::string>{"ab"}, Entries());
-}
-
-TEST_F(Log, WithoutFileNameEntriesAreDroppedAndTheNextStartsEmpty)
+TEST_F(Log, EntriesWithoutAUsableFileAreLostAndCloseDiscardsPendingPieces)
 {
     _theLog.Close();
-    _theLog << "verloren" << CQoLog::endl;
+    _theLog << "ohne Datei" << CQoLog::endl;
+    std::string folder = m_dir.File("ordner");
+    CreateDirectoryA(folder.c_str(), NULL);
+    _theLog.Open(folder.c_str());  // a folder cannot be opened as a file
+    _theLog << "in den Ordner" << CQoLog::endl;
     _theLog.Open(m_log.c_str());
-    _theLog << "danach" << CQoLog::endl;
-    EXPECT_EQ(std::vector<std::string>{"danach"}, Entries());
-}
-
-TEST_F(Log, CloseDiscardsPendingPieces)
-{
     _theLog << "halb";
     _theLog.Close();
     _theLog << CQoLog::endl;  // no file name: nothing written
@@ -87,42 +69,24 @@ TEST_F(Log, OpenWithNewNameSendsPendingEntryThere)
     EXPECT_EQ("erst dann", AfterPrefix(lines[0]));
 }
 
-TEST_F(Log, FileIsClosedBetweenEntriesAndRecreatedWhenDeleted)
+TEST_F(Log, AppendsAndRecreatesTheFileWhenDeletedBetweenEntries)
 {
+    WriteFile(m_log, "alt\r\n");
     _theLog << "eins" << CQoLog::endl;
+    std::vector<std::string> lines = Lines();
+    ASSERT_EQ(2u, lines.size());
+    EXPECT_EQ("alt", lines[0]);
+    EXPECT_EQ("eins", AfterPrefix(lines[1]));
     // Another program may delete the file between two entries.
     ASSERT_TRUE(DeleteFileA(m_log.c_str()));
     _theLog << "zwei" << CQoLog::endl;
     EXPECT_EQ(std::vector<std::string>{"zwei"}, Entries());
 }
 
-TEST_F(Log, AppendsToExistingFile)
-{
-    WriteFile(m_log, "alt\r\n");
-    _theLog << "neu" << CQoLog::endl;
-    std::vector<std::string> lines = Lines();
-    ASSERT_EQ(2u, lines.size());
-    EXPECT_EQ("alt", lines[0]);
-    EXPECT_EQ("neu", AfterPrefix(lines[1]));
-}
-
-TEST_F(Log, UnwritableFileLosesTheEntryOnly)
-{
-    std::string folder = m_dir.File("ordner");
-    CreateDirectoryA(folder.c_str(), NULL);
-    _theLog.Open(folder.c_str());  // a folder cannot be opened as a file
-    _theLog << "verloren" << CQoLog::endl;
-    _theLog.Open(m_log.c_str());
-    _theLog << "weiter" << CQoLog::endl;
-    EXPECT_EQ(std::vector<std::string>{"weiter"}, Entries());
-}
-
 TEST_F(Log, ScopeLoggerRecordsNothing)
 {
     {
         CScopeLogger scope(3, "Bereich", "Text");
-        CScopeLogger copy(scope);
-        copy = scope;
     }
     EXPECT_EQ(0, CScopeLogger::m_lLevel);
     EXPECT_FALSE(FileExists(m_log));

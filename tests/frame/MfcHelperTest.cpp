@@ -61,73 +61,57 @@ TEST_F(MfcHelper, CopyReplacesTheTarget)
     EXPECT_FALSE(FileExists(m_log));
 }
 
-TEST_F(MfcHelper, CopyWithNothingToDoSucceedsWithoutTouchingAnything)
+TEST_F(MfcHelper, CopyThatNeedNotOrCannotRunTouchesNothing)
 {
-    std::string source = m_dir.File("quelle.txt");
+    std::string source = m_dir.File("quelle.txt"), target = m_dir.File("ziel.txt");
     WriteFile(source, "x");
     FILETIME before = WriteTime(source);
     Sleep(20);
+    // Nothing to do: success.
     EXPECT_TRUE(CQoMfcHelper::CopyFileA(source.c_str(), source.c_str(), false));
     FILETIME after = WriteTime(source);
     EXPECT_EQ(0, CompareFileTime(&before, &after));
     EXPECT_TRUE(CQoMfcHelper::CopyFileA("", source.c_str(), false));
     EXPECT_TRUE(CQoMfcHelper::CopyFileA(source.c_str(), "", true));
-    EXPECT_EQ("x", ReadFile(source));
-}
 
-TEST_F(MfcHelper, CopyOfAMissingFileFailsQuietly)
-{
+    // A missing source fails quietly; paths longer than the shell's buffer are refused.
     qotest::DialogDriver driver;
-    EXPECT_FALSE(CQoMfcHelper::CopyFileA(m_dir.File("fehlt.txt").c_str(), m_dir.File("ziel.txt").c_str(), false));
-    qotest::PumpFor(100);
-    EXPECT_EQ(0, driver.Seen());
-    EXPECT_FALSE(FileExists(m_dir.File("ziel.txt")));
-}
-
-TEST_F(MfcHelper, PathsLongerThanTheShellBufferAreRefused)
-{
-    std::string source = m_dir.File("quelle.txt");
-    WriteFile(source, "x");
+    EXPECT_FALSE(CQoMfcHelper::CopyFileA(m_dir.File("fehlt.txt").c_str(), target.c_str(), false));
     std::string longPath = m_dir.Path() + "\\" + std::string(600, 'a') + ".txt";
     EXPECT_FALSE(CQoMfcHelper::CopyFileA(source.c_str(), longPath.c_str(), false));
     EXPECT_FALSE(CQoMfcHelper::CopyFileA(longPath.c_str(), source.c_str(), false));
     EXPECT_FALSE(CQoMfcHelper::RemoveFile(longPath.c_str(), true));
+    qotest::PumpFor(100);
+    EXPECT_EQ(0, driver.Seen());
+    EXPECT_FALSE(FileExists(target));
     EXPECT_EQ("x", ReadFile(source));
 }
 
-TEST_F(MfcHelper, RemoveFileDeletesAndLogs)
+TEST_F(MfcHelper, RemovingAFileOrAFolderWithItsContentsIsLogged)
 {
-    std::string file = m_dir.File("weg.txt");
+    std::string file = m_dir.File("weg.txt"), folder = m_dir.File("projekt");
     WriteFile(file, "x");
-    EXPECT_TRUE(CQoMfcHelper::RemoveFile(file.c_str(), true));
-    EXPECT_FALSE(FileExists(file));
-    EXPECT_EQ(std::vector<std::string>{"L\xF6sche Verzeichnis/Datei " + file}, Entries());
-}
-
-TEST_F(MfcHelper, RemoveDirectoryTakesTheContentsAlong)
-{
-    std::string folder = m_dir.File("projekt");
     CreateDirectoryA(folder.c_str(), NULL);
     CreateDirectoryA((folder + "\\unter").c_str(), NULL);
     WriteFile(folder + "\\unter\\daten.txt", "1;2;3\r\n");
+    EXPECT_TRUE(CQoMfcHelper::RemoveFile(file.c_str(), true));
     EXPECT_TRUE(CQoMfcHelper::RemoveDirectoryA(folder.c_str(), true));
+    EXPECT_FALSE(FileExists(file));
     EXPECT_FALSE(FileExists(folder));
-    EXPECT_EQ(std::vector<std::string>{"L\xF6sche Verzeichnis/Datei " + folder}, Entries());
+    EXPECT_EQ((std::vector<std::string>{"L\xF6sche Verzeichnis/Datei " + file, "L\xF6sche Verzeichnis/Datei " + folder}),
+              Entries());
 }
 
 TEST_F(MfcHelper, ShowGetLastErrorPutsThePrefixAboveTheSystemText)
 {
     std::string title;
+    EXPECT_FALSE(SystemText(ERROR_FILE_NOT_FOUND).empty());
     EXPECT_EQ("Kopieren fehlgeschlagen\n" + SystemText(ERROR_FILE_NOT_FOUND),
               ShownError(ERROR_FILE_NOT_FOUND, "Kopieren fehlgeschlagen", &title));
     EXPECT_EQ("Error", title);
-    EXPECT_FALSE(SystemText(ERROR_FILE_NOT_FOUND).empty());
-}
-
-TEST_F(MfcHelper, ShowGetLastErrorWithoutPrefixHasNoLeadingLineFeed)
-{
+    // Without a prefix no leading line feed; a code without system text shows
+    // the prefix and the line feed alone.
     EXPECT_EQ(SystemText(ERROR_ACCESS_DENIED), ShownError(ERROR_ACCESS_DENIED, ""));
     EXPECT_EQ(SystemText(ERROR_ACCESS_DENIED), ShownError(ERROR_ACCESS_DENIED, nullptr));
-    // A code without system text shows the prefix and the line feed alone.
     EXPECT_EQ("Vorsilbe\n", ShownError(0x2FFFFFF0, "Vorsilbe"));
 }
