@@ -8,6 +8,7 @@
 
 #include "PythonPeer.h"
 #include "TempFolder.h"
+#include "TextFilterTestSupport.h"
 
 #include <gtest/gtest.h>
 
@@ -76,25 +77,6 @@ std::string Rec(std::string const &name, std::string const &num, bool deleted = 
     return std::string(1, deleted ? '*' : ' ') + Pad(name, 10) + Pad(num, 5, true);
 }
 
-std::vector<std::string> Row(CQoInputFilterDbase34 &dbf)
-{
-    std::vector<std::string> row;
-    CQoString value;
-    for (int c = 0; c < dbf.NumCols(); ++c) {
-        dbf.Value(c, value);
-        row.push_back(value.Str());
-    }
-    return row;
-}
-
-std::vector<std::vector<std::string>> AllRows(CQoInputFilterDbase34 &dbf)
-{
-    std::vector<std::vector<std::string>> rows;
-    for (bool ok = dbf.FirstRow(); ok; ok = dbf.NextRow())
-        rows.push_back(Row(dbf));
-    return rows;
-}
-
 std::string InitError(std::string const &path)
 {
     CQoInputFilterDbase34 dbf;
@@ -106,35 +88,17 @@ std::string InitError(std::string const &path)
     return std::string();
 }
 
-// Undoes the escaping of the peer scripts (\\ \t \n \r).
-std::string Unescape(std::string const &text)
+// A line of the peer: tab-separated fields, each as hex of its Windows-1252 bytes.
+Row HexFields(std::string const &line)
 {
-    std::string out;
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        if (text[i] == '\\' && i + 1 < text.size()) {
-            char c = text[++i];
-            out += c == 't' ? '\t' : c == 'n' ? '\n' : c == 'r' ? '\r' : c;
-        } else {
-            out += text[i];
-        }
+    Row fields(1);
+    for (std::size_t i = 0; i < line.size(); ++i) {
+        if (line[i] == '\t')
+            fields.emplace_back();
+        else if (i + 1 < line.size())
+            fields.back() += char(std::stoi(line.substr(i++, 2), nullptr, 16));
     }
-    return out;
-}
-
-std::vector<std::string> SplitTabs(std::string const &line)
-{
-    std::vector<std::string> parts;
-    std::string part;
-    for (char c : line) {
-        if (c == '\t') {
-            parts.push_back(Unescape(part));
-            part.clear();
-        } else {
-            part += c;
-        }
-    }
-    parts.push_back(Unescape(part));
-    return parts;
+    return fields;
 }
 
 } // namespace
@@ -173,23 +137,17 @@ for name, cp in (('dos.dbf', 'cp850'), ('win.dbf', 'cp1252')):
         EXPECT_EQ("BETRAG", name);
         CDbaseField field;
         ASSERT_TRUE(dbf.GetFieldDesc(1, field));
-        EXPECT_EQ('N', field.Type());
-        EXPECT_EQ(10, field.Length());
-        EXPECT_EQ(2, field.Decimals());
+        EXPECT_EQ(CDbaseField("BETRAG", 'N', 10, 2), field);
 
-        // The deleted record is skipped.
+        // The deleted record is skipped; with deleted records read, the mark tells them apart.
         EXPECT_EQ(2, dbf.NumRows());
-        auto rows = AllRows(dbf);
-        ASSERT_EQ(2u, rows.size());
-        EXPECT_EQ((std::vector<std::string>{"M\xFCller \xC4\xD6\xDC\xDF", "12.50", "20240131", "T"}), rows[0]);
-        EXPECT_EQ((std::vector<std::string>{"Dritter", "", "", "?"}), rows[1]);
-
-        // With deleted records read, the mark tells them apart.
+        EXPECT_EQ((std::vector<Row>{{"M\xFCller \xC4\xD6\xDC\xDF", "12.50", "20240131", "T"}, {"Dritter", "", "", "?"}}),
+                  AllRows(dbf));
         dbf.SkipDeleted(false);
         EXPECT_EQ(3, dbf.NumRows());
         ASSERT_TRUE(dbf.AbsoluteRow(1));
         EXPECT_TRUE(dbf.IsDeleted());
-        EXPECT_EQ("gel\xF6scht", Row(dbf)[0]);
+        EXPECT_EQ("gel\xF6scht", CurrentRow(dbf)[0]);
         ASSERT_TRUE(dbf.AbsoluteRow(2));
         EXPECT_FALSE(dbf.IsDeleted());
     }
@@ -215,24 +173,21 @@ for i in range(3000):
 for i in range(0, 3000, 7):
     dbf.delete(t[i])
 t.close()
-def esc(s):
-    return s.replace('\\', '\\\\').replace('\t', '\\t').replace('\n', '\\n').replace('\r', '\\r')
-with open(os.path.join(folder, 'expected.txt'), 'wb') as out:
-    table = dbfread.DBF(path, raw=True, encoding='cp850')
-    for rec in table:
+with open(os.path.join(folder, 'expected.txt'), 'w') as out:
+    for rec in dbfread.DBF(path, raw=True, encoding='cp850'):
         vals = []
         for name, value in rec.items():
             text = value.decode('cp850')
             text = text.rstrip(' \0') if name == 'TEXT' else text.strip(' \0')
-            vals.append(esc(text))
-        out.write(('\t'.join(vals) + '\n').encode('cp1252'))
+            vals.append(text.encode('cp1252').hex())
+        out.write('\t'.join(vals) + '\n')
 )");
     if (!ran)
         PEER_UNAVAILABLE();
 
-    std::vector<std::vector<std::string>> expected;
+    std::vector<Row> expected;
     for (std::string const &line : ReadPeerLines(folder.Path("expected.txt")))
-        expected.push_back(SplitTabs(line));
+        expected.push_back(HexFields(line));
     ASSERT_EQ(3000u - 429u, expected.size());
 
     CQoInputFilterDbase34 dbf;
@@ -246,10 +201,10 @@ with open(os.path.join(folder, 'expected.txt'), 'wb') as out:
     for (int i = 0; i < 500; ++i) {
         long row = long(random() % expected.size());
         ASSERT_TRUE(dbf.AbsoluteRow(row)) << row;
-        ASSERT_EQ(expected[std::size_t(row)], Row(dbf)) << row;
+        ASSERT_EQ(expected[std::size_t(row)], CurrentRow(dbf)) << row;
         if (std::size_t(row) + 1 < expected.size()) {
             ASSERT_TRUE(dbf.NextRow());
-            ASSERT_EQ(expected[std::size_t(row) + 1], Row(dbf)) << row + 1;
+            ASSERT_EQ(expected[std::size_t(row) + 1], CurrentRow(dbf)) << row + 1;
         }
     }
     EXPECT_TRUE(dbf.AbsoluteRow(long(expected.size()) - 1));
@@ -265,23 +220,22 @@ TEST(DbaseInputFormat, DbaseFourAndTheCodePageOfTheFilter)
     TempFolder tmp;
     std::string path = tmp.Path("four.dbf");
     // Code page byte 0: the filter's character set decides (DOS by default).
+    // Text keeps its leading blanks, numbers lose theirs.
     WriteBytes(path, MakeDbf(kTwoFields, {Rec("\x84\x94\x81", "1"), Rec("  x", "-22")}, 0x04, 0x00));
     CQoInputFilterDbase34 dbf;
-    EXPECT_EQ(CQoFile::ascii, dbf.CharSet());
     dbf.Init(path.c_str());
     EXPECT_EQ(CQoInputFilter::filterDbase4, dbf.InputFilterType());
-    EXPECT_EQ((std::vector<std::vector<std::string>>{{"\xE4\xF6\xFC", "1"}, {"  x", "-22"}}), AllRows(dbf));
-    // (text keeps its leading blanks, numbers lose theirs)
+    EXPECT_EQ((std::vector<Row>{{"\xE4\xF6\xFC", "1"}, {"  x", "-22"}}), AllRows(dbf));
 
     dbf.CharSet(CQoFile::ansi);
     dbf.Init(path.c_str());
     EXPECT_EQ("\x84\x94\x81", AllRows(dbf)[0][0]);
 }
 
-TEST(DbaseInputFormat, EmptyTableAndPositionsInTheFile)
+TEST(DbaseInputFormat, EmptyTablesAndDeletedRecordsEverywhere)
 {
     TempFolder tmp;
-    std::string path = tmp.Path("empty.dbf");
+    std::string path = tmp.Path("del.dbf");
     WriteBytes(path, MakeDbf(kTwoFields, {}));
     CQoInputFilterDbase34 dbf;
     dbf.Init(path.c_str());
@@ -289,28 +243,12 @@ TEST(DbaseInputFormat, EmptyTableAndPositionsInTheFile)
     EXPECT_EQ(0, dbf.NumRows());
     EXPECT_FALSE(dbf.FirstRow());
     EXPECT_FALSE(dbf.AbsoluteRow(0));
-    CQoString value("x");
-    dbf.Value(0, value);
-    EXPECT_TRUE(value.IsEmpty());
+    EXPECT_EQ((Row{"", ""}), CurrentRow(dbf));
     EXPECT_EQ(-1, dbf.getActPosInFile());
 
-    WriteBytes(path, MakeDbf(kTwoFields, {Rec("a", "1"), Rec("b", "2", true), Rec("c", "3")}));
-    dbf.Init(path.c_str());
-    ASSERT_TRUE(dbf.AbsoluteRow(1));
-    EXPECT_EQ("c", Row(dbf)[0]);
-    EXPECT_EQ(32 + 64 + 1 + 2 * 16, dbf.getActPosInFile());
-    EXPECT_TRUE(dbf.CreateIndexFile());
-    dbf.Value(7, value);
-    EXPECT_TRUE(value.IsEmpty());
-}
-
-TEST(DbaseInputFormat, DeletedRecordsEverywhere)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("del.dbf");
-    // Deleted at the start, in a run and at the end.
-    std::vector<std::string> recs;
-    std::vector<std::string> live;
+    // Deleted at the start, in a run and at the end; rows are found from the
+    // back, and by walking without the index (NoCache).
+    std::vector<std::string> recs, live;
     for (int i = 0; i < 40; ++i) {
         bool deleted = i < 3 || (i >= 10 && i < 20) || i >= 37 || i % 5 == 4;
         recs.push_back(Rec("r" + std::to_string(i), std::to_string(i), deleted));
@@ -318,17 +256,19 @@ TEST(DbaseInputFormat, DeletedRecordsEverywhere)
             live.push_back("r" + std::to_string(i));
     }
     WriteBytes(path, MakeDbf(kTwoFields, recs));
-    CQoInputFilterDbase34 dbf;
     dbf.Init(path.c_str());
     ASSERT_EQ(long(live.size()), dbf.NumRows());
     for (long r = long(live.size()) - 1; r >= 0; --r) {
         ASSERT_TRUE(dbf.AbsoluteRow(r));
-        EXPECT_EQ(live[std::size_t(r)], Row(dbf)[0]);
+        EXPECT_EQ(live[std::size_t(r)], CurrentRow(dbf)[0]);
     }
-    // Without the index (NoCache) the same rows, found by walking.
+    EXPECT_EQ(32 + 64 + 1 + 3 * 16, dbf.getActPosInFile()); // the physical record of row 0
+    CQoString value("x");
+    dbf.Value(7, value); // no such column
+    EXPECT_TRUE(value.IsEmpty());
     dbf.NoCache(true);
     ASSERT_TRUE(dbf.AbsoluteRow(5));
-    EXPECT_EQ(live[5], Row(dbf)[0]);
+    EXPECT_EQ(live[5], CurrentRow(dbf)[0]);
 }
 
 // --- damaged files ----------------------------------------------------------------
@@ -338,51 +278,35 @@ TEST(DbaseInputDamaged, HeadersThatAreNotDbaseRaiseClearErrors)
     TempFolder tmp;
     std::string path = tmp.Path("bad.dbf");
     std::string good = MakeDbf(kTwoFields, {Rec("a", "1")});
-
     EXPECT_NE(std::string::npos, InitError(tmp.Path("missing.dbf")).find("missing.dbf"));
 
+    // Each case: the good file with some bytes changed.
     struct Case {
         char const *what;
         std::string bytes;
         char const *expect;
     };
-    std::string wrongVersion = good;
-    wrongVersion[0] = char(0x30);
-    std::string longHeader = good;
-    longHeader[8] = char(0xFF);
-    longHeader[9] = char(0x7F);
-    std::string shortHeader = good;
-    shortHeader[8] = char(20);
-    shortHeader[9] = 0;
-    std::string cutDescriptor = good;
-    cutDescriptor[8] = char(32 + 32 + 16); // the second descriptor is cut
-    std::string zeroLength = good;
-    zeroLength[32 + 16] = 0;
-    std::string unknownType = good;
-    unknownType[32 + 11] = 'X';
-    std::string smallRecord = good;
-    smallRecord[10] = char(5);
-    std::string noFields = good;
-    noFields[32] = 0x0D;
-    std::string zeroRecordLength = good;
-    zeroRecordLength[10] = 0;
-    std::string noEndMark = good;
-    noEndMark[8] = char(32 + 64); // the header ends with the descriptors, without 0x0D
-
+    auto changed = [&](std::vector<std::pair<std::size_t, char>> const &bytes) {
+        std::string file = good;
+        for (auto const &b : bytes)
+            file[b.first] = b.second;
+        return file;
+    };
     std::vector<Case> cases = {
         {"zero bytes", "", "zu kurz"},
         {"ten bytes", good.substr(0, 10), "zu kurz"},
         {"header only half there", good.substr(0, 50), "abgeschnitten"},
-        {"version", wrongVersion, "Kennung 0x30"},
-        {"header longer than file", longHeader, "abgeschnitten"},
-        {"header shorter than possible", shortHeader, "L\xE4nge des dBase-Dateikopfs"},
-        {"descriptor cut", cutDescriptor, "Feldes 2 ist abgeschnitten"},
-        {"field of length 0", zeroLength, "NAME hat die L\xE4nge 0"},
-        {"unknown field type", unknownType, "0x58"},
-        {"fields longer than record", smallRecord, "passen nicht"},
-        {"no fields", noFields, "keine Felder"},
-        {"record length 0", zeroRecordLength, "Satzl\xE4nge"},
-        {"descriptions without end mark", noEndMark, "Endemarke 0x0D"},
+        {"version", changed({{0, char(0x30)}}), "Kennung 0x30"},
+        {"header longer than file", changed({{8, char(0xFF)}, {9, char(0x7F)}}), "abgeschnitten"},
+        {"header shorter than possible", changed({{8, char(20)}, {9, 0}}), "L\xE4nge des dBase-Dateikopfs"},
+        {"descriptor cut", changed({{8, char(32 + 32 + 16)}}), "Feldes 2 ist abgeschnitten"},
+        {"field of length 0", changed({{32 + 16, 0}}), "NAME hat die L\xE4nge 0"},
+        {"unknown field type", changed({{32 + 11, 'X'}}), "0x58"},
+        {"fields longer than record", changed({{10, char(5)}}), "passen nicht"},
+        {"no fields", changed({{32, 0x0D}}), "keine Felder"},
+        {"record length 0", changed({{10, 0}}), "Satzl\xE4nge"},
+        // the header ends with the descriptors, without 0x0D
+        {"descriptions without end mark", changed({{8, char(32 + 64)}}), "Endemarke 0x0D"},
     };
     for (Case const &c : cases) {
         SCOPED_TRACE(c.what);
@@ -418,7 +342,7 @@ TEST(DbaseInputDamaged, RecordsMissingAtTheEndRaiseWhenReached)
     ASSERT_TRUE(dbf.FirstRow());
     ASSERT_TRUE(dbf.NextRow());
     ASSERT_TRUE(dbf.NextRow());
-    EXPECT_EQ("c", Row(dbf)[0]);
+    EXPECT_EQ("c", CurrentRow(dbf)[0]);
     try {
         dbf.NextRow();
         FAIL() << "the missing record went unnoticed";
@@ -434,7 +358,7 @@ TEST(DbaseInputDamaged, RecordsMissingAtTheEndRaiseWhenReached)
     counting.Init(path.c_str());
     EXPECT_EQ(5, counting.NumRows());
     EXPECT_TRUE(counting.AbsoluteRow(2));
-    EXPECT_EQ("c", Row(counting)[0]);
+    EXPECT_EQ("c", CurrentRow(counting)[0]);
     EXPECT_THROW(counting.AbsoluteRow(3), CQoException);
 
     // A count far beyond the file (2^31 and more: negative as a 32-bit row
@@ -486,27 +410,21 @@ TEST(DbaseInputConfig, SettingsRoundTripThroughTheConfigurationFile)
     CQoInputFilterDbase34 dbf;
     dbf.SkipDeleted(false);
     dbf.CharSet(CQoFile::ansi);
-    dbf.SetFirstRowHasNames(false);
     CQoConfigFile cfg;
     dbf.WriteConfig(cfg, "Eingabe");
     CQoString text = cfg.ToText();
-
     CQoConfigFile back;
     back.FromText(text, std::size_t(text.GetLength()));
-    CQoInputFilterDbase34 copy;
-    EXPECT_TRUE(copy.SkipDeleted());
-    copy.ReadConfig(back, "Eingabe");
-    EXPECT_FALSE(copy.SkipDeleted());
-    EXPECT_EQ(CQoFile::ansi, copy.CharSet());
 
     // A section without the keys keeps the settings.
-    CQoInputFilterDbase34 untouched;
+    CQoInputFilterDbase34 copy, untouched, copied;
+    copy.ReadConfig(back, "Eingabe");
     untouched.ReadConfig(back, "Andere");
+    copied.CopyFrom(dbf);
+    EXPECT_FALSE(copy.SkipDeleted());
+    EXPECT_EQ(CQoFile::ansi, copy.CharSet());
     EXPECT_TRUE(untouched.SkipDeleted());
     EXPECT_EQ(CQoFile::ascii, untouched.CharSet());
-
-    CQoInputFilterDbase34 copied;
-    copied.CopyFrom(dbf);
     EXPECT_FALSE(copied.SkipDeleted());
 }
 

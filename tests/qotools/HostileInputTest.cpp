@@ -69,40 +69,33 @@ TEST(HostileSettings, OutOfBoundNumbersRaiseNamingTheSetting)
         {"output with 2^31-1 columns", "[s]\ncolumns=2147483647\n", "columns", 3},
         {"dBase output with 100 million columns", "[s]\ncolumns=100000000\n", "columns", 4},
     };
+    // Each reads the project into its filter and checks that nothing out of bounds was kept.
+    std::function<std::string(CQoConfigFile &)> const readers[] = {
+        [](CQoConfigFile &cfg) {
+            CQoInputFilterTextFix f;
+            std::string message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
+            EXPECT_LE(f.RecordLen(), qolimits::maxRecordLength);
+            return message;
+        },
+        [](CQoConfigFile &cfg) {
+            CQoInputFilterTextVF f;
+            std::string message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
+            EXPECT_EQ(0, f.NumCols()) << "a refused layout is not taken over";
+            return message;
+        },
+        [](CQoConfigFile &cfg) {
+            CQoOutputFilterTextFix f;
+            std::string message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
+            EXPECT_LE(f.RecordLength(), qolimits::maxRecordLength);
+            return message;
+        },
+        [](CQoConfigFile &cfg) { CQoOutputFilterTextVar f; return ErrorOf([&] { f.ReadConfig(cfg, "s"); }); },
+        [](CQoConfigFile &cfg) { CQoOutputFilterDbase f; return ErrorOf([&] { f.ReadConfig(cfg, "s"); }); },
+    };
     for (Case const &c : cases) {
         SCOPED_TRACE(c.what);
         CQoConfigFile cfg = Project(c.project);
-        std::string message;
-        switch (c.which) {
-        case 0: {
-            CQoInputFilterTextFix f;
-            message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
-            EXPECT_LE(f.RecordLen(), qolimits::maxRecordLength);
-            break;
-        }
-        case 1: {
-            CQoInputFilterTextVF f;
-            message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
-            EXPECT_EQ(0, f.NumCols()) << "a refused layout is not taken over";
-            break;
-        }
-        case 2: {
-            CQoOutputFilterTextFix f;
-            message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
-            EXPECT_LE(f.RecordLength(), qolimits::maxRecordLength);
-            break;
-        }
-        case 3: {
-            CQoOutputFilterTextVar f;
-            message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
-            break;
-        }
-        default: {
-            CQoOutputFilterDbase f;
-            message = ErrorOf([&] { f.ReadConfig(cfg, "s"); });
-            break;
-        }
-        }
+        std::string message = readers[c.which](cfg);
         EXPECT_NE(std::string::npos, message.find(c.key)) << message;
     }
 

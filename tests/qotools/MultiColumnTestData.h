@@ -23,7 +23,6 @@ public:
     bool NextRow() override { return m_lCurrentRow >= 0 && AbsoluteRow(m_lCurrentRow + 1); }
     bool AbsoluteRow(long row) override
     {
-        ++moves;
         if (row < 0 || row >= static_cast<long>(m_rows.size())) {
             m_lCurrentRow = -1;
             return false;
@@ -33,14 +32,11 @@ public:
     }
     void Value(int col, CQoString &value) override
     {
-        ++reads;
         value.Empty();
         if (m_lCurrentRow >= 0 && col >= 0 && col < static_cast<int>(m_rows[m_lCurrentRow].size()))
             value = m_rows[m_lCurrentRow][col].c_str();
     }
     Rows m_rows;
-    int moves = 0;
-    int reads = 0;
 
 protected:
     long CalculateRecordCount() override { return static_cast<long>(m_rows.size()); }

@@ -4,40 +4,42 @@
 
 #include <string>
 
-TEST(PatternMatcher, QuestionMarkTakesExactlyOneCharacter)
+TEST(PatternMatcher, MatchesWildcardsIgnoringCaseOnRequest)
 {
-    CPatternMatcher drive("?:");
-    EXPECT_TRUE(drive.Match("C:"));
-    EXPECT_TRUE(drive.Match("z:"));
-    EXPECT_FALSE(drive.Match("C:\\"));
-    EXPECT_FALSE(drive.Match(":"));
-    EXPECT_FALSE(drive.Match("Daten"));
-    EXPECT_FALSE(drive.Match(""));
-    EXPECT_FALSE(drive.Match(nullptr));
-    EXPECT_STREQ("?:", drive.GetPattern());
-}
+    struct Case {
+        char const *pattern, *text;
+        bool ignoreCase, match;
+    } const cases[] = {
+        // ? takes exactly one character.
+        {"?:", "C:", true, true},
+        {"?:", "C:\\", true, false},
+        {"?:", ":", true, false},
+        {"?:", "", true, false},
+        {"?:", nullptr, true, false},
+        // * takes any run of characters, the empty one too.
+        {"*.txt", "kunden.txt", true, true},
+        {"*.txt", ".txt", true, true},
+        {"*.txt", "kunden.txt.bak", true, false},
+        {"k*n*.t?t", "kunden.txt", true, true},
+        {"*a*b", "aaab", true, true},
+        {"*a*b", "aaba", true, false},
+        {"***", "", true, true},
+        {"", "", true, true},
+        {"", "a", true, false},
+        {nullptr, nullptr, true, true},
+        {"a*", "a", true, true},
+        {"a*?", "a", true, false},
+        // Case, umlauts included (capital and small a-umlaut).
+        {"KUNDEN.*", "kunden.txt", true, true},
+        {"\xC4nderung*", "\xE4NDERUNG.doc", true, true},
+        {"KUNDEN.*", "kunden.txt", false, false},
+    };
+    for (auto const &c : cases) {
+        SCOPED_TRACE(std::string(c.pattern ? c.pattern : "(null)") + " / " + (c.text ? c.text : "(null)"));
+        EXPECT_EQ(c.match, CPatternMatcher::Match(c.pattern, c.text, c.ignoreCase));
+    }
 
-TEST(PatternMatcher, StarTakesAnyRunOfCharacters)
-{
-    EXPECT_TRUE(CPatternMatcher::Match("*.txt", "kunden.txt"));
-    EXPECT_TRUE(CPatternMatcher::Match("*.txt", ".txt"));
-    EXPECT_FALSE(CPatternMatcher::Match("*.txt", "kunden.txt.bak"));
-    EXPECT_TRUE(CPatternMatcher::Match("k*n*.t?t", "kunden.txt"));
-    EXPECT_TRUE(CPatternMatcher::Match("*a*b", "aaab"));
-    EXPECT_FALSE(CPatternMatcher::Match("*a*b", "aaba"));
-    EXPECT_TRUE(CPatternMatcher::Match("***", ""));
-    EXPECT_TRUE(CPatternMatcher::Match("", ""));
-    EXPECT_FALSE(CPatternMatcher::Match("", "a"));
-    EXPECT_TRUE(CPatternMatcher::Match(nullptr, nullptr));
-    EXPECT_TRUE(CPatternMatcher::Match("a*", "a"));
-    EXPECT_FALSE(CPatternMatcher::Match("a*?", "a"));
-}
-
-TEST(PatternMatcher, CaseIsIgnoredByDefaultUmlautsIncluded)
-{
-    EXPECT_TRUE(CPatternMatcher::Match("KUNDEN.*", "kunden.txt"));
-    EXPECT_TRUE(CPatternMatcher::Match("\xC4nderung*", "\xE4NDERUNG.doc")); // capital and small a-umlaut
-    EXPECT_FALSE(CPatternMatcher::Match("KUNDEN.*", "kunden.txt", false));
+    // A matcher object keeps its pattern and case setting.
     CPatternMatcher exact("Abc", false);
     EXPECT_FALSE(exact.Match("abc"));
     exact.SetIgnoreCase(true);

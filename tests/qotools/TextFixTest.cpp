@@ -9,13 +9,7 @@
 #include <gtest/gtest.h>
 
 namespace {
-void SetColumns(CQoInputFilterTextFix &f, std::vector<int> const &lengths)
-{
-    f.SetNumCols(static_cast<int>(lengths.size()));
-    for (std::size_t i = 0; i < lengths.size(); ++i)
-        f.ColLen(static_cast<int>(i), lengths[i]);
-}
-void SetColumns(CQoInputFilterTextVF &f, std::vector<int> const &lengths)
+template <class Filter> void SetColumns(Filter &f, std::vector<int> const &lengths)
 {
     f.SetNumCols(static_cast<int>(lengths.size()));
     for (std::size_t i = 0; i < lengths.size(); ++i)
@@ -89,25 +83,6 @@ TEST(TextFixRecords, AShortLastRecordIsReportedTrailingLineEndsAreNot)
     EXPECT_EQ(2u, AllRows(f).size());
 }
 
-TEST(TextFixRecords, SettingsRoundTripThroughTheConfiguration)
-{
-    CQoInputFilterTextFix a;
-    a.RecordLen(80);
-    SetColumns(a, {10, 30, 40});
-    a.SetFirstRowHasNames(true);
-    CQoConfigFile cfg;
-    a.WriteConfig(cfg, "fix");
-    CQoInputFilterTextFix b;
-    b.ReadConfig(cfg, "fix");
-    EXPECT_EQ(80, b.RecordLen());
-    ASSERT_EQ(3, b.NumCols());
-    EXPECT_EQ(30, b.ColLen(1));
-    EXPECT_EQ(0, b.ColLen(3));
-    EXPECT_TRUE(b.GetFirstRowHasNames());
-    b.RecordLen(-5);
-    EXPECT_EQ(1, b.RecordLen());
-}
-
 TEST(TextVFLines, LinesAreCutIntoColumnsAndIndexed)
 {
     TempFolder tmp;
@@ -158,17 +133,33 @@ TEST(TextVFLines, TextBeyondTheLastColumnIsDefective)
     EXPECT_EQ((Row{"ab", ""}), rows[2]);
 }
 
-TEST(TextVFLines, SettingsRoundTripThroughTheConfiguration)
+TEST(TextFixSettings, BothLayoutsRoundTripThroughTheConfiguration)
 {
-    CQoInputFilterTextVF a;
-    SetColumns(a, {3, 7});
-    a.Skip(2);
+    CQoInputFilterTextFix fix;
+    fix.RecordLen(80);
+    SetColumns(fix, {10, 30, 40});
+    fix.SetFirstRowHasNames(true);
+    CQoInputFilterTextVF vf;
+    SetColumns(vf, {3, 7});
+    vf.Skip(2);
     CQoConfigFile cfg;
-    a.WriteConfig(cfg, "vf");
-    CQoInputFilterTextVF b;
-    b.ReadConfig(cfg, "vf");
-    ASSERT_EQ(2, b.NumCols());
-    EXPECT_EQ(7, b.ColLen(1));
-    EXPECT_EQ(10, b.RecordWidth());
-    EXPECT_EQ(2, b.Skip());
+    fix.WriteConfig(cfg, "fix");
+    vf.WriteConfig(cfg, "vf");
+
+    CQoInputFilterTextFix fixBack;
+    fixBack.ReadConfig(cfg, "fix");
+    EXPECT_EQ(80, fixBack.RecordLen());
+    ASSERT_EQ(3, fixBack.NumCols());
+    EXPECT_EQ(30, fixBack.ColLen(1));
+    EXPECT_EQ(0, fixBack.ColLen(3)); // no such column
+    EXPECT_TRUE(fixBack.GetFirstRowHasNames());
+    fixBack.RecordLen(-5);
+    EXPECT_EQ(1, fixBack.RecordLen());
+
+    CQoInputFilterTextVF vfBack;
+    vfBack.ReadConfig(cfg, "vf");
+    ASSERT_EQ(2, vfBack.NumCols());
+    EXPECT_EQ(7, vfBack.ColLen(1));
+    EXPECT_EQ(10, vfBack.RecordWidth());
+    EXPECT_EQ(2, vfBack.Skip());
 }

@@ -92,13 +92,8 @@ TEST(TextVarReading, DosCharacterSetIsReadAsWindows1252)
     WriteBytes(path, "Stra\xE1" "e;\x84rger\r\n\x8E;\x99\x9A\r\n");
     CQoInputFilterTextVar f;
     f.CharSet(CQoFile::ascii);
-    f.SetFirstRowHasNames(true);
     f.Init(path.c_str());
-    CQoString name;
-    f.ColName(0, name);
-    EXPECT_EQ("Stra\xDF" "e", name);
-    ASSERT_TRUE(f.FirstRow());
-    EXPECT_EQ((Row{"\xC4", "\xD6\xDC"}), CurrentRow(f));
+    EXPECT_EQ((std::vector<Row>{{"Stra\xDF" "e", "\xE4rger"}, {"\xC4", "\xD6\xDC"}}), AllRows(f));
 }
 
 TEST(TextVarReading, EmptyAndMissingFiles)
@@ -234,40 +229,24 @@ TEST(TextVarDefects, HookSkipsTakesOverOrStops)
     }
 }
 
-namespace {
-int correctionCalls = 0;
-int CorrectOnce(CQoString &record)
-{
-    ++correctionCalls;
-    record = "3;4,5";
-    return 1;
-}
-int GiveUp(CQoString &)
-{
-    ++correctionCalls;
-    return 0;
-}
-} // namespace
-
 TEST(TextVarDefects, ATakenOverRecordThatStillDoesNotFitGoesToTheCorrection)
 {
     TempFolder tmp;
     std::string path = tmp.Path("c.csv");
     WriteBytes(path, "a;b\n3;4;5\n6;7\n");
+    static int corrections;
+    corrections = 0;
     {
         RepairScript script({CQoInterActive::repairTakeOver}, {"3;4;5;6"});
-        CQoInterActive::SetCorrectRepair(&CorrectOnce);
-        correctionCalls = 0;
+        CQoInterActive::SetCorrectRepair(+[](CQoString &record) { ++corrections; record = "3;4,5"; return 1; });
         VarPtr f(OpenVar(path, ';', true));
-        std::vector<Row> rows = AllRows(*f);
-        EXPECT_EQ(1, correctionCalls);
-        ASSERT_EQ(2u, rows.size());
-        EXPECT_EQ((Row{"3", "4,5"}), rows[0]);
-        EXPECT_EQ((Row{"6", "7"}), rows[1]);
+        EXPECT_EQ((std::vector<Row>{{"3", "4,5"}, {"6", "7"}}), AllRows(*f));
+        EXPECT_EQ(1, corrections);
     }
     {
+        // The correction gives up: the record raises.
         RepairScript script({CQoInterActive::repairTakeOver}, {"3;4;5;6"});
-        CQoInterActive::SetCorrectRepair(&GiveUp);
+        CQoInterActive::SetCorrectRepair(+[](CQoString &) { return 0; });
         VarPtr f(OpenVar(path, ';', true));
         EXPECT_THROW(f->FirstRow(), CQoException);
     }
@@ -319,6 +298,8 @@ TEST(TextVarSettings, ConfigurationRoundTripAndCopy)
     c.CopyFrom(a);
     EXPECT_EQ('\t', c.Delimiter());
     EXPECT_EQ(3, c.Skip());
+    c.CharSet(12345); // not a character set: ignored
+    EXPECT_EQ(CQoFile::ansimix, c.CharSet());
     EXPECT_THROW(c.Delimiter('\n'), CQoException);
 
     CQoString line;
