@@ -205,8 +205,11 @@ void CMainDlg::MakeInputPage()
     if (m_inputPage) {
         m_inputPage->Create(this);
         m_inputPage->AddModifiedListener(this);
-        // The file database's page selects the filter's table only now.
-        m_inputPage->UpdateInputFilter(0);
+        // The file database's page lists the tables when it opens and selects
+        // the filter's table only when asked; the other pages have read their
+        // filter already.
+        if (m_inputKind == CConversion::inputDatabase)
+            m_inputPage->UpdateInputFilter(0);
     }
     m_bRebuilding = false;
     FollowInput();

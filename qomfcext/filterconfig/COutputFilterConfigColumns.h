@@ -151,6 +151,19 @@ protected:
     // the selected column named `name`; false after telling the user.
     bool CheckTypeAndLength(const char* name, int maxLength);
 
+    // For a column structure with a type and a length (nType, nLength):
+    // a new column of the given type and length,
+    template <class TCol>
+    static TCol TypedColumn(int type, int length);
+    // column `row` of `columns` (-1: none) into the type combo and the length edit,
+    template <class TCol>
+    void ShowTypedColumn(int row, const CArray<TCol, TCol&>& columns);
+    // and the type combo and the length edit into `col`; false, after telling
+    // the user, when they are refused. A numeric field has no length of its
+    // own: the text length stays for a later change back to text.
+    template <class TCol>
+    bool TakeTypeAndLength(TCol& col, int maxLength);
+
     afx_msg void OnItemchangedList(NMHDR* pNMHDR, LRESULT* pResult);
     afx_msg void OnApply();
     afx_msg void OnSelchangeType();
@@ -195,5 +208,31 @@ bool COutputFilterConfigColumns::ColumnAt(const CArray<TCol, TCol&>& columns, in
     if (index < 0 || index >= columns.GetSize())
         return false;
     col = columns[index];
+    return true;
+}
+
+template <class TCol>
+TCol COutputFilterConfigColumns::TypedColumn(int type, int length)
+{
+    TCol col;
+    col.nType = type;
+    col.nLength = length;
+    return col;
+}
+
+template <class TCol>
+void COutputFilterConfigColumns::ShowTypedColumn(int row, const CArray<TCol, TCol&>& columns)
+{
+    ShowTypeAndLength(row, row >= 0 ? columns[row].nType : 0, row >= 0 ? columns[row].nLength : 0);
+}
+
+template <class TCol>
+bool COutputFilterConfigColumns::TakeTypeAndLength(TCol& col, int maxLength)
+{
+    if (!CheckTypeAndLength(col.strName, maxLength))
+        return false;
+    col.nType = TypeOfIndex(m_nFieldType);
+    if (col.nType == 2)
+        col.nLength = m_nFieldLen;
     return true;
 }

@@ -87,35 +87,26 @@ bool COutputFilterConfigDao::CellText(int row, int col, CString& text) const
 
 void COutputFilterConfigDao::ShowColumn(int row)
 {
-    const SCol* pCol = row >= 0 ? &m_arrColumns[row] : NULL;
-    ShowTypeAndLength(row, pCol ? pCol->nType : 0, pCol ? pCol->nLength : 0);
-    if (pCol != NULL) {
-        m_bIndexed = pCol->bIndexed ? TRUE : FALSE;
+    ShowTypedColumn(row, m_arrColumns);
+    if (row >= 0) {
+        m_bIndexed = m_arrColumns[row].bIndexed ? TRUE : FALSE;
         CheckDlgButton(IDC_OUTDAO_INDEXED, m_bIndexed);
     }
-    GetDlgItem(IDC_OUTDAO_INDEXED)->EnableWindow(pCol != NULL);
+    GetDlgItem(IDC_OUTDAO_INDEXED)->EnableWindow(row >= 0);
 }
 
 bool COutputFilterConfigDao::TakeSelectedColumn()
 {
     SCol& col = m_arrColumns[m_nSelIndex];
-    if (!CheckTypeAndLength(col.strName, maxTextLen))
+    if (!TakeTypeAndLength(col, maxTextLen))
         return false;
-    col.nType = TypeOfIndex(m_nFieldType);
-    // A numeric field has no length of its own: the one it had stays for a
-    // later change back to text.
-    if (col.nType == 2)
-        col.nLength = m_nFieldLen;
     col.bIndexed = m_bIndexed != 0;
     return true;
 }
 
 bool COutputFilterConfigDao::LoadColumnsFromSource()
 {
-    SCol fresh;
-    fresh.nLength = defaultLen;
-    fresh.nType = defaultType;
-    return LoadColumns(m_arrColumns, fresh, false);
+    return LoadColumns(m_arrColumns, TypedColumn<SCol>(defaultType, defaultLen), false);
 }
 
 void COutputFilterConfigDao::UpdateOutputFilter(int nSave)

@@ -77,28 +77,18 @@ bool COutputFilterConfigDbase::CellText(int row, int col, CString& text) const
 
 void COutputFilterConfigDbase::ShowColumn(int row)
 {
-    ShowTypeAndLength(row, row >= 0 ? m_arrColumns[row].nType : 0, row >= 0 ? m_arrColumns[row].nLength : 0);
+    ShowTypedColumn(row, m_arrColumns);
 }
 
+// A numeric field is always numericLen wide.
 bool COutputFilterConfigDbase::TakeSelectedColumn()
 {
-    SCol& col = m_arrColumns[m_nSelIndex];
-    if (!CheckTypeAndLength(col.strName, maxTextLen))
-        return false;
-    col.nType = TypeOfIndex(m_nFieldType);
-    // A numeric field is always numericLen wide: the text length stays for a
-    // later change back to text.
-    if (col.nType == 2)
-        col.nLength = m_nFieldLen;
-    return true;
+    return TakeTypeAndLength(m_arrColumns[m_nSelIndex], maxTextLen);
 }
 
 bool COutputFilterConfigDbase::LoadColumnsFromSource()
 {
-    SCol fresh;
-    fresh.nLength = defaultLen;
-    fresh.nType = defaultType;
-    return LoadColumns(m_arrColumns, fresh, false);
+    return LoadColumns(m_arrColumns, TypedColumn<SCol>(defaultType, defaultLen), false);
 }
 
 void COutputFilterConfigDbase::UpdateOutputFilter(int nSave)
