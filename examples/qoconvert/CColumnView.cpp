@@ -6,7 +6,7 @@
 
 #include <algorithm>
 
-CColumnView::CColumnView(CQoOutputSource* composed) : m_pComposed(composed), m_bFrozen(false)
+CColumnView::CColumnView(CQoOutputSource* composed) : m_pComposed(composed)
 {
 }
 
@@ -46,50 +46,16 @@ CColumnView::Selection CColumnView::GetSelection()
     return selection;
 }
 
-void CColumnView::FreezeView()
+void CColumnView::ReadValue(long row, int column, CQoString& value)
 {
-    ThawView();
-    // Capitals and umlaut folding change the text: those go the long way.
-    if (GetUseCapitals() || GetNoUmlaute())
-        return;
-    for (int i = 0, n = GetEntryCount(); i < n; ++i) {
-        CEntry entry;
-        if (GetEntry(i, entry) && entry.GetSelected())
-            m_frozen.push_back(entry.GetColumn());
-    }
-    m_bFrozen = true;
+    if (m_pComposed != nullptr)
+        m_pComposed->GetValue(row, column, value);
 }
 
-void CColumnView::GetValue(long row, int col, CQoString& value)
+void CColumnView::ReadName(int column, CQoString& name)
 {
-    if (!m_bFrozen) {
-        COutputFilterSource::GetValue(row, col, value);
-        return;
-    }
-    value.Empty();
-    if (m_pComposed == nullptr || col < 0 || col >= static_cast<int>(m_frozen.size()))
-        return;
-    m_pComposed->GetValue(row, m_frozen[static_cast<size_t>(col)], value);
-}
-
-void CColumnView::GetSourceValue(long row, int column, CString& value)
-{
-    value.Empty();
-    if (m_pComposed == nullptr)
-        return;
-    CQoString text;
-    m_pComposed->GetValue(row, column, text);
-    value.SetString(text.GetString(), text.GetLength());
-}
-
-void CColumnView::GetSourceName(int column, CString& name, int /*flag*/)
-{
-    name.Empty();
-    if (m_pComposed == nullptr)
-        return;
-    CQoString text;
-    m_pComposed->GetColumnName(column, text);
-    name.SetString(text.GetString(), text.GetLength());
+    if (m_pComposed != nullptr)
+        m_pComposed->GetColumnName(column, name);
 }
 
 int CColumnView::NumSourceColumns()

@@ -9,14 +9,14 @@
 // mapping simply comes back as a new one.
 #pragma once
 
-#include <COutputFilterSource.h>
-
 #include <utility>
 #include <vector>
 
+#include "CFreezableSource.h"
+
 class CQoOutputSource;
 
-class CColumnView : public COutputFilterSource
+class CColumnView : public CFreezableSource
 {
 public:
     // A column's name and whether it is written, in output order.
@@ -31,23 +31,13 @@ public:
     // The entry list as it stands (built first if it never was).
     Selection GetSelection();
 
-    // For a run that leaves the selection alone: the written columns are
-    // taken once and each value goes straight from the composed source into
-    // the caller's text. Any change of the entries afterwards needs
-    // FreezeView again, or ThawView.
-    void FreezeView();
-    void ThawView() { m_frozen.clear(); m_bFrozen = false; }
-
-    void GetValue(long row, int col, CQoString& value) override;
-    using COutputFilterSource::GetValue;
-
-    void GetSourceValue(long row, int column, CString& value) override;
-    void GetSourceName(int column, CString& name, int flag) override;
     int NumSourceColumns() override;
     long NumSourceRows() override;
 
+protected:
+    void ReadValue(long row, int column, CQoString& value) override;
+    void ReadName(int column, CQoString& name) override;
+
 private:
     CQoOutputSource* m_pComposed;   // not owned
-    std::vector<int> m_frozen;      // the composed column of each output column
-    bool m_bFrozen;
 };

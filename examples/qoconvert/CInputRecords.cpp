@@ -2,37 +2,8 @@
 
 #include <CQoString.h>
 
-CInputRecords::CInputRecords(CQoInputFilter* filter)
-    : m_pFilter(filter), m_lRow(-1), m_bFrozen(false)
+CInputRecords::CInputRecords(CQoInputFilter* filter) : m_pFilter(filter), m_lRow(-1)
 {
-}
-
-void CInputRecords::FreezeView()
-{
-    m_frozen.clear();
-    m_bFrozen = false;
-    // Capitals and umlaut folding change the text: those go the long way.
-    if (GetUseCapitals() || GetNoUmlaute())
-        return;
-    for (int i = 0, n = GetEntryCount(); i < n; ++i) {
-        CEntry entry;
-        GetEntry(i, entry);
-        if (entry.GetSelected())
-            m_frozen.push_back(entry.GetColumn());
-    }
-    m_bFrozen = true;
-}
-
-void CInputRecords::GetValue(long row, int col, CQoString& value)
-{
-    if (!m_bFrozen) {
-        COutputFilterSource::GetValue(row, col, value);
-        return;
-    }
-    value.Empty();
-    if (col < 0 || col >= static_cast<int>(m_frozen.size()) || !MoveTo(row))
-        return;
-    m_pFilter->Value(m_frozen[col], value);
 }
 
 void CInputRecords::SetInputFilter(CQoInputFilter* filter)
@@ -56,24 +27,16 @@ bool CInputRecords::MoveTo(long row)
     return found;
 }
 
-void CInputRecords::GetSourceValue(long row, int column, CString& value)
+void CInputRecords::ReadValue(long row, int column, CQoString& value)
 {
-    value.Empty();
-    if (!MoveTo(row))
-        return;
-    CQoString text;
-    m_pFilter->Value(column, text);
-    value.SetString(text.GetString(), text.GetLength());
+    if (MoveTo(row))
+        m_pFilter->Value(column, value);
 }
 
-void CInputRecords::GetSourceName(int column, CString& name, int /*flag*/)
+void CInputRecords::ReadName(int column, CQoString& name)
 {
-    name.Empty();
-    if (m_pFilter == nullptr)
-        return;
-    CQoString text;
-    m_pFilter->ColName(column, text);
-    name.SetString(text.GetString(), text.GetLength());
+    if (m_pFilter != nullptr)
+        m_pFilter->ColName(column, name);
 }
 
 int CInputRecords::NumSourceColumns()

@@ -10,12 +10,11 @@
 // StandsOn, so that no row is looked for twice.
 #pragma once
 
-#include <COutputFilterSource.h>
 #include <CQoInputFilter.h>
 
-#include <vector>
+#include "CFreezableSource.h"
 
-class CInputRecords : public COutputFilterSource
+class CInputRecords : public CFreezableSource
 {
 public:
     explicit CInputRecords(CQoInputFilter* filter = nullptr);
@@ -23,26 +22,19 @@ public:
     // A new filter (or the same one after new settings): the column view is
     // rebuilt from its columns.
     void SetInputFilter(CQoInputFilter* filter);
-    CQoInputFilter* GetInputFilter() const { return m_pFilter; }
     // The filter stands on `row` (-1: on no known row).
     void StandsOn(long row) { m_lRow = row; }
-    // For a run that leaves the column view alone: the view is taken once,
-    // and a value then goes from the filter straight into the caller's text
-    // (no text in between, no walk over the view per value). Any change of
-    // the view afterwards needs FreezeView again, or ThawView.
-    void FreezeView();
-    void ThawView() { m_frozen.clear(); m_bFrozen = false; }
     // A preview needs only the first rows: with a limit the source counts no
     // further (a large file is not read to its end, and a defective record
     // beyond the limit is not met). 0: every row.
     void SetRowLimit(long limit) { m_lRowLimit = limit > 0 ? limit : 0; }
 
-    void GetValue(long row, int col, CQoString& value) override;
-
-    void GetSourceValue(long row, int column, CString& value) override;
-    void GetSourceName(int column, CString& name, int flag) override;
     int NumSourceColumns() override;
     long NumSourceRows() override;
+
+protected:
+    void ReadValue(long row, int column, CQoString& value) override;
+    void ReadName(int column, CQoString& name) override;
 
 private:
     bool MoveTo(long row);
@@ -50,6 +42,4 @@ private:
     CQoInputFilter* m_pFilter;
     long m_lRow;
     long m_lRowLimit = 0;
-    std::vector<int> m_frozen;   // the filter's column of each output column
-    bool m_bFrozen;
 };

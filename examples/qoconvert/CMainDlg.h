@@ -41,7 +41,6 @@ public:
     int ModifiedListenerSetModified(int bModified, int nNotifierId) override;
     // The conversion started by "Konvertieren" is over (the module's result code).
     void ConversionDone(int code);
-    bool IsConverting() const { return m_hCancel != NULL; }
 
 protected:
     virtual BOOL OnInitDialog();

@@ -31,11 +31,6 @@ int RepairDuringConversion(CQoString const& file, CQoString& data, int& pos)
 }
 }
 
-CQoString CQoConvertApp::InProject(const CQoString& file) const
-{
-    return CConversion::InFolder(m_projectFolder, file);
-}
-
 CQoConvertApp::CQoConvertApp()
     : m_batch(false), m_exitCode(0)
 {

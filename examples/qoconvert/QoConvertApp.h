@@ -37,8 +37,6 @@ public:
     // Makes `folder` (relative to the current folder unless absolute) the
     // project's, with its configuration file; the log moves with it.
     void SetProjectFolder(const CQoString& folder);
-    // A file name of the project, relative to its folder unless absolute.
-    CQoString InProject(const CQoString& file) const;
     // Starts the conversion module on an executer thread. `progress` gets its
     // progress messages (may be NULL); `cancelEvent` names the event that
     // stops it (may be empty). WM_QOCONVERT_DONE arrives when it is over.
