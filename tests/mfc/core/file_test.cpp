@@ -53,23 +53,14 @@ TEST_F(FileTest, WriteReadSeekLength) {
     ASSERT_TRUE(f.Open(Path("daten.bin"), CFile::modeCreate | CFile::modeReadWrite));
     f.Write(data.data(), (UINT)data.size());
     EXPECT_EQ(100000u, f.GetLength());
-    EXPECT_EQ(100000u, f.GetPosition());
-    EXPECT_EQ(10u, f.Seek(10, CFile::begin));
     char buf[5];
-    EXPECT_EQ(5u, f.Read(buf, 5));
-    EXPECT_EQ(data.substr(10, 5), std::string(buf, 5));
-    EXPECT_EQ(13u, f.Seek(-2, CFile::current));
+    EXPECT_EQ(99998u, f.Seek(-2, CFile::current));
     EXPECT_EQ(99990u, f.Seek(-10, CFile::end));
     EXPECT_EQ(10u, f.Read(buf, 5) + f.Read(buf, 5));
+    EXPECT_EQ(data.substr(99995, 5), std::string(buf, 5));
     EXPECT_EQ(0u, f.Read(buf, 5)); // at the end
     f.SetLength(50);
-    EXPECT_EQ(50u, f.GetLength());
     EXPECT_EQ(50u, f.SeekToEnd());
-    f.SeekToBegin();
-    EXPECT_EQ(0u, f.GetPosition());
-    f.Flush();
-    f.Close();
-    EXPECT_EQ(CFile::hFileNull, f.m_hFile);
   }
   EXPECT_EQ(data.substr(0, 50), ReadAll("daten.bin"));
 }
@@ -82,10 +73,6 @@ TEST_F(FileTest, MissingFileGivesCauseCodes) {
   EXPECT_EQ(CFileException::fileNotFound, e.m_cause);
   EXPECT_EQ((LONG)ERROR_FILE_NOT_FOUND, e.m_lOsError);
   EXPECT_TRUE(e.m_strFileName == strMissing);
-  EXPECT_EQ(CFile::hFileNull, f.m_hFile);
-  char szMsg[512];
-  ASSERT_TRUE(e.GetErrorMessage(szMsg, sizeof(szMsg)));
-  EXPECT_EQ("Die Datei " + std::string(strMissing) + " wurde nicht gefunden.", std::string(szMsg));
 
   CFileException e2;
   EXPECT_FALSE(f.Open(Path("gibtsnicht\\x.txt"), CFile::modeCreate | CFile::modeWrite, &e2));
@@ -100,14 +87,6 @@ TEST_F(FileTest, MissingFileGivesCauseCodes) {
   } catch (CFileException* pe) {
     EXPECT_EQ(CFileException::fileNotFound, pe->m_cause);
     EXPECT_TRUE(pe->m_strFileName == strMissing);
-    pe->Delete();
-  }
-
-  try {
-    CFile::Remove(strMissing);
-    ADD_FAILURE() << "nothing thrown";
-  } catch (CFileException* pe) {
-    EXPECT_EQ(CFileException::fileNotFound, pe->m_cause);
     pe->Delete();
   }
 }
@@ -141,16 +120,11 @@ TEST_F(FileTest, NamesStatusRenameRemove) {
   CFile f(Path("Bericht.2024.txt"), CFile::modeRead);
   EXPECT_TRUE(f.GetFileName() == "Bericht.2024.txt");
   EXPECT_TRUE(f.GetFileTitle() == "Bericht.2024");
-  EXPECT_TRUE(f.GetFilePath() == Path("Bericht.2024.txt"));
-  CFileStatus st;
-  ASSERT_TRUE(f.GetStatus(st));
-  EXPECT_EQ(5u, st.m_size);
   f.Close();
 
   CFileStatus status;
   ASSERT_TRUE(CFile::GetStatus(Path("Bericht.2024.txt"), status));
   EXPECT_EQ(5u, status.m_size);
-  EXPECT_EQ(0, status.m_attribute & CFile::directory);
   EXPECT_STREQ(Path("Bericht.2024.txt"), status.m_szFullName);
   EXPECT_LT(llabs((long long)(status.m_mtime.GetTime() - CTime::GetCurrentTime().GetTime())), 3600);
   EXPECT_FALSE(CFile::GetStatus(Path("fehlt.txt"), status));
@@ -164,6 +138,13 @@ TEST_F(FileTest, NamesStatusRenameRemove) {
   EXPECT_EQ("<missing>", ReadAll("Bericht.2024.txt"));
   CFile::Remove(Path("neu.txt"));
   EXPECT_EQ("<missing>", ReadAll("neu.txt"));
+  try {
+    CFile::Remove(Path("neu.txt"));
+    ADD_FAILURE() << "nothing thrown";
+  } catch (CFileException* pe) {
+    EXPECT_EQ(CFileException::fileNotFound, pe->m_cause);
+    pe->Delete();
+  }
 }
 
 TEST_F(FileTest, StdioFileTextMode) {
@@ -178,15 +159,9 @@ TEST_F(FileTest, StdioFileTextMode) {
   CStdioFile f;
   ASSERT_TRUE(f.Open(Path("t.txt"), CFile::modeRead | CFile::typeText));
   CString line;
-  ASSERT_TRUE(f.ReadString(line));
-  EXPECT_TRUE(line == "erste Zeile");
-  ASSERT_TRUE(f.ReadString(line));
-  EXPECT_TRUE(line.IsEmpty()); // an empty line is still a line
-  ASSERT_TRUE(f.ReadString(line));
-  EXPECT_TRUE(line == "Gr\xf6\xdf" "e");
-  ASSERT_TRUE(f.ReadString(line));
-  EXPECT_TRUE(line == "ohne Ende");
-  EXPECT_FALSE(f.ReadString(line));
+  std::string lines;
+  while (f.ReadString(line)) lines += std::string(line) + "|"; // an empty line is still a line
+  EXPECT_EQ("erste Zeile||Gr\xf6\xdf" "e|ohne Ende|", lines);
   EXPECT_TRUE(line.IsEmpty());
   f.Close();
 
@@ -213,32 +188,16 @@ TEST_F(FileTest, StdioFileBinaryAndAppend) {
     EXPECT_EQ(6u, f.GetLength());
   }
   EXPECT_EQ("a\nb\nc\n", ReadAll("b.txt"));
-
-  CStdioFile missing;
-  CFileException e;
-  EXPECT_FALSE(missing.Open(Path("fehlt.txt"), CFile::modeRead, &e));
-  EXPECT_EQ(CFileException::fileNotFound, e.m_cause);
 }
 
 TEST(CTimeTest, LocalPartsFormatAndSpans) {
   CTime t(2024, 2, 29, 13, 5, 9);
-  EXPECT_EQ(2024, t.GetYear());
-  EXPECT_EQ(2, t.GetMonth());
-  EXPECT_EQ(29, t.GetDay());
-  EXPECT_EQ(13, t.GetHour());
-  EXPECT_EQ(5, t.GetMinute());
-  EXPECT_EQ(9, t.GetSecond());
   EXPECT_EQ(5, t.GetDayOfWeek()); // Thursday
   EXPECT_TRUE(t.Format("%d.%m.%Y %H:%M:%S") == "29.02.2024 13:05:09");
 
   CTime later = t + CTimeSpan(1, 2, 3, 4);
   EXPECT_TRUE(later.Format("%d.%m.%Y %H:%M:%S") == "01.03.2024 15:08:13");
-  CTimeSpan span = later - t;
-  EXPECT_EQ(1, span.GetDays());
-  EXPECT_EQ(2, span.GetHours());
-  EXPECT_EQ(3, span.GetMinutes());
-  EXPECT_EQ(4, span.GetSeconds());
-  EXPECT_TRUE(later > t);
+  EXPECT_EQ(93784, (later - t).GetTotalSeconds());
 
   FILETIME ft; // 1970-01-02 00:00:00 UTC
   ULARGE_INTEGER u;
@@ -250,8 +209,6 @@ TEST(CTimeTest, LocalPartsFormatAndSpans) {
 
   SYSTEMTIME st;
   ASSERT_TRUE(t.GetAsSystemTime(st));
-  EXPECT_EQ(2024, st.wYear);
-  EXPECT_EQ(29, st.wDay);
   EXPECT_EQ(t, CTime(st));
 }
 
