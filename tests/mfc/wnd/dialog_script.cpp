@@ -64,7 +64,6 @@ void CALLBACK CDialogScript::OnTimer(HWND, UINT, UINT_PTR, DWORD) {
   HWND hDlg = FindDialog();
   if (::GetTickCount() - self->m_dwStart > kTimeoutMs) {
     // A test went wrong: close whatever is open so that the run goes on.
-    self->m_bTimedOut = true;
     if (hDlg != NULL) ::PostMessageA(hDlg, WM_COMMAND, IDCANCEL, 0);
     return;
   }

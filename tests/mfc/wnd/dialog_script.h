@@ -22,7 +22,6 @@ public:
   CDialogScript& AnswerBox(int nButton);
 
   bool Done() const { return m_steps.empty(); }
-  bool TimedOut() const { return m_bTimedOut; }
   struct Box {
     std::string text;
     std::string caption;
@@ -41,7 +40,6 @@ private:
   std::vector<Box> m_boxes;
   HWND m_hLast = NULL;
   bool m_bBusy = false;
-  bool m_bTimedOut = false;
   DWORD m_dwStart;
   UINT_PTR m_nTimer;
 };

@@ -7,8 +7,6 @@
 #define IDD_EXT_CHILD 9101
 // In the DLL and in the test program: the program's text wins
 #define IDS_BOTH 9002
-// Only in the test program
-#define IDS_APP_ONLY 9003
 
 #define IDC_NAME 1001
 #define IDC_COUNT 1002
