@@ -4,8 +4,8 @@
 
 #include <windows.h>
 
-// An unknown driver, and a database file that is gone (the driver must not
-// make a new empty one in its place).
+// No driver named, and a database file that is gone (the driver must not make
+// a new empty one in its place).
 TEST(DbConnect, FailureCarriesTheDriverDiagnostics) {
   std::string missing = (std::filesystem::temp_directory_path() / UniqueLeaf("qo_missing_")).string() + ".db";
   struct Case {
@@ -14,7 +14,6 @@ TEST(DbConnect, FailureCarriesTheDriverDiagnostics) {
     const char* origin;       // expected in m_strStateNativeOrigin
   } cases[] = {
       {"Database=x", "IM002", "State:IM002,Native:0,Origin:[unixODBC][Driver Manager]"},
-      {"Driver={No Such Driver 42};Database=x", "", "State:01000,Native:0,Origin:[unixODBC][Driver Manager]"},
       {"ODBC;Driver=SQLite3;NoCreat=1;Database=" + missing, "", "State:"},
   };
   for (const Case& c : cases) {
@@ -61,34 +60,20 @@ TEST(DbConnect, WindowsPathsReachTheDriverAsTheSameFile) {
   }
 }
 
-TEST(DbConnect, BadDatabaseFilesRaiseClearErrors) {
-  std::string notDb = (std::filesystem::temp_directory_path() / (UniqueLeaf("qo_text_") + ".db")).string();
-  std::ofstream(notDb, std::ios::binary) << std::string(4096, 'x');
+TEST(DbConnect, AReadOnlyConnectionRefusesToWrite) {
   std::string readOnly = (std::filesystem::temp_directory_path() / (UniqueLeaf("qo_ro_") + ".db")).string();
   {
     CDatabase db;
     db.OpenEx(("Driver=SQLite3;Database=" + readOnly).c_str());
     db.ExecuteSQL("create table t (a varchar(10))");
   }
-  struct Case {
-    std::string connect;
-    DWORD options;
-    const char* expected;   // in the message
-  } cases[] = {
-      {"Driver=SQLite3;Database=" + notDb, 0, "not a database"},
-      {"Driver=SQLite3;Database=" + readOnly, CDatabase::openReadOnly, "readonly"},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.connect);
-    CString strError = DbError([&] {
-      CDatabase db;
-      db.OpenEx(c.connect.c_str(), c.options);
-      db.ExecuteSQL("insert into t values ('x')");
-    });
-    EXPECT_GE(strError.Find(c.expected), 0) << (LPCSTR)strError;
-  }
+  CString strError = DbError([&] {
+    CDatabase db;
+    db.OpenEx(("Driver=SQLite3;Database=" + readOnly).c_str(), CDatabase::openReadOnly);
+    db.ExecuteSQL("insert into t values ('x')");
+  });
+  EXPECT_GE(strError.Find("readonly"), 0) << (LPCSTR)strError;
   std::error_code ignored;
-  std::filesystem::remove(notDb, ignored);
   std::filesystem::remove(readOnly, ignored);
 }
 
@@ -106,27 +91,8 @@ TEST_P(DbConnectTest, StatementFailuresRaiseAndNoRowsIsNoFailure) {
   EXPECT_EQ(0, Count("mfcdb_noop"));
 }
 
-TEST_P(DbConnectTest, MissingDatabaseIsAConnectFailure) {
-  CString strConnect = m_strConnect;
-  if (IsPostgres())
-    strConnect.Replace("Database=qotest", "Database=qo_missing_db");
-  else
-    strConnect = ("Driver=SQLite3;NoCreat=1;Database=" + UniqueLeaf("qo_gone_") + ".db").c_str();
-  CDatabase db;
-  CString strState;
-  CString strError = DbError([&] { db.OpenEx(strConnect); }, nullptr, &strState);
-  EXPECT_FALSE(strError.IsEmpty());
-  EXPECT_FALSE(strState.IsEmpty());
-  if (IsPostgres()) {
-    EXPECT_GE(strError.Find("qo_missing_db"), 0) << (LPCSTR)strError;
-  }
-  EXPECT_FALSE(db.IsOpen());
-}
-
 TEST_P(DbConnectTest, ConnectionIsPreparedForFlatReading) {
-  CString strConnect = m_db.GetConnect();
   if (IsPostgres()) {
-    EXPECT_EQ("PostgreSQL", m_db.GetDatabaseName());
     EXPECT_EQ(CDatabase::textBytes, m_db.GetTextForm());
     const char* pszLog = std::getenv("QO_PG_LOG");
     if (pszLog == nullptr) GTEST_SKIP() << "QO_PG_LOG names no statement log";
@@ -138,9 +104,8 @@ TEST_P(DbConnectTest, ConnectionIsPreparedForFlatReading) {
     // The driver reads through a server cursor in slices, not the whole result.
     EXPECT_NE(std::string::npos, log.find("fetch 10000 in")) << log.substr(log.size() > 2000 ? log.size() - 2000 : 0);
   } else {
-    EXPECT_EQ("SQLite", m_db.GetDatabaseName());
     EXPECT_EQ(CDatabase::textUtf8, m_db.GetTextForm());
-    EXPECT_GE(strConnect.Find("StepAPI=1"), 0) << (LPCSTR)strConnect;
+    EXPECT_GE(m_db.GetConnect().Find("StepAPI=1"), 0) << (LPCSTR)m_db.GetConnect();
   }
 }
 
