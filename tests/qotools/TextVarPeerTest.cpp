@@ -141,7 +141,4 @@ TEST(TextVarPeer, ReadsAsPythonCsvReadsTheSameDialect)
                 << " round " << round;
         }
     }
-    // The named cases once more, by hand.
-    WriteBytes(path, "a,\"b,c\",\"d\"\"e\"\r\n\"zwei\r\nZeilen\",,\n\n\"\",x,\"letzte\"");
-    EXPECT_EQ(PythonRows(folder, ',', '"', 0), OurRows(path, ',', '"', 0));
 }
