@@ -1,7 +1,6 @@
 // The function dialogs on real windows: combinations composed by choosing
 // functions and answering the separator question, the function manager
-// dialog's lists and buttons, names typed into the input dialog, refusals
-// with their messages, and the manager the caller gets back after OK.
+// dialog's lists and buttons, names typed into the input dialog and refusals.
 #include <gtest/gtest.h>
 
 #include <sstream>
@@ -9,7 +8,6 @@
 #include <vector>
 
 #include "CCombiColumnConfig.h"
-#include "CFuncToNamesDlg.h"
 #include "CFunctionManagerConfig.h"
 #include "MfcTestHost.h"
 #include "resource.h"
@@ -195,7 +193,6 @@ TEST(CombiColumnConfig, RefusesShortAndDefinedCombinationsAndKeepsTheParts)
     } cases[] = {
         {{{"Name", nullptr, false}}, "Eine Kombination muss aus mindestens 2 Einzelfeldern bestehen!", 20003, 29999},
         {{{"Vorname", nullptr, false}, {"Name", " ", true}}, kExists, 20003, 29999},  // only the flag differs
-        {{{"Ort", nullptr, false}, {"PLZ", "x", false}}, kExists, 20003, 29999},
         {{{"Ort", nullptr, false}, {"PLZ", "X", false}}, nullptr, 20003, 29999},    // differs in case only
         {{{"Ort", nullptr, false}, {"Name", ": ", false}}, nullptr, 19000, 29999},  // next below the range
         {{{"Ort", nullptr, false}, {"Name", ": ", false}}, nullptr, 20001, 29999},  // next held
@@ -229,29 +226,6 @@ TEST(CombiColumnConfig, RefusesShortAndDefinedCombinationsAndKeepsTheParts)
             EXPECT_EQ(std::string(c.parts[0].function) + last.separator + last.function,
                       Function(dlg.GetFunctionManager(), 20003));
     }
-}
-
-TEST(CombiColumnConfig, EditingChangesPartsInPlaceAndMayKeepThem)
-{
-    // Delete the first of three parts: the former second keeps its separator;
-    // add another. The edited combination is not another one: no refusal.
-    CFunctionManager m = Sample();
-    CFunction three =
-        Combination(20002, "PLZ Ort, Kunde", {CPart(3, "", false), CPart(4, " ", false), CPart(10000, ", ", false)});
-    Add(m, three);
-    CCombiColumnConfig edit(m, true);
-    edit.SetCombination(three.GetCombination(), 20002);
-    Answering(Composing({{"Name", " / ", true}},
-                        [](Dialog& d) {
-                            DeleteRow(d, 0);
-                            EXPECT_EQ((Texts{" /Ort/false", ", /Kunde/false", " / /Name/true"}), Rows(d));
-                            EXPECT_EQ(" Ort, Kunde / Name", d.Text(IDC_COMBI_NAME));
-                            d.Press(IDOK);
-                        }),
-              [&] { EXPECT_EQ(IDOK, edit.DoModal()); }, 8000);
-    EXPECT_EQ(CString(" Ort, Kunde / Name"), edit.GetCombinationName());
-    EXPECT_EQ(3u, edit.GetCombination().size());
-    EXPECT_EQ(Dump(m), Dump(edit.GetFunctionManager())) << "editing adds nothing to the manager";
 }
 
 TEST(FunctionManagerConfig, ListsTheGroupsAndEnablesEditingOnlyForUnusedFunctions)
@@ -317,7 +291,6 @@ TEST(FunctionManagerConfig, NamesAreRefusedOrGivenTheFirstFreeId)
         long next, max, expected;
         bool deleteKunde;
     } cases[] = {
-        {IDC_FUNC_USER_NEW, "ORT", kInUse, 10002, 19999, 0, false},
         {IDC_FUNC_USER_NEW, "  \t", kEmpty, 10002, 19999, 0, false},
         {IDC_FUNC_USER_NEW, " Filiale ", kInUse, 10002, 19999, 0, false},
         {IDC_FUNC_USER_EDIT, "KUNDE", kInUse, 10002, 19999, 0, false},
@@ -396,19 +369,4 @@ TEST(FunctionManagerConfig, CombinationsCreatedAndEditedThroughTheCombinationDia
     ASSERT_EQ(2u, edited.GetCombination().size());
     EXPECT_TRUE(edited.GetCombination()[1].GetAlwaysSeparate());
     EXPECT_EQ(Sample().GetNumFunctions() + 1, result.GetNumFunctions());
-}
-
-TEST(FuncToNamesDlg, ChoiceOfCurrentOrAllFields)
-{
-    // The current field is the default; the choice of all fields is handed back.
-    CFuncToNamesDlg dlg;
-    Answering({[&](Dialog& d) {
-                  EXPECT_TRUE(d.IsChecked(IDC_FUNC_TO_NAMES_CURRENT));
-                  EXPECT_EQ("alle Felder \xE4ndern", d.Text(IDC_FUNC_TO_NAMES_ALL));
-                  d.Check(IDC_FUNC_TO_NAMES_ALL);
-                  qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("field-names-4042.png").c_str());
-                  d.Press(IDOK);
-              }},
-              [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
-    EXPECT_EQ(1, dlg.GetChoice());
 }

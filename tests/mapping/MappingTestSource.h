@@ -81,8 +81,6 @@ public:
         return out;
     }
 
-    using COutputFilterSource::SearchEntry;
-
     int valueCalls = 0;
     long lastRow = -1;
     int lastFlag = -1;
