@@ -91,11 +91,9 @@ TEST(ExecuterTest, TheCodeAndTheUserValueArePostedAndLibraryModePutsTheModuleFol
     } cases[] = {
         {"QoMain throws", false, {strModule, TempFile("qo_exec_throw.txt"), "throw"}, CExecuter::errEntryException},
         {"QoMain returns 7 (the module was unloaded)", false, {strModule, strOut, "7", "mit Leerzeichen"}, 7},
-        {"QoMain returns -5", false, {strModule, strOut, "-5", "mit Leerzeichen"}, -5},
         {"missing module", false, {ModuleDir() + "\\fehlt.dll"}, -1},
         {"module without QoMain", false, {ModuleDir() + "\\qo_test_nomain.dll", "x"}, -2},
         {"library mode without arguments", false, {}, -1},
-        {"process mode without arguments", true, {}, -2},
         {"program that does not exist", true, {BinDir() + "\\fehlt.exe"}, -2},
     };
     long lUser = -100;
