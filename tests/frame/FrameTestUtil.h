@@ -30,8 +30,8 @@ bool FileExists(const std::string& path);
 // must end with CR LF.
 std::vector<std::string> ReadLines(const std::string& path);
 
-// The part of a log line after its time prefix; fails the test when the line
-// does not start with a well-formed prefix ("Dec 06 2026, 07:21:03 > ").
+// The part of a log line after its time prefix ("Dec 06 2026, 07:21:03 > ");
+// fails the test when the line has none.
 std::string AfterPrefix(const std::string& line);
 
 // A fixture whose _theLog writes to a fresh file in a scratch folder.

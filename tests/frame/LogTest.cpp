@@ -5,7 +5,6 @@
 #include <ctime>
 
 #include <CQoLog.h>
-#include <CScopeLogger.h>
 
 #include "FrameTestUtil.h"
 
@@ -15,9 +14,8 @@ using Log = LogFixture;
 TEST_F(Log, EntryIsOneLineWithTimePrefixAndCrLf)
 {
     _theLog << "Konvertierung " << 42L << " von " << -7L << CQoLog::endl;
-    _theLog << "a" << static_cast<CQoLog::specials>(1) << "b" << CQoLog::endl;  // other manipulators do nothing
-    _theLog << CQoLog::endl;                                                      // the prefix alone
-    EXPECT_EQ((std::vector<std::string>{"Konvertierung 42 von -7", "ab", ""}), Entries());
+    _theLog << CQoLog::endl;  // the prefix alone
+    EXPECT_EQ((std::vector<std::string>{"Konvertierung 42 von -7", ""}), Entries());
 }
 
 TEST_F(Log, PrefixIsTheLocalTimeOfTheFinish)
@@ -81,13 +79,4 @@ TEST_F(Log, AppendsAndRecreatesTheFileWhenDeletedBetweenEntries)
     ASSERT_TRUE(DeleteFileA(m_log.c_str()));
     _theLog << "zwei" << CQoLog::endl;
     EXPECT_EQ(std::vector<std::string>{"zwei"}, Entries());
-}
-
-TEST_F(Log, ScopeLoggerRecordsNothing)
-{
-    {
-        CScopeLogger scope(3, "Bereich", "Text");
-    }
-    EXPECT_EQ(0, CScopeLogger::m_lLevel);
-    EXPECT_FALSE(FileExists(m_log));
 }

@@ -33,7 +33,6 @@ TEST(ResourceChain, HostFindsEveryLibraryStringWithItsExactText)
     EXPECT_FALSE(HostHoldsString(IDS_ERROR_OCCURRED));
     // Escapes and Windows-1252 letters come through as written.
     EXPECT_STREQ("Es ist der Fehler %d aufgetreten.\n%s", Load(IDS_ERROR_OCCURRED));
-    EXPECT_STREQ("Kopiere \"%s\" ...", Load(IDS_COPY_PROGRESS));
     EXPECT_STREQ("Die eingegebene L\xE4nge (%d) liegt unter dem m\xF6glichen Maximalwert f\xFCr das gew\xE4hlte "
                  "Feld.(%d).\nSoll die Feldl\xE4nge auf diesen Wert korrigiert werden?",
                  Load(IDS_LENGTH_BELOW_MAX));
