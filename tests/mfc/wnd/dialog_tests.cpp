@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "dialog_script.h"
+#include "MfcTestHost.h"
 #include "testres.h"
 
 namespace {
@@ -79,7 +79,17 @@ protected:
     if (s_hExt != NULL) ::FreeLibrary(s_hExt);
   }
   void SetUp() override { ASSERT_NE((HMODULE)NULL, s_hExt); }
+  // Answers the next message box with nButton, keeping its text and caption.
+  void AnswerBox(int nButton) {
+    m_driver.Expect([this, nButton](qotest::Dialog& d) {
+      m_boxes.push_back(d.MessageText());
+      m_captions.push_back(d.Title());
+      d.Press(nButton);
+    });
+  }
   static HMODULE s_hExt;
+  qotest::DialogDriver m_driver;
+  std::vector<std::string> m_boxes, m_captions;
 };
 HMODULE DialogTest::s_hExt = NULL;
 
@@ -92,22 +102,19 @@ TEST_F(DialogTest, ModalDialogFromTheExtensionTemplateExchangesItsData) {
   dlg.m_nKind = 2;
   dlg.m_dFactor = 1.5;
   std::string shown; // name|count|factor|active radio2 kind
-  CDialogScript script;
-  script.Then([&](HWND hDlg) {
-    shown = CDialogScript::ItemText(hDlg, IDC_NAME) + "|" + CDialogScript::ItemText(hDlg, IDC_COUNT) + "|" +
-            CDialogScript::ItemText(hDlg, IDC_FACTOR) + "|" + std::to_string(::IsDlgButtonChecked(hDlg, IDC_ACTIVE)) +
-            std::to_string(::IsDlgButtonChecked(hDlg, IDC_RADIO2)) +
-            std::to_string(::SendDlgItemMessageA(hDlg, IDC_KIND, CB_GETCURSEL, 0, 0));
-    ::SetDlgItemTextA(hDlg, IDC_NAME, "Neu");
-    ::SetDlgItemTextA(hDlg, IDC_COUNT, " 345 ");
-    ::CheckDlgButton(hDlg, IDC_ACTIVE, BST_UNCHECKED);
-    ::CheckRadioButton(hDlg, IDC_RADIO1, IDC_RADIO3, IDC_RADIO3);
-    ::SendDlgItemMessageA(hDlg, IDC_KIND, CB_SETCURSEL, 0, 0);
-    ::SetDlgItemTextA(hDlg, IDC_FACTOR, "-2.25");
-    CDialogScript::Click(hDlg, IDOK);
+  m_driver.Expect([&](qotest::Dialog& d) {
+    shown = d.Text(IDC_NAME) + "|" + d.Text(IDC_COUNT) + "|" + d.Text(IDC_FACTOR) + "|" +
+            std::to_string(d.IsChecked(IDC_ACTIVE)) + std::to_string(d.IsChecked(IDC_RADIO2)) +
+            std::to_string(d.Selection(IDC_KIND));
+    d.SetText(IDC_NAME, "Neu");
+    d.SetText(IDC_COUNT, " 345 ");
+    d.Check(IDC_ACTIVE, false);
+    d.Check(IDC_RADIO3);
+    d.Select(IDC_KIND, 0);
+    d.SetText(IDC_FACTOR, "-2.25");
+    d.Press(IDOK);
   });
   EXPECT_EQ(IDOK, dlg.DoModal());
-  EXPECT_TRUE(script.Done());
   EXPECT_EQ("Alt|12|1.5|112", shown);
   EXPECT_STREQ("Neu", dlg.m_strName);
   EXPECT_EQ(345, dlg.m_nCount);
@@ -120,10 +127,9 @@ TEST_F(DialogTest, ModalDialogFromTheExtensionTemplateExchangesItsData) {
 TEST_F(DialogTest, CancelKeepsTheMembers) {
   CDataDlg dlg;
   dlg.m_nCount = 5;
-  CDialogScript script;
-  script.Then([](HWND hDlg) {
-    ::SetDlgItemTextA(hDlg, IDC_COUNT, "77");
-    CDialogScript::Click(hDlg, IDCANCEL);
+  m_driver.Expect([](qotest::Dialog& d) {
+    d.SetText(IDC_COUNT, "77");
+    d.Press(IDCANCEL);
   });
   EXPECT_EQ(IDCANCEL, dlg.DoModal());
   EXPECT_EQ(5, dlg.m_nCount);
@@ -132,7 +138,7 @@ TEST_F(DialogTest, CancelKeepsTheMembers) {
 TEST_F(DialogTest, InputThatCannotBeTakenIsRefusedWithAGermanPromptAndTheDialogStays) {
   struct {
     int nID;
-    const char* text;   // typed into the field, the fields before hold good values
+    const char* text;   // typed into the field, the other fields hold good values
     const char* prompt; // the box that refuses it
   } const cases[] = {
       {IDC_COUNT, "12x", "Geben Sie eine ganze Zahl ein."},
@@ -142,23 +148,27 @@ TEST_F(DialogTest, InputThatCannotBeTakenIsRefusedWithAGermanPromptAndTheDialogS
   };
   CDataDlg dlg;
   std::vector<int> focus;
-  CDialogScript script;
-  for (size_t i = 0; i <= 4; ++i) {
-    script.Then([&, i](HWND hDlg) {
-      if (i > 0) focus.push_back(::GetDlgCtrlID(::GetFocus()));
-      ::SetDlgItemTextA(hDlg, IDC_COUNT, "50");
-      ::SetDlgItemTextA(hDlg, IDC_NAME, "kurz");
-      ::SetDlgItemTextA(hDlg, IDC_FACTOR, "2");
-      if (i < 4) ::SetDlgItemTextA(hDlg, cases[i].nID, cases[i].text);
-      CDialogScript::Click(hDlg, IDOK);
-    });
-    if (i < 4) script.AnswerBox(IDOK);
-  }
+  m_driver.Expect([&](qotest::Dialog& d) {
+    d.SetText(IDC_NAME, cases[2].text);
+    EXPECT_EQ("viel zu la", d.Text(IDC_NAME)); // typing stops at the limit; the program's text does not
+    auto set = [&](int nID, const char* text) { d.Send(nID, WM_SETTEXT, 0, (LPARAM)text); };
+    for (size_t i = 0; i <= 4; ++i) {
+      set(IDC_COUNT, "50");
+      set(IDC_NAME, "kurz");
+      set(IDC_FACTOR, "2");
+      if (i == 4) break;
+      set(cases[i].nID, cases[i].text);
+      d.Press(IDOK);
+      qotest::WaitFor([&] { return m_boxes.size() > i && ::IsWindowEnabled(d.Hwnd()); }, 5000);
+      focus.push_back(::GetDlgCtrlID(::GetFocus()));
+    }
+    d.Press(IDOK);
+  });
+  for (int i = 0; i < 4; ++i) AnswerBox(IDOK);
   EXPECT_EQ(IDOK, dlg.DoModal());
-  EXPECT_TRUE(script.Done());
-  ASSERT_EQ(4u, script.Boxes().size());
-  for (size_t i = 0; i < 4; ++i) EXPECT_EQ(cases[i].prompt, script.Boxes()[i].text);
-  EXPECT_EQ("Fenstertest", script.Boxes()[0].caption);
+  ASSERT_EQ(4u, m_boxes.size());
+  for (size_t i = 0; i < 4; ++i) EXPECT_EQ(cases[i].prompt, m_boxes[i]);
+  EXPECT_EQ("Fenstertest", m_captions[0]);
   EXPECT_EQ((std::vector<int>{IDC_COUNT, IDC_COUNT, IDC_NAME, IDC_FACTOR}), focus); // on the refused field
   EXPECT_EQ(50, dlg.m_nCount);
   EXPECT_STREQ("kurz", dlg.m_strName);
@@ -197,12 +207,9 @@ TEST_F(DialogTest, ModelessChildDialogIsCreatedAndTabMovesTheFocus) {
   page.GetDlgItemText(IDC_FIRST, str);
   EXPECT_STREQ("erstes", str);
 
-  frame.SetActiveWindow();
-  page.GetDlgItem(IDC_FIRST)->SetFocus();
+  qotest::Focus(page.GetDlgItem(IDC_FIRST)->m_hWnd);
   ASSERT_EQ(page.GetDlgItem(IDC_FIRST)->m_hWnd, ::GetFocus());
-  ::PostMessageA(::GetFocus(), WM_KEYDOWN, VK_TAB, 0x000F0001);
-  ::PostMessageA(::GetFocus(), WM_KEYUP, VK_TAB, 0xC00F0001);
-  PumpFor(200);
+  qotest::PressKey(VK_TAB);
   EXPECT_EQ(page.m_editSecond.m_hWnd, ::GetFocus());
 
   page.GetDlgItem(IDC_FIRST)->SetWindowText("eins");
@@ -227,19 +234,17 @@ public:
 };
 
 TEST_F(DialogTest, MessageBoxesAndReportErrorTakeTextsFromTheExceptionOrTheChain) {
-  CDialogScript script;
-  script.AnswerBox(IDNO).AnswerBox(IDOK).AnswerBox(IDOK).AnswerBox(IDOK);
+  for (int nButton : {IDNO, IDOK, IDOK, IDOK}) AnswerBox(nButton);
   EXPECT_EQ(IDNO, AfxMessageBox("Weiter?", MB_YESNO));
   CTextException textEx;
   CSilentException silentEx;
   EXPECT_EQ(IDOK, textEx.ReportError(MB_OK, IDS_EXT_ONLY));
   EXPECT_EQ(IDOK, silentEx.ReportError(MB_OK, IDS_EXT_ONLY));
   EXPECT_EQ(IDOK, silentEx.ReportError());
-  ASSERT_EQ(4u, script.Boxes().size());
-  EXPECT_EQ("Fenstertest", script.Boxes()[0].caption);
-  EXPECT_EQ("Datei fehlt", script.Boxes()[1].text);
-  EXPECT_EQ("Nur in der Erweiterung: Gr\xFC\xDF" "e", script.Boxes()[2].text);
-  EXPECT_EQ("Es ist ein Fehler aufgetreten.", script.Boxes()[3].text);
+  EXPECT_EQ((std::vector<std::string>{"Weiter?", "Datei fehlt", "Nur in der Erweiterung: Gr\xFC\xDF" "e",
+                                      "Es ist ein Fehler aufgetreten."}),
+            m_boxes);
+  EXPECT_EQ("Fenstertest", m_captions[0]);
 }
 
 } // namespace

@@ -1,8 +1,6 @@
-// CWnd's calls of a control's dispatch members on real windows: a control window
-// that hands out its IUnknown, reached through a CWnd that subclassed it (as a
-// dialog's control member does) with InvokeHelper, GetProperty and SetProperty:
-// arguments in order and converted, results converted, property puts named as
-// such, failures raised.
+// CWnd's calls of a control's dispatch members through a CWnd that subclassed
+// the control's window: arguments in order, results converted, property puts
+// named as such, failures raised.
 #include <gtest/gtest.h>
 
 #include <afxdisp.h>
@@ -102,8 +100,7 @@ bool Raises(const std::function<void()>& call)
 
 TEST_F(DispatchTest, PropertiesAndMethodsReachTheControl)
 {
-    // The control refuses a put that is not named as one; what it holds comes back
-    // converted to the type asked for.
+    // The control refuses a put not named as one; a value comes back as the type asked for.
     for (long set : {0L, 42L}) {
         m_control.SetProperty(1, VT_I4, set);
         long value = -1;

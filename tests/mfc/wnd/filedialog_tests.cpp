@@ -8,7 +8,7 @@
 #include <fstream>
 #include <string>
 
-#include "dialog_script.h"
+#include "DialogDriver.h"
 
 namespace {
 
@@ -43,14 +43,13 @@ TEST(FileDialog, OpenHandsBackTheChosenFileInItsParts)
     EXPECT_EQ('\0', *p);
 
     std::string proposed;
-    CDialogScript script;
-    script.Then([&](HWND hDlg) {
-        proposed = CDialogScript::ItemText(hDlg, NameField(hDlg));
-        ::SetDlgItemTextA(hDlg, NameField(hDlg), path.c_str());
-        CDialogScript::Click(hDlg, IDOK);
+    qotest::DialogDriver driver;
+    driver.Expect([&](qotest::Dialog& d) {
+        proposed = d.Text(NameField(d.Hwnd()));
+        d.SetText(NameField(d.Hwnd()), path);
+        d.Press(IDOK);
     });
     EXPECT_EQ(IDOK, dlg.DoModal());
-    EXPECT_TRUE(script.Done());
     EXPECT_EQ("vorschlag.txt", proposed);
     EXPECT_STRCASEEQ(path.c_str(), dlg.GetPathName());
     EXPECT_EQ(CString("Kunden Liste.2024.txt"), dlg.GetFileName());
@@ -62,17 +61,16 @@ TEST(FileDialog, OpenHandsBackTheChosenFileInItsParts)
 TEST(FileDialog, SaveAddsTheDefaultExtensionAndCancelAnswersCancel)
 {
     CFileDialog save(FALSE, "csv", NULL, OFN_HIDEREADONLY | OFN_OVERWRITEPROMPT, "CSV (*.csv)|*.csv");
-    CDialogScript script;
-    script.Then([&](HWND hDlg) {
-        ::SetDlgItemTextA(hDlg, NameField(hDlg), (TempFolder() + "bericht").c_str());
-        CDialogScript::Click(hDlg, IDOK);
+    qotest::DialogDriver driver;
+    driver.Expect([&](qotest::Dialog& d) {
+        d.SetText(NameField(d.Hwnd()), TempFolder() + "bericht");
+        d.Press(IDOK);
     });
     EXPECT_EQ(IDOK, save.DoModal());
     EXPECT_STRCASEEQ((TempFolder() + "bericht.csv").c_str(), save.GetPathName());
 
     CFileDialog cancelled(TRUE);
-    script.Then([&](HWND hDlg) { CDialogScript::Click(hDlg, IDCANCEL); });
+    driver.Expect([](qotest::Dialog& d) { d.Press(IDCANCEL); });
     EXPECT_EQ(IDCANCEL, cancelled.DoModal());
-    EXPECT_TRUE(script.Done());
     EXPECT_EQ(CString(""), cancelled.GetPathName());
 }
