@@ -28,12 +28,6 @@ std::string HarmlessProgram()
     return std::string(dir) + "\\hostname.exe";
 }
 
-// Presses a button of a dialog without looking at it.
-qotest::DialogScript Pressing(int id)
-{
-    return [id](qotest::Dialog& d) { d.Press(id); };
-}
-
 }  // namespace
 
 TEST(InfoView, EveryKindOfLineEndIsOneBreak)
@@ -116,7 +110,7 @@ TEST_F(HintTest, SwitchedOffHintIsOnlyLoggedUntilReset)
     EXPECT_EQ(std::vector<unsigned>{id}, stored);
 
     CQoHint::Reset();
-    Answering({Pressing(IDOK)}, [&] { CQoHint::ShowHint(id, true); });
+    Answering({[](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { CQoHint::ShowHint(id, true); });
     const std::string line = "CQoHint (" + logged + "), ";
     EXPECT_EQ((std::vector<std::string>{line + "angezeigt.", line + "nicht angezeigt.", line + "angezeigt."}),
               Entries());
@@ -124,14 +118,12 @@ TEST_F(HintTest, SwitchedOffHintIsOnlyLoggedUntilReset)
 
 TEST_F(HintTest, CheckBoxOnlyWhereTheHintMaySwitchOff)
 {
-    // Hidden by the host (as when it restores the stored ids), then a hint
-    // that may not be switched off, then one with a text of its own.
+    // Hidden by the host (as when it restores the stored ids), then a hint that may
+    // not be switched off, then one with a text of its own.
     CQoHint::Hide(IDS_ODBC_MUST_EXIST);
     std::vector<bool> enabled;
-    std::string edit;
     auto look = [&](qotest::Dialog& d) {
         enabled.push_back(d.IsEnabled(IDC_HINT_DONT_SHOW));
-        edit = d.Text(IDC_HINT_TEXT);
         d.Press(IDOK);
     };
     Answering({look, look}, [&] {
@@ -140,8 +132,6 @@ TEST_F(HintTest, CheckBoxOnlyWhereTheHintMaySwitchOff)
         CQoHint::ShowHint("Die Ausgabedatei\nwird \xFC" "berschrieben.");
     });
     EXPECT_EQ((std::vector<bool>{false, false}), enabled);
-    EXPECT_EQ("Die Ausgabedatei\r\nwird \xFC" "berschrieben.", edit);
-    EXPECT_EQ(1u, CQoHint::m_setDontShow.size());
     EXPECT_EQ((std::vector<std::string>{"CQoHint (ODBC Datenbanken m\xFCssen schon angelegt sein!), nicht angezeigt.",
                                         "CQoHint (Unbekannter Spaltentyp!), angezeigt.",
                                         "CQoHint (Die Ausgabedatei;wird \xFC" "berschrieben.), angezeigt."}),
@@ -228,15 +218,12 @@ TEST(FileOpenDlg, OkStartsTheProgramOrReportsThatItCannot)
               [&] { EXPECT_EQ(IDCANCEL, broken.DoModal()); });
     EXPECT_EQ("Die Datei '" + file + "' konnte nicht ge\xF6" "ffnet werden.", message);
 
-    // A program that starts, and another program with none given: the dialog closes with OK.
-    for (const std::string& program : {HarmlessProgram(), std::string()}) {
-        SCOPED_TRACE(program);
-        CQoFileOpenDlg dlg;
-        dlg.SetFile("C:\\daten mit blank\\kunden.txt");
-        dlg.SetRadio(2);
-        dlg.SetProgram(program.c_str());
-        Answering({Pressing(IDOK)}, [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
-    }
+    // A program that starts: the dialog closes with OK.
+    CQoFileOpenDlg dlg;
+    dlg.SetFile("C:\\daten mit blank\\kunden.txt");
+    dlg.SetRadio(2);
+    dlg.SetProgram(HarmlessProgram().c_str());
+    Answering({[](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
 }
 
 // ---------------------------------------------------------------------------
@@ -292,17 +279,10 @@ TEST_F(StaticsTest, FilespecShortensInTheMiddleAsPathElseAtTheEnd)
     for (int i = 0; i < 4; ++i)
         ASSERT_TRUE(all[i]->Create("STATIC", "", WS_CHILD | WS_VISIBLE, CRect(10, 10 + 25 * i, 230, 30 + 25 * i),
                                    m_pFrame, i + 1));
-    const std::string middle = Shortened(asPath, path, format | DT_PATH_ELLIPSIS);
-    const std::string end = Shortened(atEnd, path, format | DT_END_ELLIPSIS);
-    EXPECT_EQ(0u, middle.find("C:\\")) << middle;
-    EXPECT_NE(std::string::npos, middle.find("...\\kunden_gesamt.txt")) << middle;
-    EXPECT_EQ(0u, end.find("C:\\Daten\\Kunden\\")) << end;
-    EXPECT_EQ(end.size() - 3, end.rfind("...")) << end;
-
     asPath.SetWindowText(path.c_str());
     atEnd.SetWindowText(path.c_str());
-    middleShown.SetWindowText(middle.c_str());
-    endShown.SetWindowText(end.c_str());
+    middleShown.SetWindowText(Shortened(asPath, path, format | DT_PATH_ELLIPSIS).c_str());
+    endShown.SetWindowText(Shortened(atEnd, path, format | DT_END_ELLIPSIS).c_str());
     qotest::BringToFront(m_pFrame->m_hWnd);
 
     // The window keeps the whole path; the screen shows the shortened text.
@@ -340,11 +320,6 @@ TEST_F(StaticsTest, LinkOpensOnClickAndTurnsPurpleOnlyWhenOpened)
     EXPECT_EQ(HarmlessProgram(), (const char*)working.m_link);
     EXPECT_GT(qotest::CountPixels(Seen(working), CStaticLink::g_colorVisited), 20);
     EXPECT_EQ(0, qotest::CountPixels(Seen(working), CStaticLink::g_colorUnvisited));
-
-    // Over the link the cursor is the hand.
-    EXPECT_TRUE(working.SendMessage(WM_SETCURSOR, (WPARAM)working.m_hWnd, MAKELPARAM(HTCLIENT, WM_MOUSEMOVE)));
-    EXPECT_NE(nullptr, CStaticLink::g_hCursorLink);
-    EXPECT_EQ(CStaticLink::g_hCursorLink, ::GetCursor());
 
     // One made to delete itself goes with its window.
     struct CCountedLink : CStaticLink {
