@@ -171,6 +171,11 @@ TEST(CombiColumnConfig, ComposesCombinationFromChosenFunctionsAndSeparators)
             d.Press(IDOK);
         });
     scripts.push_back([&cancelled](Dialog& p) {
+        EXPECT_EQ("", p.Text(IDC_PREFIX_SEPARATOR));
+        EXPECT_EQ("Trenner auch bei leerem Feld", p.Text(IDC_PREFIX_ALWAYS));
+        p.SetText(IDC_PREFIX_SEPARATOR, " - ");
+        p.Check(IDC_PREFIX_ALWAYS, true);
+        qotest::CaptureWindow(p.Hwnd(), qotest::CapturePath("prefix-4041.png").c_str());
         p.Press(IDCANCEL);
         cancelled = true;
     });

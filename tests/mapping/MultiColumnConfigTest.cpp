@@ -166,48 +166,44 @@ protected:
 
     // Texts joined by '|': a row of the composed output or its names (row -1), a
     // row of the split file, the captions in the preview's first row, the functions.
-    static void Append(std::string& line, int i, const char* text) { line += (i ? "|" : "") + std::string(text); }
+    template <class Get> static std::string Join(int n, Get get)
+    {
+        std::string line;
+        for (int i = 0; i < n; ++i) line += (i ? "|" : "") + std::string(get(i));
+        return line;
+    }
     std::string Output(long row)
     {
         CQoOutputSource* out = m_page->GetOutputSource();
-        std::string line;
-        for (int c = 0; c < out->GetNumColumns(); ++c) {
+        return Join(out->GetNumColumns(), [&](int c) {
             CQoString v;
             row < 0 ? out->GetColumnName(c, v) : out->GetValue(row, c, v);
-            Append(line, c, v.GetString());
-        }
-        return line;
+            return std::string(v.GetString());
+        });
     }
     std::string InnerRow(long row)
     {
         CQoInputFilter* in = m_page->GetInnerInputFilter();
         EXPECT_TRUE(in->AbsoluteRow(row));
-        std::string line;
-        for (int c = 0; c < in->NumCols(); ++c) {
+        return Join(in->NumCols(), [&](int c) {
             CQoString v;
             in->Value(c, v);
-            Append(line, c, v.GetString());
-        }
-        return line;
+            return std::string(v.GetString());
+        });
     }
     std::string Captions()
     {
-        std::string line;
-        for (int c = 0; c < m_page->Preview().GetHeaderCtrl()->GetItemCount(); ++c) {
+        return Join(m_page->Preview().GetHeaderCtrl()->GetItemCount(), [&](int c) {
             CString text;
             DWORD clr = 0, clrSel = 0;
             bool bold = false;
             m_page->Preview().GetColoredItem(0, c, text, clr, clrSel, bold);
-            Append(line, c, text);
-        }
-        return line;
+            return std::string(text);
+        });
     }
     std::string Functions()
     {
-        std::string line;
-        for (int i = 0; i < m_page->GetNumOuterColumns(); ++i)
-            Append(line, i, std::to_string(m_page->GetOuterFunction(i)).c_str());
-        return line;
+        return Join(m_page->GetNumOuterColumns(), [&](int i) { return std::to_string(m_page->GetOuterFunction(i)); });
     }
     std::string FunctionName(long id)
     {
@@ -368,8 +364,6 @@ TEST_F(MultiColumnConfigTest, FunctionNamesBecomeColumnNamesUnlessTwoWouldClash)
         {"all fields", {{"Feld 1", kName}, {"Feld 2", kZipTown}, {"Feld 3", 0}}, true, "", "Name|PLZ Ort|Feld 3"},
         {"two would be called Name", {{"Feld 1", kName}, {"Feld 2", kFirst}, {"Feld 3", kName}}, true,
          "Diese Bezeichnung ist schon vergeben!", "Feld 1|Feld 2|Feld 3"},
-        {"the current one would be called like another", {{"Feld 1", kName}, {"name", kFirst}}, false,
-         "Diese Bezeichnung ist schon vergeben!", "Feld 1|name"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.what);

@@ -1,12 +1,10 @@
 // The output source page on a real window over a host's source: ticks by real
 // clicks and the space bar, an item dragged to the top, each written into the
 // source at once and told to the host only when it changed the output; the list
-// and source out of step; Enter and Escape; the separator prompt answered by a
-// user.
+// and source out of step; Enter and Escape.
 #include <gtest/gtest.h>
 
 #include <COutputFilterSourceConfig.h>
-#include <CPrefixDialog.h>
 
 #include <functional>
 #include <string>
@@ -196,44 +194,4 @@ TEST_F(OutputSourceConfigTest, AnItemNamingAColumnTheHostNoLongerHasIsNotWritten
     m_page.SetSource(nullptr);
     EXPECT_TRUE(ListTexts().empty());
     EXPECT_EQ(1, m_page.ModifiedListenerSetModified(1, 0));
-}
-
-TEST(PrefixDialogTest, TheSeparatorAndTheSwitchAsTheUserLeftThem)
-{
-    struct {
-        const char* what;
-        std::string presetText;
-        BOOL presetAlways;
-        std::string typed;  // "" leaves the field as shown
-        bool tick;
-        int button;
-        INT_PTR result;
-        std::string separator;
-        BOOL always;
-    } const cases[] = {
-        {"blanks and a dash, ticked", "", FALSE, " - ", true, IDOK, IDOK, " - ", TRUE},
-        {"cancelled", ",", FALSE, "/", true, IDCANCEL, IDCANCEL, ",", FALSE},
-    };
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.what);
-        CPrefixDialog dlg;
-        dlg.m_strSeparator = c.presetText.c_str();
-        dlg.m_bAlwaysSeparate = c.presetAlways;
-        INT_PTR result = 0;
-        qotest::Answering({[&](qotest::Dialog& d) {
-                              EXPECT_EQ("Trenner definieren", d.Title());
-                              EXPECT_EQ(c.presetText, d.Text(IDC_PREFIX_SEPARATOR));
-                              EXPECT_EQ(c.presetAlways != FALSE, d.IsChecked(IDC_PREFIX_ALWAYS));
-                              EXPECT_EQ("Trenner auch bei leerem Feld", d.Text(IDC_PREFIX_ALWAYS));
-                              if (!c.typed.empty()) d.SetText(IDC_PREFIX_SEPARATOR, c.typed);
-                              if (c.tick) d.Check(IDC_PREFIX_ALWAYS, true);
-                              if (std::string(c.what) == "blanks and a dash, ticked")
-                                  qotest::CaptureWindow(d.Hwnd(), qotest::CapturePath("prefix-4041.png").c_str());
-                              d.Press(c.button);
-                          }},
-                          [&] { result = dlg.DoModal(); });
-        EXPECT_EQ(c.result, result);
-        EXPECT_EQ(c.separator, std::string(dlg.m_strSeparator));
-        EXPECT_EQ(c.always, dlg.m_bAlwaysSeparate);
-    }
 }
