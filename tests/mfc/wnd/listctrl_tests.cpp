@@ -1,6 +1,6 @@
-// The report list on a real window: columns as inserted, rows of a virtual list
-// painted through DrawItem, item rectangles by their code, and rows that keep
-// long texts and their data.
+// The report list on a real window: rows of a virtual list painted through
+// DrawItem, item rectangles by their code, and rows that keep long texts and
+// their data.
 #include <gtest/gtest.h>
 
 #include <afxcmn.h>
@@ -31,30 +31,18 @@ protected:
                                        20, 400, 300, NULL, NULL));
         ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | LVS_REPORT | LVS_OWNERDRAWFIXED | LVS_OWNERDATA,
                                   CRect(0, 0, 380, 250), m_pFrame, 7));
-        for (int c = 0; c < 3; ++c) ASSERT_EQ(c, m_list.InsertColumn(c, "Spalte", kFormats[c], 50 + 10 * c));
+        for (int c = 0; c < 3; ++c) ASSERT_EQ(c, m_list.InsertColumn(c, "Spalte", LVCFMT_LEFT, 50 + 10 * c));
     }
     void TearDown() override
     {
         if (::IsWindow(m_pFrame->m_hWnd)) m_pFrame->DestroyWindow();
         Pump();
     }
-    static constexpr int kFormats[3] = {LVCFMT_LEFT, LVCFMT_RIGHT, LVCFMT_CENTER};
     CFrameWnd* m_pFrame = nullptr;
     CCountingList m_list;
 };
 
 }  // namespace
-
-TEST_F(ListCtrlTest, ColumnsKeepTheirWidthAndFormat)
-{
-    for (int c = 0; c < 3; ++c) {
-        EXPECT_EQ(50 + 10 * c, m_list.GetColumnWidth(c));
-        LVCOLUMN lvc = {};
-        lvc.mask = LVCF_FMT;
-        ASSERT_TRUE(m_list.GetColumn(c, &lvc));
-        EXPECT_EQ(kFormats[c], lvc.fmt & LVCFMT_JUSTIFYMASK);
-    }
-}
 
 TEST_F(ListCtrlTest, VirtualRowsArePaintedThroughDrawItem)
 {
