@@ -46,11 +46,6 @@ void Put32(std::vector<uint8_t>& v, uint32_t x)
     v.push_back(static_cast<uint8_t>(x));
 }
 
-uint32_t Get32(const uint8_t* p)
-{
-    return (uint32_t(p[0]) << 24) | (uint32_t(p[1]) << 16) | (uint32_t(p[2]) << 8) | p[3];
-}
-
 void Chunk(std::vector<uint8_t>& png, const char* type, const std::vector<uint8_t>& data)
 {
     Put32(png, static_cast<uint32_t>(data.size()));
@@ -61,13 +56,6 @@ void Chunk(std::vector<uint8_t>& png, const char* type, const std::vector<uint8_
 }
 
 const uint8_t kSignature[8] = {0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'};
-
-int Paeth(int a, int b, int c)
-{
-    int p = a + b - c, pa = std::abs(p - a), pb = std::abs(p - b), pc = std::abs(p - c);
-    if (pa <= pb && pa <= pc) return a;
-    return pb <= pc ? b : c;
-}
 
 }  // namespace
 
@@ -130,93 +118,6 @@ bool WritePng(const Image& img, const char* path)
     bool ok = std::fwrite(png.data(), 1, png.size(), f) == png.size();
     ok = std::fclose(f) == 0 && ok;
     return ok;
-}
-
-// ---------------------------------------------------------------------------------------------
-// Decoding
-
-bool DecodePng(const std::vector<uint8_t>& png, Image& out)
-{
-    if (png.size() < 8 || std::memcmp(png.data(), kSignature, 8) != 0) return false;
-    size_t pos = 8;
-    int width = 0, height = 0;
-    bool header = false, end = false;
-    std::vector<uint8_t> z;
-    while (!end) {
-        if (png.size() - pos < 12) return false;
-        uint32_t len = Get32(&png[pos]);
-        if (len > png.size() - pos - 12) return false;
-        const uint8_t* type = &png[pos + 4];
-        const uint8_t* data = &png[pos + 8];
-        if (Crc32(type, len + 4) != Get32(data + len)) return false;
-        if (!std::memcmp(type, "IHDR", 4)) {
-            if (len != 13 || data[8] != 8 || data[9] != 2 || data[10] || data[11] || data[12]) return false;
-            width = static_cast<int>(Get32(data));
-            height = static_cast<int>(Get32(data + 4));
-            if (width <= 0 || height <= 0 || width > 1 << 15 || height > 1 << 15) return false;
-            header = true;
-        } else if (!std::memcmp(type, "IDAT", 4)) {
-            z.insert(z.end(), data, data + len);
-        } else if (!std::memcmp(type, "IEND", 4)) {
-            end = true;
-        } else if (!(type[0] & 0x20)) {
-            return false;  // an unknown critical chunk
-        }
-        pos += 12 + len;
-    }
-    if (!header || z.size() < 6) return false;
-    if ((z[0] & 0x0F) != 8 || ((z[0] << 8) | z[1]) % 31 != 0 || (z[1] & 0x20)) return false;
-
-    std::vector<uint8_t> raw;
-    size_t zp = 2;
-    for (bool last = false; !last;) {
-        if (zp + 5 > z.size()) return false;
-        uint8_t head = z[zp];
-        last = head & 1;
-        if ((head >> 1) & 3) return false;  // only stored blocks
-        size_t n = z[zp + 1] | (z[zp + 2] << 8);
-        size_t nn = z[zp + 3] | (z[zp + 4] << 8);
-        if ((n ^ 0xFFFF) != nn || zp + 5 + n > z.size()) return false;
-        raw.insert(raw.end(), z.begin() + zp + 5, z.begin() + zp + 5 + n);
-        zp += 5 + n;
-    }
-    if (zp + 4 > z.size() || Get32(&z[zp]) != Adler32(raw.data(), raw.size())) return false;
-
-    const size_t row = static_cast<size_t>(width) * 3;
-    if (raw.size() != (row + 1) * height) return false;
-    out.Resize(width, height);
-    for (int y = 0; y < height; ++y) {
-        const uint8_t* src = &raw[y * (row + 1)];
-        uint8_t* dst = &out.rgb[y * row];
-        const uint8_t* up = y ? dst - row : nullptr;
-        uint8_t filter = src[0];
-        for (size_t i = 0; i < row; ++i) {
-            int a = i >= 3 ? dst[i - 3] : 0, b = up ? up[i] : 0, c = (up && i >= 3) ? up[i - 3] : 0;
-            int v = src[1 + i];
-            switch (filter) {
-            case 0: break;
-            case 1: v += a; break;
-            case 2: v += b; break;
-            case 3: v += (a + b) / 2; break;
-            case 4: v += Paeth(a, b, c); break;
-            default: return false;
-            }
-            dst[i] = static_cast<uint8_t>(v);
-        }
-    }
-    return true;
-}
-
-bool ReadPng(const char* path, Image& out)
-{
-    FILE* f = std::fopen(path, "rb");
-    if (!f) return false;
-    std::vector<uint8_t> png;
-    uint8_t buf[65536];
-    size_t n;
-    while ((n = std::fread(buf, 1, sizeof buf, f)) > 0) png.insert(png.end(), buf, buf + n);
-    std::fclose(f);
-    return DecodePng(png, out);
 }
 
 // ---------------------------------------------------------------------------------------------

@@ -3,15 +3,14 @@
 //     qotest::CaptureWindow(page, qotest::CapturePath("input-page.png").c_str());
 //
 //     qotest::Image img;
-//     ASSERT_TRUE(qotest::CaptureImage(list, img));      // or ReadPng(path, img)
+//     ASSERT_TRUE(qotest::CaptureImage(list, img));
 //     EXPECT_EQ(RGB(255, 0, 0), img.Pixel(5, 20));        // what the user sees at (5,20)
 //
 // CaptureWindow brings the window's top-level window to the front, lets it paint, and copies the
 // window's rectangle from the screen (what the user sees, children and frame included) into a
 // 24-bit picture. PNG files are written by a small encoder of our own (stored deflate blocks; any
-// PNG reader opens them) and read back by ReadPng, which understands exactly what WritePng writes
-// and reports anything else as unreadable. CapturePath puts a file name into the folder named by
-// the environment variable QO_CAPTURE_DIR (the current folder if it is not set).
+// PNG reader opens them). CapturePath puts a file name into the folder named by the environment
+// variable QO_CAPTURE_DIR (the current folder if it is not set).
 #pragma once
 
 #include <windows.h>
@@ -41,9 +40,5 @@ std::string CapturePath(const std::string& fileName);
 
 bool WritePng(const Image& img, const char* path);
 bool EncodePng(const Image& img, std::vector<uint8_t>& png);
-// Reads a PNG made by WritePng: 8-bit RGB, stored deflate blocks, any row filter. Checks the
-// CRCs and the Adler-32 checksum; false for anything it cannot read exactly.
-bool ReadPng(const char* path, Image& out);
-bool DecodePng(const std::vector<uint8_t>& png, Image& out);
 
 }  // namespace qotest

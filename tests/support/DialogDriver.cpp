@@ -144,36 +144,6 @@ std::vector<std::string> Dialog::ListItems(int id) const
     return ItemTexts(Item(id), LB_GETCOUNT, LB_GETTEXTLEN, LB_GETTEXT);
 }
 
-ControlRect Dialog::RectPixels(int id) const
-{
-    ControlRect r;
-    HWND h = Item(id);
-    if (!h) return r;
-    RECT rc;
-    GetWindowRect(h, &rc);
-    MapWindowPoints(nullptr, m_hwnd, reinterpret_cast<POINT*>(&rc), 2);
-    r.x = rc.left;
-    r.y = rc.top;
-    r.cx = rc.right - rc.left;
-    r.cy = rc.bottom - rc.top;
-    return r;
-}
-
-ControlRect Dialog::RectDlu(int id) const
-{
-    // The pixel size of 4 x 8 dialog units is the dialog's base unit pair; the template's values
-    // were scaled by it with rounding, so scaling back with rounding gives them again.
-    RECT base = {0, 0, 4, 8};
-    MapDialogRect(m_hwnd, &base);
-    ControlRect px = RectPixels(id), r;
-    if (base.right <= 0 || base.bottom <= 0) return r;
-    r.x = MulDiv(px.x, 4, base.right);
-    r.y = MulDiv(px.y, 8, base.bottom);
-    r.cx = MulDiv(px.cx, 4, base.right);
-    r.cy = MulDiv(px.cy, 8, base.bottom);
-    return r;
-}
-
 std::vector<int> Dialog::ButtonIds() const
 {
     std::vector<std::pair<int, int>> found;  // x position, id
@@ -395,7 +365,7 @@ void DialogDriver::OnActivate(HWND hwnd)
     // over it closes.
     if (!IsClass(hwnd, "#32770") || (GetWindowLongA(hwnd, GWL_STYLE) & WS_CHILD) || Find(hwnd))
         return;
-    m_titles.push_back(WindowText(hwnd));
+    ++m_seen;
     bool scripted = !m_queue.empty();
     m_watch.push_back(Watch{hwnd, scripted, 0});
     // Without a script the dialog is closed a moment later, as an unanswered one.
@@ -429,11 +399,9 @@ void DialogDriver::RunScript(HWND hwnd)
         Dialog d(hwnd);
         script(d);
     } catch (const std::exception& e) {
-        m_errors.push_back("script for \"" + title + "\" threw: " + e.what());
-        if (m_reportFailures) ADD_FAILURE() << m_errors.back();
+        if (m_reportFailures) ADD_FAILURE() << "script for \"" << title << "\" threw: " << e.what();
     } catch (...) {
-        m_errors.push_back("script for \"" + title + "\" threw");
-        if (m_reportFailures) ADD_FAILURE() << m_errors.back();
+        if (m_reportFailures) ADD_FAILURE() << "script for \"" << title << "\" threw";
     }
     --m_running;
     // The watch may be gone already (the script's own pumping closed the dialog).
@@ -452,10 +420,10 @@ void DialogDriver::CheckClosed(HWND hwnd)
     int stage = w->stage++;
     if (stage == 0) {
         const std::string title = WindowText(hwnd);
-        m_unanswered.push_back(title);
-        m_errors.push_back(w->scripted ? "dialog \"" + title + "\" still open after its script; closed"
-                                       : "unexpected dialog \"" + title + "\"; closed");
-        if (m_reportFailures) ADD_FAILURE() << m_errors.back();
+        ++m_unanswered;
+        if (m_reportFailures)
+            ADD_FAILURE() << (w->scripted ? "dialog \"" + title + "\" still open after its script; closed"
+                                          : "unexpected dialog \"" + title + "\"; closed");
         PostMessageA(hwnd, WM_COMMAND, MAKEWPARAM(IDCANCEL, BN_CLICKED), 0);
     } else if (stage == 1) {
         PostMessageA(hwnd, WM_CLOSE, 0, 0);

@@ -27,8 +27,7 @@
 //
 // Robustness: if a dialog is still open some time after its script ran (or no script was queued
 // for it, or the script threw), the driver closes it (IDCANCEL, then WM_CLOSE, then EndDialog) and
-// counts it in Unanswered(); the reason is kept in Errors() and, unless switched off, the running
-// test fails. Scripts still queued when the driver is destroyed fail the test as well. A dialog that is disabled because a
+// counts it in Unanswered(); unless switched off, the running test fails with the reason. Scripts still queued when the driver is destroyed fail the test as well. A dialog that is disabled because a
 // nested modal box is open over it is left alone until that box has gone.
 #pragma once
 
@@ -47,11 +46,6 @@ void PumpFor(DWORD ms);
 
 // Pumps messages until `done()` is true or `ms` milliseconds have passed; answers `done()`.
 bool WaitFor(const std::function<bool()>& done, DWORD ms);
-
-// A control's position and size, relative to the dialog's client area.
-struct ControlRect {
-    int x = 0, y = 0, cx = 0, cy = 0;
-};
 
 // The icon that a message box shows.
 enum class IconKind { None, Information, Warning, Error, Question, Other };
@@ -77,8 +71,6 @@ public:
     std::vector<std::string> ComboItems(int id) const;
     std::vector<std::string> ListItems(int id) const;
     std::string ClassName(int id) const;
-    ControlRect RectPixels(int id) const;  // in the dialog's client coordinates
-    ControlRect RectDlu(int id) const;     // the same in dialog units (as a template states them)
     std::vector<int> ButtonIds() const;    // visible push buttons of a message box (IDOK, IDYES, ...)
     IconKind Icon() const;                 // icon of a message box
 
@@ -122,9 +114,7 @@ public:
     // Queues the script for the next dialog that appears (after the ones already queued).
     void Expect(DialogScript script);
 
-    // Tuning: delay between activation and the script (default 80 ms); how long a dialog may stay
-    // open after its script before the driver closes it (default 3000 ms).
-    void SetDelay(UINT ms) { m_delay = ms; }
+    // How long a dialog may stay open after its script before the driver closes it (default 3000 ms).
     void SetTimeout(UINT ms) { m_timeout = ms; }
     // Whether an unanswered or unexpected dialog and a throwing script also fail the running test
     // at once (default true). Tests of the driver itself switch it off and check the counts.
@@ -132,12 +122,8 @@ public:
 
     // Results
     bool Done() const { return m_queue.empty() && m_running == 0; }  // every script ran
-    int Pending() const { return static_cast<int>(m_queue.size()); }
-    int Seen() const { return static_cast<int>(m_titles.size()); }     // dialogs that appeared
-    const std::vector<std::string>& Titles() const { return m_titles; }
-    int Unanswered() const { return static_cast<int>(m_unanswered.size()); }
-    const std::vector<std::string>& UnansweredTitles() const { return m_unanswered; }
-    const std::vector<std::string>& Errors() const { return m_errors; }
+    int Seen() const { return m_seen; }                              // dialogs that appeared
+    int Unanswered() const { return m_unanswered; }
 
 private:
     struct Watch {
@@ -157,9 +143,8 @@ private:
     DialogDriver* m_previous = nullptr;
     std::deque<DialogScript> m_queue;
     std::vector<Watch> m_watch;
-    std::vector<std::string> m_titles, m_unanswered, m_errors;
     UINT m_delay = 80, m_timeout = 3000;
-    int m_running = 0;
+    int m_running = 0, m_seen = 0, m_unanswered = 0;
     bool m_reportFailures = true;
 };
 

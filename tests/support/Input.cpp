@@ -138,18 +138,6 @@ void Drag(HWND hwnd, POINT from, POINT to, MouseButton button, int steps)
     PumpFor(kSettleMs);
 }
 
-void KeyDown(WORD vk)
-{
-    InjectKey(vk, true);
-    PumpFor(kSettleMs);
-}
-
-void KeyUp(WORD vk)
-{
-    InjectKey(vk, false);
-    PumpFor(kSettleMs);
-}
-
 void KeyPress(WORD vk, unsigned modifiers)
 {
     if (modifiers & kCtrl) InjectKey(VK_CONTROL, true);

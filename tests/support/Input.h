@@ -44,8 +44,6 @@ void RightClick(HWND hwnd, int x, int y);
 void Drag(HWND hwnd, POINT from, POINT to, MouseButton button = MouseButton::Left, int steps = 8);
 
 // Keyboard (to the window with the focus)
-void KeyDown(WORD vk);
-void KeyUp(WORD vk);
 void KeyPress(WORD vk, unsigned modifiers = 0);
 // Types Windows-1252 text: characters on the keyboard layout as their keys (with Shift where
 // needed), others as Unicode key events; '\n' is the Enter key.

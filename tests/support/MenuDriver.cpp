@@ -110,21 +110,6 @@ std::vector<std::string> Menu::Labels() const
     return labels;
 }
 
-bool Menu::Has(UINT id) const
-{
-    for (const MenuItem& item : Items())
-        if (!item.separator && !item.submenu && item.id == id) return true;
-    return false;
-}
-
-MenuItem Menu::ItemById(UINT id) const
-{
-    for (const MenuItem& item : Items())
-        if (!item.separator && !item.submenu && item.id == id) return item;
-    ADD_FAILURE() << "menu has no item with id " << id;
-    return MenuItem();
-}
-
 bool Menu::ClickPosition(int position)
 {
     RECT rc;
@@ -162,12 +147,6 @@ bool Menu::ChooseLabel(const std::string& label)
     return false;
 }
 
-void Menu::Cancel()
-{
-    InjectKey(VK_ESCAPE, true);
-    InjectKey(VK_ESCAPE, false);
-}
-
 // ---------------------------------------------------------------------------------------------
 // MenuDriver
 
@@ -196,9 +175,9 @@ LRESULT CALLBACK MenuDriver::HookProc(int code, WPARAM wp, LPARAM lp)
     if (self && code == HC_ACTION) {
         const CWPSTRUCT* cwp = reinterpret_cast<const CWPSTRUCT*>(lp);
         switch (cwp->message) {
-        case WM_ENTERMENULOOP: self->OnMenuStart(cwp->hwnd, nullptr); break;
+        case WM_ENTERMENULOOP: self->OnMenuStart(nullptr); break;
         case WM_INITMENUPOPUP:
-            if (!HIWORD(cwp->lParam)) self->OnMenuStart(cwp->hwnd, reinterpret_cast<HMENU>(cwp->wParam));
+            if (!HIWORD(cwp->lParam)) self->OnMenuStart(reinterpret_cast<HMENU>(cwp->wParam));
             break;
         case WM_EXITMENULOOP: self->OnMenuEnd(); break;
         default: break;
@@ -214,7 +193,7 @@ void MenuDriver::StartTimer(UINT ms, bool script)
     m_timerIsScript = script;
 }
 
-void MenuDriver::OnMenuStart(HWND owner, HMENU menu)
+void MenuDriver::OnMenuStart(HMENU menu)
 {
     if (!m_inLoop) {
         m_inLoop = true;
@@ -224,7 +203,6 @@ void MenuDriver::OnMenuStart(HWND owner, HMENU menu)
     if (m_loopSeen) return;
     m_loopSeen = true;
     ++m_seen;
-    m_owner = owner;
     m_closeStage = 0;
     m_loopScripted = !m_queue.empty();
     StartTimer(m_delay, m_loopScripted);
@@ -253,15 +231,13 @@ void CALLBACK MenuDriver::TimerProc(HWND, UINT, UINT_PTR id, DWORD)
 
 void MenuDriver::Fail(const std::string& what)
 {
-    m_errors.push_back(what);
     if (m_reportFailures) ADD_FAILURE() << what;
 }
 
 void MenuDriver::RunScript()
 {
     HMENU menu = m_menu;
-    HWND window = MenuWindow(menu);
-    if (!window) {  // not on screen yet
+    if (!MenuWindow(menu)) {  // not on screen yet
         StartTimer(m_delay, true);
         return;
     }
@@ -269,7 +245,7 @@ void MenuDriver::RunScript()
     m_queue.pop_front();
     m_running = true;
     try {
-        Menu m(menu, m_owner, window);
+        Menu m(menu);
         script(m);
     } catch (const std::exception& e) {
         Fail(std::string("menu script threw: ") + e.what());

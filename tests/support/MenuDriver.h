@@ -16,7 +16,7 @@
 // How it works: a thread WH_CALLWNDPROC hook sees the owner window receive WM_ENTERMENULOOP /
 // WM_INITMENUPOPUP; a moment later (a thread timer, which the menu loop dispatches) the next script
 // runs with the menu's HMENU (from MN_GETHMENU on the shown "#32768" window). Items are read
-// with GetMenuItemInfo; Choose clicks the item's rectangle with SendInput, Cancel presses Escape.
+// with GetMenuItemInfo; Choose clicks the item's rectangle with SendInput.
 // The loop reads those events after the script has returned. A menu still open some time after
 // its script (or one without a script) is closed with EndMenu and counted in Unanswered().
 // Menus tracked with TPM_NONOTIFY send no notifications and are not seen.
@@ -47,21 +47,14 @@ struct MenuItem {
 // The popup menu handed to a script. Non-owning; valid while the script runs.
 class Menu {
 public:
-    Menu(HMENU menu, HWND owner, HWND window) : m_menu(menu), m_owner(owner), m_window(window) {}
+    explicit Menu(HMENU menu) : m_menu(menu) {}
 
-    HMENU Handle() const { return m_menu; }
-    HWND Owner() const { return m_owner; }    // the window that receives the command
-    HWND Window() const { return m_window; }  // the "#32768" window that shows the menu
     std::vector<MenuItem> Items() const;
     std::vector<std::string> Labels() const;  // labels of all items, "" for separators
-    bool Has(UINT id) const;
-    MenuItem ItemById(UINT id) const;         // test failure if missing
 
     // Clicks the item with the mouse; a test failure if missing, disabled or a separator.
     bool Choose(UINT id);
     bool ChooseLabel(const std::string& label);
-    // Presses Escape (closes the innermost open popup).
-    void Cancel();
 
     static std::vector<MenuItem> ReadItems(HMENU menu);
 
@@ -69,8 +62,6 @@ private:
     bool ClickPosition(int position);
 
     HMENU m_menu;
-    HWND m_owner;
-    HWND m_window;
 };
 
 using MenuScript = std::function<void(Menu&)>;
@@ -83,19 +74,17 @@ public:
     MenuDriver& operator=(const MenuDriver&) = delete;
 
     void Expect(MenuScript script);
-    void SetDelay(UINT ms) { m_delay = ms; }
     void SetTimeout(UINT ms) { m_timeout = ms; }
     void SetReportFailures(bool report) { m_reportFailures = report; }
 
     bool Done() const { return m_queue.empty() && !m_running; }
     int Seen() const { return m_seen; }
     int Unanswered() const { return m_unanswered; }
-    const std::vector<std::string>& Errors() const { return m_errors; }
 
 private:
     static LRESULT CALLBACK HookProc(int code, WPARAM wp, LPARAM lp);
     static void CALLBACK TimerProc(HWND, UINT, UINT_PTR id, DWORD);
-    void OnMenuStart(HWND owner, HMENU menu);
+    void OnMenuStart(HMENU menu);
     void OnMenuEnd();
     void RunScript();
     void CheckClosed();
@@ -105,7 +94,6 @@ private:
     HHOOK m_hook = nullptr;
     MenuDriver* m_previous = nullptr;
     std::deque<MenuScript> m_queue;
-    std::vector<std::string> m_errors;
     UINT m_delay = 80, m_timeout = 3000;
     UINT_PTR m_timer = 0;
     bool m_timerIsScript = false;
@@ -116,7 +104,6 @@ private:
     bool m_reportFailures = true;
     int m_closeStage = 0;
     int m_seen = 0, m_unanswered = 0;
-    HWND m_owner = nullptr;
     HMENU m_menu = nullptr;
 };
 

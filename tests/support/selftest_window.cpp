@@ -58,7 +58,6 @@ LRESULT CALLBACK RecordingWindow::Proc(HWND hwnd, UINT msg, WPARAM wp, LPARAM lp
         break;
     case WM_CONTEXTMENU:
         self->events.push_back({msg, static_cast<short>(LOWORD(lp)), static_cast<short>(HIWORD(lp)), wp});
-        if (self->onContextMenu) self->onContextMenu(static_cast<short>(LOWORD(lp)), static_cast<short>(HIWORD(lp)));
         return 0;
     case WM_KEYDOWN: case WM_KEYUP: case WM_CHAR: case WM_COMMAND:
         self->events.push_back({msg, 0, 0, wp});

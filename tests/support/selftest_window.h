@@ -25,8 +25,6 @@ public:
     HWND Hwnd() const { return m_hwnd; }
     std::vector<Event> events;
     std::vector<Event> Of(UINT msg) const;
-    // Called on WM_CONTEXTMENU (to open a popup menu, for instance).
-    std::function<void(int screenX, int screenY)> onContextMenu;
     // Painted over the background on WM_PAINT.
     std::function<void(HDC)> onPaint;
 
