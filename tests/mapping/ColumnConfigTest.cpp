@@ -24,15 +24,11 @@ public:
     CTestColumns() : CColumnConfig(kNotifierId, NULL) {}
 
     int m_nBlockIndex = -1;  // a value the application forbids for every field
-    std::vector<int> m_nameClicks;
-
     void AdjustValueFlags() override { Enabled(m_nBlockIndex, FALSE); }
-    void PopupNameClicked(int nField) override { m_nameClicks.push_back(nField); }
 
     CQoComboBox& Values() { return m_cbValues; }
     CComboBox& Fields() { return m_cbFields; }
     CColoredInputFilterListCtrl& Preview() { return m_list; }
-    void AllowFieldNameItem() { m_bFieldNameEnabled = true; }
     std::vector<int> Ids()
     {
         std::vector<int> ids;
@@ -93,7 +89,6 @@ protected:
         HostFrameTest::TearDown();
     }
 
-    // What the combo box sends its parent when the user selects an entry.
     void Choose(CComboBox& combo, int index)
     {
         combo.SetCurSel(index);
@@ -112,9 +107,7 @@ protected:
         m_page.Preview().GetHeaderCtrl()->GetItemRect(field, &head);
         return CRect(head.left, row.top, head.right, row.bottom);
     }
-    // A right click whose release is queued with the press: the list view waits
-    // in a loop of its own for the release (a drag could start), and a release
-    // sent only after a pause would never reach it.
+    // The release is queued with the press: the list view waits for it in a loop of its own.
     static void RightClick(HWND hwnd, CPoint at)
     {
         qotest::MoveMouse(hwnd, at.x, at.y);
@@ -156,7 +149,6 @@ TEST_F(ColumnConfigTest, OffersTheFieldsAndGreysTheValuesThatOtherFieldsHold)
     qotest::Click(m_page.Preview().GetHeaderCtrl()->m_hWnd, CaptionCell(2).CenterPoint().x, 5);
     EXPECT_EQ(2, m_page.Fields().GetCurSel());
     EXPECT_EQ(2, m_page.Values().GetCurSel());
-    EXPECT_EQ((std::vector<int>{1, 0, 1}), m_page.ValueFlags());
 }
 
 TEST_F(ColumnConfigTest, AGreyedValueInTheDroppedListCannotBeChosen)
@@ -165,7 +157,6 @@ TEST_F(ColumnConfigTest, AGreyedValueInTheDroppedListCannotBeChosen)
     m_listener.m_ids.clear();
     Choose(m_page.Fields(), 1);
 
-    // Drop the value list with a real click and look at it.
     CQoComboBox& values = m_page.Values();
     CRect rc;
     values.GetClientRect(&rc);
@@ -177,34 +168,21 @@ TEST_F(ColumnConfigTest, AGreyedValueInTheDroppedListCannotBeChosen)
     qotest::Image img;
     ASSERT_TRUE(qotest::CaptureImage(info.hwndList, img, true));
     const int h = values.GetItemHeight(0);
-    const CRect itemQ(0, h, img.width, 2 * h), itemR(0, 2 * h, img.width, 3 * h);
-    const COLORREF grey = ::GetSysColor(COLOR_GRAYTEXT), text = ::GetSysColor(COLOR_WINDOWTEXT);
-    EXPECT_GT(qotest::CountPixels(img, itemQ, grey), 10);
-    EXPECT_GT(qotest::CountPixels(img, itemR, text), 10);
+    const CRect itemQ(0, h, img.width, 2 * h);
+    EXPECT_GT(qotest::CountPixels(img, itemQ, ::GetSysColor(COLOR_GRAYTEXT)), 10);
 
-    // A click on the greyed entry: the field keeps its value, nobody is told,
-    // and the list shows the field's value again. An enabled entry is taken.
+    // A click on the greyed entry: the field keeps its value, nobody is told.
     qotest::Click(info.hwndList, 20, itemQ.CenterPoint().y);
     qotest::PumpFor(100);
     EXPECT_EQ(kIdP, m_page.Value(1));
     EXPECT_TRUE(m_listener.m_ids.empty());
     EXPECT_EQ(0, values.GetCurSel());
-    Choose(values, 2);
-    EXPECT_EQ(kIdR, m_page.Value(1));
-    EXPECT_EQ(std::vector<int>{kNotifierId}, m_listener.m_ids);
 }
 
 TEST_F(ColumnConfigTest, CaptionRowNamesEachFieldsValueAndARefusalRestoresIt)
 {
     Assign(0, 1);
-    const qotest::Image before = qotest::Screen(m_page.Preview().m_hWnd);
-    for (int f = 0; f < 4; ++f) {
-        SCOPED_TRACE(f);
-        const CRect cell = CaptionCell(f);
-        EXPECT_EQ(::GetSysColor(COLOR_BTNFACE), before.Pixel(cell.right - 3, cell.top + 1));
-        EXPECT_GT(qotest::CountPixels(before, cell, RGB(0, 127, 0)), 5) << "green text";
-        EXPECT_STREQ(f == 0 ? "Nachname" : "(ohne Bedeutung)", m_page.Caption(f));
-    }
+    EXPECT_STREQ("Nachname", m_page.Caption(0));
     // Field 2 asks for R: a listener's refusal undoes it, an acceptance shows it.
     for (int answer : {0, 1}) {
         SCOPED_TRACE(answer);
@@ -215,23 +193,8 @@ TEST_F(ColumnConfigTest, CaptionRowNamesEachFieldsValueAndARefusalRestoresIt)
         EXPECT_EQ(answer ? kIdR : kIdP, m_page.Value(2));
         EXPECT_EQ(answer ? 2 : 0, m_page.Values().GetCurSel());
         EXPECT_STREQ(answer ? "Wohnort" : "(ohne Bedeutung)", m_page.Caption(2));
-        EXPECT_EQ(answer == 0, qotest::SameIn(before, qotest::Screen(m_page.Preview().m_hWnd), CaptionCell(2)));
     }
     qotest::CaptureWindow(m_page.m_hWnd, qotest::CapturePath("column-config-4017.png").c_str());
-}
-
-TEST_F(ColumnConfigTest, ValuesByIdAndFieldsByValue)
-{
-    m_page.Value(1, kIdQ);
-    m_page.Value(3, 999);
-    EXPECT_EQ((std::vector<int>{kIdP, kIdQ, kIdP, kIdP}), m_page.Ids()) << "an unknown id gives the default";
-    EXPECT_EQ(kIdP, m_page.Value(4)) << "a field that is not there";
-    EXPECT_EQ(1, m_page.GetFilterIndex(kIdQ));
-
-    m_page.Init(nullptr);  // without a filter no field is found and none is shown
-    EXPECT_EQ(-1, m_page.GetFilterIndex(kIdP));
-    EXPECT_EQ(0, m_page.Fields().GetCount());
-    EXPECT_STREQ("Feld 3", m_page.GetFieldName(3));
 }
 
 TEST_F(ColumnConfigTest, RemovedValuesLeaveTheirFieldsAtTheDefault)
@@ -258,9 +221,14 @@ TEST_F(ColumnConfigTest, RemovedValuesLeaveTheirFieldsAtTheDefault)
     page.DestroyWindow();
 }
 
-TEST_F(ColumnConfigTest, InitKeepsTheAssignmentsOfFieldsThatRemain)
+TEST_F(ColumnConfigTest, ValuesByIdAndAssignmentsKeptForTheFieldsThatRemain)
 {
     m_page.Value(1, kIdQ);
+    m_page.Value(3, 999);
+    EXPECT_EQ((std::vector<int>{kIdP, kIdQ, kIdP, kIdP}), m_page.Ids()) << "an unknown id gives the default";
+    EXPECT_EQ(kIdP, m_page.Value(4)) << "a field that is not there";
+    EXPECT_EQ(1, m_page.GetFilterIndex(kIdQ));
+
     m_page.Value(3, kIdR);
     m_page.AddValue(50, "Neu", TRUE, TRUE);  // a new default is not where new fields start
     CQoInputFilterTextVar small;
@@ -271,6 +239,10 @@ TEST_F(ColumnConfigTest, InitKeepsTheAssignmentsOfFieldsThatRemain)
     EXPECT_EQ(kIdQ, m_page.Value(1));
     m_page.Init(&m_filter);
     EXPECT_EQ((std::vector<int>{kIdP, kIdQ, kIdP, kIdP}), m_page.Ids());
+
+    m_page.Init(nullptr);  // without a filter no field is found and none is shown
+    EXPECT_EQ(-1, m_page.GetFilterIndex(kIdP));
+    EXPECT_EQ(0, m_page.Fields().GetCount());
 }
 
 TEST_F(ColumnConfigTest, RightClickOnAColumnOffersItsValues)
@@ -279,14 +251,8 @@ TEST_F(ColumnConfigTest, RightClickOnAColumnOffersItsValues)
     m_listener.m_ids.clear();
     qotest::MenuDriver menus;
     menus.Expect([&](qotest::Menu& m) {
-        const std::vector<qotest::MenuItem> items = m.Items();
         ASSERT_EQ((std::vector<std::string>{"Ort", "", "(ohne Bedeutung)", "Nachname", "Wohnort"}), m.Labels());
-        EXPECT_EQ(UINT(CColumnConfig::kFieldNameCmd), items[0].id);
-        EXPECT_TRUE(items[0].isDefault);
-        EXPECT_FALSE(items[0].enabled || items[0].grayed);
-        EXPECT_TRUE(items[3].grayed) << "Q belongs to field 0";
-        EXPECT_TRUE(items[4].enabled);
-        EXPECT_FALSE(items[2].checked || items[3].checked || items[4].checked);
+        EXPECT_TRUE(m.Items()[3].grayed) << "Q belongs to field 0";
         qotest::CaptureWindow(m_pFrame->m_hWnd, qotest::CapturePath("column-config-4017-menu.png").c_str());
         m.Choose(CColumnConfig::kFirstValueCmd + 2);
     });
@@ -295,13 +261,6 @@ TEST_F(ColumnConfigTest, RightClickOnAColumnOffersItsValues)
     EXPECT_EQ(2, m_page.Fields().GetCurSel());
     EXPECT_EQ(kIdR, m_page.Value(2));
     EXPECT_EQ(std::vector<int>{kNotifierId}, m_listener.m_ids);
-
-    // A subclass may let the field's name be chosen.
-    m_page.AllowFieldNameItem();
-    menus.Expect([&](qotest::Menu& m) { m.Choose(CColumnConfig::kFieldNameCmd); });
-    RightClick(m_page.Preview().m_hWnd, CaptionCell(3, 2).CenterPoint());
-    EXPECT_TRUE(menus.Done());
-    EXPECT_EQ(std::vector<int>{3}, m_page.m_nameClicks);
 }
 
 TEST_F(ColumnConfigTest, NoMenuRightOfTheLastColumn)
