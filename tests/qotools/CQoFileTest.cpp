@@ -42,29 +42,21 @@ int Code(void (*f)(CQoFile &), CQoFile &file)
 
 TEST(CQoFileCharSet, AsciiWritesDos850AndReadsBackWindows1252)
 {
+    // Every character of Windows-1252 from 0xA0 up exists in code page 850
+    // and survives the way there and back; the umlauts land on their DOS bytes.
     TempFolder tmp;
     std::string path = tmp.Path("dos.txt");
-    {
-        CQoFile file;
-        ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary | CQoFile::ascii));
-        file.Write(CQoString(kAnsiUmlauts.c_str()));
-        file.Close();
-    }
-    EXPECT_EQ(kDosUmlauts, ReadBytes(path));
-    EXPECT_EQ(std::vector<std::string>{kAnsiUmlauts}, ReadLines(path, CQoFile::read | CQoFile::ascii));
-
-    // Every character of Windows-1252 from 0xA0 up exists in code page 850
-    // and survives the way there and back.
     std::string latin;
     for (int c = 0xA0; c <= 0xFF; ++c)
         latin += static_cast<char>(c);
     {
         CQoFile file(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ascii);
-        file.Write(latin.data(), latin.size());
+        file.Write(CQoString(latin.c_str()));
     }
     std::string onDisk = ReadBytes(path);
     ASSERT_EQ(latin.size(), onDisk.size());
-    EXPECT_NE(latin, onDisk);
+    for (std::size_t i = 0; i < kAnsiUmlauts.size(); ++i)
+        EXPECT_EQ(kDosUmlauts[i], onDisk[std::size_t(static_cast<unsigned char>(kAnsiUmlauts[i]) - 0xA0)]) << i;
     CQoFile file(path.c_str(), CQoFile::read | CQoFile::binary | CQoFile::ascii);
     std::string back(latin.size(), '\0');
     EXPECT_EQ(latin.size(), file.Read(&back[0], back.size()));

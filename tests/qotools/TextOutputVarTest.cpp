@@ -47,7 +47,6 @@ std::vector<Dialect> const kDialects = {
     {"semicolon", ';', '"', 0, false, "delimiter=';', quotechar='\"', doublequote=True"},
     {"forced", ';', '"', 0, true, "delimiter=';', quotechar='\"', doublequote=True"},
     {"escape", ';', '"', '\\', false, "delimiter=';', quotechar='\"', doublequote=False, escapechar='\\\\'"},
-    {"tab", '\t', '\'', 0, false, "delimiter='\\t', quotechar=\"'\", doublequote=True"},
     {"no encloser", ',', 0, '\\', false, "delimiter=',', quoting=csv.QUOTE_NONE, escapechar='\\\\'"},
 };
 
