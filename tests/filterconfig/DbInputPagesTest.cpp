@@ -1,5 +1,6 @@
 // The dBase and file-database input pages on real windows over real files: a dBase
-// file written byte by byte and Access-type databases made by the engine. Tables are picked
+// file written byte by byte, Access-type databases made by the engine, the .mdb
+// fixture and an Excel workbook written by the host's Python. Tables are picked
 // with real clicks, the host's listener accepts or refuses, and the messages for
 // files that cannot be read are answered.
 #include <gtest/gtest.h>
@@ -20,6 +21,8 @@
 #include "CQoInterActive.h"
 #include "MfcTestHost.h"
 #include "resource.h"
+
+#include "../qotools/PythonPeer.h"
 
 namespace {
 
@@ -277,6 +280,50 @@ TEST_F(DaoPageTest, ATableOrDatabaseThatCannotBeOpenedIsReportedAndTheLastStateK
     Answering({}, [&] { m_pPage->UpdateInputFilter(0); }, 300);
     EXPECT_EQ("Artikel:0:0,Fehlt:0:0,Koelner:1:1,Kunden:0:0,", Items());
     EXPECT_EQ("M\xFCller|K\xF6ln,Schmidt|Bonn,", Rows(Page().m_preview));
+}
+
+TEST_F(DaoPageTest, AnMdbFileListsItsTables)
+{
+    char module[MAX_PATH];
+    GetModuleFileNameA(NULL, module, MAX_PATH);
+    std::string path = module;
+    for (int up = 0; up < 3 && path.find_last_of('\\') != std::string::npos; ++up)
+        path = path.substr(0, path.find_last_of('\\'));
+    path += "\\fixtures\\fruit.mdb";
+    if (GetFileAttributesA(path.c_str()) == INVALID_FILE_ATTRIBUTES)
+        GTEST_SKIP() << "fruit.mdb is not fetched (tools/setup.sh puts it into build/fixtures)";
+    CQoInputFilterDao filter(CQoFile::typeAccess);
+    Open(filter, path);
+    ASSERT_GT(Tables().GetItemCount(), 0);
+    EXPECT_EQ(std::string::npos, Items().find("MSys")) << "no system tables";
+    const std::string first((LPCSTR)Tables().GetItemText(0, 0));
+    ClickTable(first.c_str());
+    EXPECT_EQ(first, std::string(filter.GetTableName().GetString()));
+    EXPECT_GT(Page().m_preview.GetItemCount(), 0);
+}
+
+TEST_F(DaoPageTest, AWorkbookListsItsSheetsWithTheWorkbookIcon)
+{
+    PeerFolder folder;
+    if (!folder.Usable() || !RunPython(folder, "write", R"PY(
+import openpyxl
+wb = openpyxl.Workbook()
+ws = wb.active
+ws.title = 'Kunden'
+ws.append(['Name', 'Ort'])
+ws.append(['M\u00fcller', 'K\u00f6ln'])
+wb.create_sheet('Preise').append(['Artikel'])
+wb.save(os.path.join(folder, 'kunden.xlsx'))
+)PY"))
+        PEER_UNAVAILABLE();
+    CQoInputFilterDao filter(CQoFile::typeExcel);
+    Open(filter, folder.Path("kunden.xlsx"));
+    EXPECT_EQ("Kunden$:2:0,Preise$:2:0,", Items());
+    EXPECT_EQ("-", Selected());
+    ClickTable("Kunden$");
+    EXPECT_EQ("Kunden$", std::string(filter.GetTableName().GetString()));
+    EXPECT_EQ("Name", ColumnTitle(Page().m_preview, 0));
+    EXPECT_EQ("M\xFCller|K\xF6ln,", Rows(Page().m_preview));
 }
 
 }  // namespace
