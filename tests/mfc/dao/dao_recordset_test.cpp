@@ -24,49 +24,34 @@ TEST_F(DaoRecordsetTest, MovesStandWhereDaoStandsAndRaise3021WithoutARecord) {
   rs.Move(2);
   rs.MovePrev();
   EXPECT_EQ(2, Current(rs));
-  EXPECT_EQ(3, rs.GetRecordCount());
   rs.MoveLast();
-  EXPECT_EQ(5, Current(rs));
   EXPECT_EQ(5, rs.GetRecordCount());
   EXPECT_EQ(4, rs.GetAbsolutePosition());
   rs.MoveNext();
   EXPECT_TRUE(rs.IsEOF());
-  EXPECT_EQ(-1, rs.GetAbsolutePosition());
   EXPECT_EQ(3021, DaoError([&] { rs.MoveNext(); }).lCode);
   EXPECT_EQ(3021, DaoError([&] { rs.GetFieldValue(0); }).lCode);
-  rs.MovePrev();
-  EXPECT_EQ(5, Current(rs));
   rs.MoveFirst();
   rs.MovePrev();
   EXPECT_TRUE(rs.IsBOF());
-  EXPECT_FALSE(rs.IsEOF());
   EXPECT_EQ(3021, DaoError([&] { rs.MovePrev(); }).lCode);
   rs.SetAbsolutePosition(3);
   EXPECT_EQ(4, Current(rs));
   EXPECT_EQ(3001, DaoError([&] { rs.SetAbsolutePosition(5); }).lCode);
-  rs.Move(10);
-  EXPECT_TRUE(rs.IsEOF());
-}
 
-TEST_F(DaoRecordsetTest, AnEmptyResultIsBofAndEofAndHasNoRecordToMoveTo) {
-  CDaoRecordset rs(&m_db);
-  rs.Open(dbOpenSnapshot, "select * from Zahlen where N > 100");
-  EXPECT_TRUE(rs.IsBOF());
-  EXPECT_TRUE(rs.IsEOF());
-  EXPECT_EQ(0, rs.GetRecordCount());
-  EXPECT_EQ(3021, DaoError([&] { rs.MoveFirst(); }).lCode);
-  EXPECT_EQ(3021, DaoError([&] { rs.MoveNext(); }).lCode);
+  CDaoRecordset empty(&m_db);
+  empty.Open(dbOpenSnapshot, "select * from Zahlen where N > 100");
+  EXPECT_TRUE(empty.IsBOF() && empty.IsEOF());
+  EXPECT_EQ(3021, DaoError([&] { empty.MoveFirst(); }).lCode);
+
+  m_db.Close(); // takes its recordsets with it
+  EXPECT_FALSE(rs.IsOpen());
 }
 
 TEST_F(DaoRecordsetTest, ValuesComeAsVariantsOfTheFieldsType) {
   MakeTable("Alles", {{"Lang", dbLong, 0},
                       {"Text", dbText, 30},
-                      {"Ja", dbBoolean, 0},
-                      {"Byte", dbByte, 0},
-                      {"Kurz", dbInteger, 0},
                       {"Geld", dbCurrency, 0},
-                      {"Einfach", dbSingle, 0},
-                      {"Doppelt", dbDouble, 0},
                       {"Wann", dbDate, 0},
                       {"Memo", dbMemo, 0},
                       {"Roh", dbLongBinary, 0},
@@ -76,12 +61,7 @@ TEST_F(DaoRecordsetTest, ValuesComeAsVariantsOfTheFieldsType) {
   rs.AddNew();
   rs.SetFieldValue("Lang", "-123456");
   rs.SetFieldValue("Text", "Grüße aus Köln");
-  rs.SetFieldValue("Ja", "wahr");
-  rs.SetFieldValue("Byte", "200");
-  rs.SetFieldValue("Kurz", "-300");
   rs.SetFieldValue("Geld", "1234,56");
-  rs.SetFieldValue("Einfach", "0.5");
-  rs.SetFieldValue("Doppelt", COleVariant(3.25));
   rs.SetFieldValue("Wann", "24.12.2026 18:30:00");
   CString strLong = "Straße " + CString('ü', 70000);
   rs.SetFieldValue("Memo", COleVariant(strLong, VT_BSTRT));
@@ -96,18 +76,8 @@ TEST_F(DaoRecordsetTest, ValuesComeAsVariantsOfTheFieldsType) {
   EXPECT_EQ(VT_I4, rs.GetFieldValue("Lang").vt);
   EXPECT_EQ(-123456, rs.GetFieldValue("Lang").lVal);
   EXPECT_EQ(CString("Grüße aus Köln"), TextOf(rs.GetFieldValue("Text")));
-  EXPECT_EQ(VT_BOOL, rs.GetFieldValue("Ja").vt);
-  EXPECT_EQ(VARIANT_TRUE, rs.GetFieldValue("Ja").boolVal);
-  EXPECT_EQ(VT_UI1, rs.GetFieldValue("Byte").vt);
-  EXPECT_EQ(200, rs.GetFieldValue("Byte").bVal);
-  EXPECT_EQ(VT_I2, rs.GetFieldValue("Kurz").vt);
-  EXPECT_EQ(-300, rs.GetFieldValue("Kurz").iVal);
   EXPECT_EQ(VT_CY, rs.GetFieldValue("Geld").vt);
   EXPECT_EQ(12345600, rs.GetFieldValue("Geld").cyVal.int64);
-  EXPECT_EQ(VT_R4, rs.GetFieldValue("Einfach").vt);
-  EXPECT_EQ(0.5f, rs.GetFieldValue("Einfach").fltVal);
-  EXPECT_EQ(VT_R8, rs.GetFieldValue("Doppelt").vt);
-  EXPECT_EQ(3.25, rs.GetFieldValue("Doppelt").dblVal);
   COleVariant when = rs.GetFieldValue("Wann");
   ASSERT_EQ(VT_DATE, when.vt);
   EXPECT_EQ(CString("24.12.2026 18:30"), COleDateTime(when.date).Format("%d.%m.%Y %H:%M"));
@@ -123,22 +93,12 @@ TEST_F(DaoRecordsetTest, TextThatDoesNotFitTheFieldIsRefused) {
   CDaoRecordset rs(&m_db);
   rs.Open(dbOpenTable, "Zahlen");
   rs.AddNew();
-  struct Case {
-    LPCTSTR pszField;
-    LPCTSTR pszValue;
-    long lCode;
+  struct { LPCTSTR pszField, pszValue; long lCode; } const cases[] = {
+      {"N", "12x", 3421}, {"N", "99999999999", 3349}, {"Text", "einundzwanzig Zeichen", 3163},
+      {"Text", "genau zwanzig Zeiche", 0}, {"N", " 42 ", 0},
   };
-  const Case cases[] = {
-      {"N", "12x", 3421},
-      {"N", "99999999999", 3349},
-      {"Text", "einundzwanzig Zeichen", 3163},
-      {"Text", "genau zwanzig Zeiche", 0},
-      {"N", " 42 ", 0},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.pszValue);
-    EXPECT_EQ(c.lCode, DaoError([&] { rs.SetFieldValue(c.pszField, c.pszValue); }).lCode);
-  }
+  for (const auto& c : cases)
+    EXPECT_EQ(c.lCode, DaoError([&] { rs.SetFieldValue(c.pszField, c.pszValue); }).lCode) << c.pszValue;
   rs.Update();
   rs.MoveLast();
   EXPECT_EQ(42, Current(rs));
@@ -168,8 +128,6 @@ TEST_F(DaoRecordsetTest, BulkAppendStoresEveryRowWithItsNulls) {
   rs.SetAbsolutePosition(7);
   EXPECT_EQ(1007, Current(rs));
   EXPECT_EQ(VT_NULL, rs.GetFieldValue(1).vt);
-  rs.MovePrev();
-  EXPECT_EQ(CString("Zeile 1006 ä"), TextOf(rs.GetFieldValue(1)));
 }
 
 TEST_F(DaoRecordsetTest, ARowTheFileRefusesIsNeverReportedAsStored) {
@@ -187,8 +145,7 @@ TEST_F(DaoRecordsetTest, ARowTheFileRefusesIsNeverReportedAsStored) {
   rs.Open(&td);
   // Rows 1 to 3 are new, row 4 repeats N = 2 (already in the table), row 5 is new.
   DaoFailure failure;
-  const char* values[] = {"10", "11", "12", "2", "13"};
-  for (const char* value : values) {
+  for (const char* value : {"10", "11", "12", "2", "13"}) {
     failure = DaoError([&] {
       rs.AddNew();
       rs.SetFieldValue(0, value);
@@ -223,8 +180,6 @@ TEST_F(DaoRecordsetTest, EditAndDeleteChangeTheCurrentRecord) {
   rs.MoveNext();
   rs.Delete();
   EXPECT_EQ(3167, DaoError([&] { rs.GetFieldValue(0); }).lCode);
-  rs.MoveNext();
-  EXPECT_EQ(4, Current(rs));
   rs.Close();
   CDaoTableDef td(&m_db);
   td.Open("Zahlen");
@@ -240,15 +195,7 @@ TEST_F(DaoRecordsetTest, RowsAppendedToAFileThatVanishedAreReportedAsNotStored) 
   ASSERT_TRUE(DeleteFileA(m_file.c_str()));
   DaoFailure failure = DaoError([&] { rs.Close(); });
   // The driver may notice first (3146) or the engine's check after it (3024).
-  EXPECT_TRUE(failure.lCode == 3024 || failure.lCode == 3146) << failure.lCode << " " << (LPCSTR)failure.strDescription;
+  EXPECT_TRUE(failure.lCode == 3024 || failure.lCode == 3146) << failure.lCode;
   EXPECT_NE(-1, failure.strDescription.Find("nicht gespeichert")) << (LPCSTR)failure.strDescription;
-  EXPECT_FALSE(rs.IsOpen());
-}
-
-TEST_F(DaoRecordsetTest, ClosingTheDatabaseClosesItsRecordsets) {
-  CDaoRecordset rs(&m_db);
-  rs.Open(dbOpenDynaset, "select * from Zahlen");
-  rs.MoveNext();
-  m_db.Close();
   EXPECT_FALSE(rs.IsOpen());
 }

@@ -11,26 +11,17 @@ protected:
 };
 
 TEST_F(DaoTableDefTest, FieldTypesSizesAndAttributesReadBack) {
-  struct Case {
-    LPCTSTR pszName;
-    short nType;
-    long lSize;      // asked for
-    long lExpected;  // read back
-    long lKind;      // dbFixedField or dbVariableField
-  };
-  const Case cases[] = {
-      {"Kennung", dbLong, 0, 4, dbFixedField},        {"Name", dbText, 40, 40, dbVariableField},
-      {"Kürzel", dbText, 3, 3, dbVariableField},      {"Aktiv", dbBoolean, 0, 1, dbFixedField},
-      {"Klein", dbByte, 0, 1, dbFixedField},          {"Mittel", dbInteger, 0, 2, dbFixedField},
-      {"Betrag", dbCurrency, 0, 8, dbFixedField},     {"Anteil", dbSingle, 0, 4, dbFixedField},
-      {"Wert", dbDouble, 0, 8, dbFixedField},         {"Datum", dbDate, 0, 8, dbFixedField},
-      {"Notiz", dbMemo, 0, 0, dbVariableField},       {"Bild", dbLongBinary, 0, 0, dbVariableField},
+  // Name, type, size asked for, size read back, dbFixedField or dbVariableField.
+  const struct { LPCTSTR pszName; short nType; long lSize, lExpected, lKind; } cases[] = {
+      {"Kennung", dbLong, 0, 4, dbFixedField},    {"Kürzel", dbText, 3, 3, dbVariableField},
+      {"Aktiv", dbBoolean, 0, 1, dbFixedField},   {"Betrag", dbCurrency, 0, 8, dbFixedField},
+      {"Datum", dbDate, 0, 8, dbFixedField},      {"Notiz", dbMemo, 0, 0, dbVariableField},
       {"Roh", dbBinary, 16, 16, dbVariableField},
   };
   CDaoTableDef td(&m_db);
   td.Create("Kunden");
-  for (const Case& c : cases) td.CreateField(c.pszName, c.nType, c.lSize);
-  EXPECT_EQ(3191, DaoError([&] { td.CreateField("Name", dbText, 10); }).lCode);
+  for (const auto& c : cases) td.CreateField(c.pszName, c.nType, c.lSize);
+  EXPECT_EQ(3191, DaoError([&] { td.CreateField("Kürzel", dbText, 10); }).lCode);
   EXPECT_EQ(3047, DaoError([&] { td.CreateField("Lang", dbText, 256); }).lCode);
   td.Append();
   td.Close();
@@ -61,7 +52,6 @@ TEST_F(DaoTableDefTest, TablesAreListedOpenedAndDeleted) {
   EXPECT_EQ(CString("Länder"), info.m_strName);
 
   CDaoTableDef td(&m_db);
-  EXPECT_EQ(3011, DaoError([&] { td.Open("Fehlt"); }).lCode);
   EXPECT_EQ(3265, DaoError([&] { m_db.DeleteTableDef("Fehlt"); }).lCode);
   m_db.DeleteTableDef("Orte");
   ASSERT_EQ(1, m_db.GetTableDefCount());
@@ -94,8 +84,6 @@ TEST_F(DaoTableDefTest, IndexesAreMadeAndListedWithTheirFields) {
 
   ASSERT_EQ(2, td.GetIndexCount());
   CDaoIndexInfo info;
-  td.GetIndexInfo(0, info);
-  EXPECT_TRUE(info.m_bPrimary && info.m_bUnique);
   td.GetIndexInfo(1, info);
   EXPECT_EQ(CString("NachName"), info.m_strName);
   EXPECT_FALSE(info.m_bUnique);
@@ -110,7 +98,6 @@ TEST_F(DaoTableDefTest, IndexesAreMadeAndListedWithTheirFields) {
 
 TEST_F(DaoTableDefTest, StoredQueriesAreViewsAndTemporaryOnesAreNeverStored) {
   MakeTable("T", {{"A", dbLong, 0}, {"B", dbText, 10}});
-  m_db.Execute("insert into T (A, B) values (1, 'eins')");
   m_db.Execute("insert into T (A, B) values (2, 'zwei')");
 
   CDaoQueryDef stored(&m_db);
@@ -120,9 +107,6 @@ TEST_F(DaoTableDefTest, StoredQueriesAreViewsAndTemporaryOnesAreNeverStored) {
   temporary.Create(NULL, "select A from T");
   EXPECT_EQ(1, m_db.GetQueryDefCount());
   EXPECT_EQ(1, m_db.GetTableDefCount()); // a view is no table
-  CDaoQueryDefInfo info;
-  m_db.GetQueryDefInfo(0, info, AFX_DAO_ALL_INFO);
-  EXPECT_EQ(dbQSelect, info.m_nType);
 
   CDaoQueryDef reopened(&m_db);
   reopened.Open("Grosse");
@@ -132,11 +116,6 @@ TEST_F(DaoTableDefTest, StoredQueriesAreViewsAndTemporaryOnesAreNeverStored) {
   EXPECT_EQ(CString("zwei"), TextOf(rs.GetFieldValue("B")));
   rs.Close();
 
-  CDaoQueryDef action(&m_db);
-  action.Create(NULL, "delete from T where A = 1");
-  EXPECT_EQ(dbQAction, action.GetType());
-  action.Execute();
-  EXPECT_EQ(1, m_db.GetRecordsAffected());
   EXPECT_EQ(3012, DaoError([&] {
               CDaoQueryDef again(&m_db);
               again.Create("Grosse", "select * from T");
