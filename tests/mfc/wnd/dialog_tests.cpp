@@ -197,24 +197,22 @@ TEST_F(DialogTest, ModelessChildDialogIsCreatedAndTabMovesTheFocus) {
   frame.DestroyWindow();
 }
 
-class CSilentException : public CException {
-public:
-  virtual BOOL GetErrorMessage(LPSTR, UINT, PUINT) const { return FALSE; }
-};
-
+// An exception with a text of its own, or none (then the caller's resource id counts).
 class CTextException : public CException {
 public:
+  explicit CTextException(LPCSTR lpszText) : m_lpszText(lpszText) {}
   virtual BOOL GetErrorMessage(LPSTR lpszError, UINT nMaxError, PUINT) const {
-    lstrcpynA(lpszError, "Datei fehlt", nMaxError);
+    if (m_lpszText == NULL) return FALSE;
+    lstrcpynA(lpszError, m_lpszText, nMaxError);
     return TRUE;
   }
+  LPCSTR m_lpszText;
 };
 
 TEST_F(DialogTest, MessageBoxesAndReportErrorTakeTextsFromTheExceptionOrTheChain) {
   for (int nButton : {IDNO, IDOK, IDOK}) AnswerBox(nButton);
   EXPECT_EQ(IDNO, AfxMessageBox("Weiter?", MB_YESNO));
-  CTextException textEx;
-  CSilentException silentEx;
+  CTextException textEx("Datei fehlt"), silentEx(NULL);
   EXPECT_EQ(IDOK, textEx.ReportError(MB_OK, IDS_EXT_ONLY));
   EXPECT_EQ(IDOK, silentEx.ReportError(MB_OK, IDS_EXT_ONLY));
   EXPECT_EQ((std::vector<std::string>{"Weiter?", "Datei fehlt", "Nur in der Erweiterung: Gr\xFC\xDF" "e"}), m_boxes);
