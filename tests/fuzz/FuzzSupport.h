@@ -18,15 +18,15 @@
 namespace fuzz {
 
 // A file name of this process (fuzzers may run in parallel).
-inline std::string TempPath(char const *name)
+inline std::string TempPath(char const *name, char const *suffix = "")
 {
-    return "/tmp/" + std::string(name) + "_" + std::to_string(getpid());
+    return "/tmp/" + std::string(name) + "_" + std::to_string(getpid()) + suffix;
 }
 
 // That file, holding `size` bytes.
-inline std::string WriteFile(char const *name, std::uint8_t const *data, std::size_t size)
+inline std::string WriteFile(char const *name, std::uint8_t const *data, std::size_t size, char const *suffix = "")
 {
-    std::string path = TempPath(name);
+    std::string path = TempPath(name, suffix);
     if (std::FILE *fp = std::fopen(path.c_str(), "wb")) {
         std::fwrite(data, 1, size, fp);
         std::fclose(fp);
@@ -58,22 +58,12 @@ inline bool SplitSettings(std::uint8_t const *data, std::size_t size, Split &out
     return true;
 }
 
-// Repair hooks whose answers follow `mode` (set per input).
-inline int &RepairMode()
-{
-    static int mode = 0;
-    return mode;
-}
-inline int &RepairCalls()
-{
-    static int calls = 0;
-    return calls;
-}
+// Repair hooks whose answers follow the mode set per input.
+inline int repairMode = 0, repairCalls = 0;
 
 inline int Repair(CQoString const &, CQoString &data, int &pos)
 {
-    int const calls = ++RepairCalls();
-    switch ((RepairMode() + calls) % 4) {
+    switch ((repairMode + ++repairCalls) % 4) {
     case 0: return CQoInterActive::repairStop;
     case 1: return CQoInterActive::repairSkip;
     case 2: data = data.Left(pos); return CQoInterActive::repairTakeOver;
@@ -84,15 +74,15 @@ inline int Repair(CQoString const &, CQoString &data, int &pos)
 inline int Correct(CQoString &record)
 {
     record = "x";
-    return RepairCalls() % 2;
+    return repairCalls % 2;
 }
 
 // Installs the hooks; modes 6 and 7 leave the repair hook out, so defects raise.
 inline void InstallHooks(int mode)
 {
-    RepairMode() = mode & 7;
-    RepairCalls() = 0;
-    CQoInterActive::SetRepairRecord(RepairMode() < 6 ? &Repair : nullptr);
+    repairMode = mode & 7;
+    repairCalls = 0;
+    CQoInterActive::SetRepairRecord(repairMode < 6 ? &Repair : nullptr);
     CQoInterActive::SetCorrectRepair(&Correct);
 }
 
@@ -125,6 +115,20 @@ inline void ReadAndRevisit(CQoInputFilter &f, unsigned pick)
     }
     if (f.AbsoluteRow(static_cast<long>(rows.size())))
         std::abort();
+}
+
+// Opens the file with the filter, reads the column names and the rows; a
+// CQoException is a valid answer to a bad file.
+inline void ReadFile(CQoInputFilter &f, std::string const &path, unsigned pick)
+{
+    try {
+        f.Init(path.c_str());
+        CQoString name;
+        for (int c = 0; c < f.NumCols(); ++c)
+            f.ColName(c, name);
+        ReadAndRevisit(f, pick);
+    } catch (CQoException const &) {
+    }
 }
 
 } // namespace fuzz

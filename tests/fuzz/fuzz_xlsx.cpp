@@ -16,6 +16,7 @@
 
 #include <cstdint>
 #include <cstdlib>
+#include <initializer_list>
 #include <string>
 #include <vector>
 
@@ -28,67 +29,43 @@ char const *const partNames[] = {
     "xl/styles.xml",       "xl/worksheets/sheet1.xml", "xl/worksheets/sheet2.xml",
 };
 
-void Put16(std::string &out, unsigned v)
+// Little-endian fields of `bytes` bytes each.
+void Put(std::string &out, std::initializer_list<unsigned long> values, int bytes)
 {
-    out += char(v & 0xFF);
-    out += char((v >> 8) & 0xFF);
-}
-void Put32(std::string &out, unsigned long v)
-{
-    Put16(out, unsigned(v & 0xFFFF));
-    Put16(out, unsigned((v >> 16) & 0xFFFF));
+    for (unsigned long v : values)
+        for (int b = 0; b < bytes; ++b)
+            out += char((v >> (8 * b)) & 0xFF);
 }
 
 // A zip of stored members with correct CRCs and sizes.
 std::string StoredZip(std::vector<std::string> const &parts)
 {
     std::string file, directory;
-    unsigned count = 0;
+    unsigned long count = 0;
     for (std::size_t i = 0; i < parts.size() && i < sizeof partNames / sizeof *partNames; ++i) {
-        std::string name = partNames[i];
-        std::string const &body = parts[i];
-        unsigned long crc = crc32(0L, reinterpret_cast<Bytef const *>(body.data()), uInt(body.size()));
-        unsigned long offset = file.size();
-        Put32(file, 0x04034b50);
-        Put16(file, 20);
-        Put16(file, 0);
-        Put16(file, 0);
-        Put32(file, 0);
-        Put32(file, crc);
-        Put32(file, body.size());
-        Put32(file, body.size());
-        Put16(file, unsigned(name.size()));
-        Put16(file, 0);
+        std::string const name = partNames[i], &body = parts[i];
+        unsigned long const crc = crc32(0L, reinterpret_cast<Bytef const *>(body.data()), uInt(body.size()));
+        unsigned long const offset = file.size();
+        // version, flags, method (stored), time and date; CRC and both sizes; the name's length
+        Put(file, {0x04034b50}, 4);
+        Put(file, {20, 0, 0, 0, 0}, 2);
+        Put(file, {crc, body.size(), body.size()}, 4);
+        Put(file, {name.size(), 0}, 2);
         file += name + body;
-        Put32(directory, 0x02014b50);
-        Put16(directory, 20);
-        Put16(directory, 20);
-        Put16(directory, 0);
-        Put16(directory, 0);
-        Put32(directory, 0);
-        Put32(directory, crc);
-        Put32(directory, body.size());
-        Put32(directory, body.size());
-        Put16(directory, unsigned(name.size()));
-        Put16(directory, 0);
-        Put16(directory, 0);
-        Put16(directory, 0);
-        Put16(directory, 0);
-        Put32(directory, 0);
-        Put32(directory, offset);
+        Put(directory, {0x02014b50}, 4);
+        Put(directory, {20, 20, 0, 0, 0, 0}, 2);
+        Put(directory, {crc, body.size(), body.size()}, 4);
+        Put(directory, {name.size(), 0, 0, 0, 0}, 2);
+        Put(directory, {0, offset}, 4);
         directory += name;
         ++count;
     }
-    unsigned long directoryOffset = file.size();
+    unsigned long const directoryOffset = file.size();
     file += directory;
-    Put32(file, 0x06054b50);
-    Put16(file, 0);
-    Put16(file, 0);
-    Put16(file, count);
-    Put16(file, count);
-    Put32(file, directory.size());
-    Put32(file, directoryOffset);
-    Put16(file, 0);
+    Put(file, {0x06054b50}, 4);
+    Put(file, {0, 0, count, count}, 2);
+    Put(file, {directory.size(), directoryOffset}, 4);
+    Put(file, {0}, 2);
     return file;
 }
 
