@@ -16,7 +16,6 @@ TEST(CQoException, MessagesJoinTheGermanTextAndThePlace)
     };
     Case const cases[] = {
         {false, 19, nullptr, "Spalte 7", "Index au\337erhalb des g\374ltigen Bereichs (Spalte 7)"},
-        {false, 1, nullptr, "C:\\daten\\a.txt", "Datei nicht gefunden (C:\\daten\\a.txt)"},
         // Without a place the message is the text alone.
         {false, CQoException::readError, nullptr, "", "Fehler beim Lesen der Datei"},
         {false, 777, nullptr, "x", "Fehler 777 (x)"},
