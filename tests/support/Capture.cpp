@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <algorithm>
 
 namespace qotest {
 
@@ -55,26 +56,9 @@ void Chunk(std::vector<uint8_t>& png, const char* type, const std::vector<uint8_
     Put32(png, Crc32(&png[start], png.size() - start));
 }
 
-const uint8_t kSignature[8] = {0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'};
-
-}  // namespace
-
-COLORREF Image::Pixel(int x, int y) const
+// A PNG of the picture: scan lines without filter in stored deflate blocks.
+std::vector<uint8_t> EncodePng(const Image& img)
 {
-    if (x < 0 || y < 0 || x >= width || y >= height) return CLR_INVALID;
-    const uint8_t* p = &rgb[(static_cast<size_t>(y) * width + x) * 3];
-    return RGB(p[0], p[1], p[2]);
-}
-
-// ---------------------------------------------------------------------------------------------
-// Encoding
-
-bool EncodePng(const Image& img, std::vector<uint8_t>& png)
-{
-    if (img.width <= 0 || img.height <= 0 ||
-        img.rgb.size() != static_cast<size_t>(img.width) * img.height * 3)
-        return false;
-    // Raw scan lines, each with filter type 0 (none).
     const size_t row = static_cast<size_t>(img.width) * 3;
     std::vector<uint8_t> raw;
     raw.reserve((row + 1) * img.height);
@@ -98,7 +82,7 @@ bool EncodePng(const Image& img, std::vector<uint8_t>& png)
     } while (pos < raw.size());
     Put32(z, Adler32(raw.data(), raw.size()));
 
-    png.assign(kSignature, kSignature + 8);
+    std::vector<uint8_t> png = {0x89, 'P', 'N', 'G', '\r', '\n', 0x1A, '\n'};
     std::vector<uint8_t> ihdr;
     Put32(ihdr, static_cast<uint32_t>(img.width));
     Put32(ihdr, static_cast<uint32_t>(img.height));
@@ -106,22 +90,17 @@ bool EncodePng(const Image& img, std::vector<uint8_t>& png)
     Chunk(png, "IHDR", ihdr);
     Chunk(png, "IDAT", z);
     Chunk(png, "IEND", {});
-    return true;
+    return png;
 }
 
-bool WritePng(const Image& img, const char* path)
+}  // namespace
+
+COLORREF Image::Pixel(int x, int y) const
 {
-    std::vector<uint8_t> png;
-    if (!EncodePng(img, png)) return false;
-    FILE* f = std::fopen(path, "wb");
-    if (!f) return false;
-    bool ok = std::fwrite(png.data(), 1, png.size(), f) == png.size();
-    ok = std::fclose(f) == 0 && ok;
-    return ok;
+    if (x < 0 || y < 0 || x >= width || y >= height) return CLR_INVALID;
+    const uint8_t* p = &rgb[(static_cast<size_t>(y) * width + x) * 3];
+    return RGB(p[0], p[1], p[2]);
 }
-
-// ---------------------------------------------------------------------------------------------
-// Capturing
 
 bool CaptureImage(HWND hwnd, Image& out, bool clientOnly)
 {
@@ -158,7 +137,9 @@ bool CaptureImage(HWND hwnd, Image& out, bool clientOnly)
         GdiFlush();
         SelectObject(mem, old);
         if (ok) {
-            out.Resize(w, h);
+            out.width = w;
+            out.height = h;
+            out.rgb.assign(static_cast<size_t>(w) * h * 3, 0);
             const size_t stride = (static_cast<size_t>(w) * 3 + 3) & ~size_t(3);
             const uint8_t* src = static_cast<const uint8_t*>(bits);
             for (int y = 0; y < h; ++y)
@@ -180,7 +161,12 @@ bool CaptureImage(HWND hwnd, Image& out, bool clientOnly)
 bool CaptureWindow(HWND hwnd, const char* pngPath, bool clientOnly)
 {
     Image img;
-    return CaptureImage(hwnd, img, clientOnly) && WritePng(img, pngPath);
+    if (!CaptureImage(hwnd, img, clientOnly)) return false;
+    const std::vector<uint8_t> png = EncodePng(img);
+    FILE* f = std::fopen(pngPath, "wb");
+    if (!f) return false;
+    const bool written = std::fwrite(png.data(), 1, png.size(), f) == png.size();
+    return std::fclose(f) == 0 && written;
 }
 
 std::string CapturePath(const std::string& fileName)

@@ -6,11 +6,8 @@
 //     ASSERT_TRUE(qotest::CaptureImage(list, img));
 //     EXPECT_EQ(RGB(255, 0, 0), img.Pixel(5, 20));        // what the user sees at (5,20)
 //
-// CaptureWindow brings the window's top-level window to the front, lets it paint, and copies the
-// window's rectangle from the screen (what the user sees, children and frame included) into a
-// 24-bit picture. PNG files are written by a small encoder of our own (stored deflate blocks; any
-// PNG reader opens them). CapturePath puts a file name into the folder named by the environment
-// variable QO_CAPTURE_DIR (the current folder if it is not set).
+// Capturing brings the top-level window to the front, lets it paint and copies the window's
+// rectangle from the screen: what the user sees. PNG files use stored deflate blocks.
 #pragma once
 
 #include <windows.h>
@@ -28,7 +25,6 @@ struct Image {
     std::vector<uint8_t> rgb;
 
     COLORREF Pixel(int x, int y) const;  // RGB(...) of a pixel; CLR_INVALID outside
-    void Resize(int w, int h) { width = w; height = h; rgb.assign(static_cast<size_t>(w) * h * 3, 0); }
 };
 
 // Copies what the screen shows of `hwnd` (its window rectangle; client area only if `clientOnly`).
@@ -37,8 +33,5 @@ bool CaptureImage(HWND hwnd, Image& out, bool clientOnly = false);
 bool CaptureWindow(HWND hwnd, const char* pngPath, bool clientOnly = false);
 // QO_CAPTURE_DIR (or ".") joined with `fileName`; the folder is created if needed.
 std::string CapturePath(const std::string& fileName);
-
-bool WritePng(const Image& img, const char* path);
-bool EncodePng(const Image& img, std::vector<uint8_t>& png);
 
 }  // namespace qotest

@@ -15,16 +15,6 @@ constexpr UINT kEscalationMs = 300;  // between the steps of a forced close
 
 thread_local DialogDriver* t_driver = nullptr;
 
-std::string WindowText(HWND hwnd)
-{
-    if (!hwnd) return std::string();
-    int len = GetWindowTextLengthA(hwnd);
-    std::string s(static_cast<size_t>(len) + 1, '\0');
-    int got = GetWindowTextA(hwnd, &s[0], len + 1);
-    s.resize(static_cast<size_t>(std::max(got, 0)));
-    return s;
-}
-
 std::string ClassOf(HWND hwnd)
 {
     char name[64] = "";
@@ -43,10 +33,30 @@ HWND ComboEdit(HWND combo)
 
 }  // namespace
 
-// ---------------------------------------------------------------------------------------------
-// Pumping
+namespace detail {
 
-void PumpFor(DWORD ms)
+void RunGuarded(const std::function<void()>& script, bool report, const std::string& what)
+{
+    try {
+        script();
+    } catch (const std::exception& e) {
+        if (report) ADD_FAILURE() << what << " threw: " << e.what();
+    } catch (...) {
+        if (report) ADD_FAILURE() << what << " threw";
+    }
+}
+
+}  // namespace detail
+
+std::string WindowText(HWND hwnd)
+{
+    if (!hwnd) return std::string();
+    std::string s(static_cast<size_t>(GetWindowTextLengthA(hwnd)) + 1, '\0');
+    s.resize(static_cast<size_t>(std::max(GetWindowTextA(hwnd, &s[0], static_cast<int>(s.size())), 0)));
+    return s;
+}
+
+void PumpWith(DWORD ms, BOOL (*pre)(MSG*))
 {
     const DWORD start = GetTickCount();
     for (;;) {
@@ -56,6 +66,7 @@ void PumpFor(DWORD ms)
                 PostQuitMessage(static_cast<int>(msg.wParam));
                 return;
             }
+            if (pre && pre(&msg)) continue;
             TranslateMessage(&msg);
             DispatchMessageA(&msg);
         }
@@ -74,9 +85,6 @@ bool WaitFor(const std::function<bool()>& done, DWORD ms)
     }
     return true;
 }
-
-// ---------------------------------------------------------------------------------------------
-// Dialog: reading
 
 std::string Dialog::Title() const { return WindowText(m_hwnd); }
 
@@ -113,35 +121,17 @@ int Dialog::Selection(int id) const
     return r < 0 ? -1 : static_cast<int>(r);
 }
 
-namespace {
-
-// The texts of a combo box's or list box's items, through the box's own
-// count, length and text messages.
-std::vector<std::string> ItemTexts(HWND h, UINT getCount, UINT getTextLen, UINT getText)
+std::vector<std::string> Dialog::ListItems(int id) const
 {
     std::vector<std::string> items;
-    if (!h) return items;
-    LRESULT n = SendMessageA(h, getCount, 0, 0);
+    HWND h = Item(id);
+    const LRESULT n = h ? SendMessageA(h, LB_GETCOUNT, 0, 0) : 0;
     for (LRESULT i = 0; i < n; ++i) {
-        LRESULT len = SendMessageA(h, getTextLen, i, 0);
-        std::string s(static_cast<size_t>(std::max<LRESULT>(len, 0)) + 1, '\0');
-        LRESULT got = SendMessageA(h, getText, i, reinterpret_cast<LPARAM>(&s[0]));
-        s.resize(static_cast<size_t>(std::max<LRESULT>(got, 0)));
+        std::string s(static_cast<size_t>(std::max<LRESULT>(SendMessageA(h, LB_GETTEXTLEN, i, 0), 0)) + 1, '\0');
+        s.resize(static_cast<size_t>(std::max<LRESULT>(SendMessageA(h, LB_GETTEXT, i, reinterpret_cast<LPARAM>(&s[0])), 0)));
         items.push_back(s);
     }
     return items;
-}
-
-}  // namespace
-
-std::vector<std::string> Dialog::ComboItems(int id) const
-{
-    return ItemTexts(Item(id), CB_GETCOUNT, CB_GETLBTEXTLEN, CB_GETLBTEXT);
-}
-
-std::vector<std::string> Dialog::ListItems(int id) const
-{
-    return ItemTexts(Item(id), LB_GETCOUNT, LB_GETTEXTLEN, LB_GETTEXT);
 }
 
 std::vector<int> Dialog::ButtonIds() const
@@ -177,9 +167,6 @@ IconKind Dialog::Icon() const
     return IconKind::None;
 }
 
-// ---------------------------------------------------------------------------------------------
-// Dialog: acting
-
 HWND Dialog::Control(int id, const char* action, bool mustBeEnabled) const
 {
     HWND h = Item(id);
@@ -187,14 +174,9 @@ HWND Dialog::Control(int id, const char* action, bool mustBeEnabled) const
         ADD_FAILURE() << action << ": dialog \"" << Title() << "\" has no control " << id;
         return nullptr;
     }
-    if (mustBeEnabled && !IsWindowEnabled(h)) {
-        ADD_FAILURE() << action << ": control " << id << " of dialog \"" << Title()
-                      << "\" is disabled";
-        return nullptr;
-    }
-    if (mustBeEnabled && !IsWindowVisible(h)) {
-        ADD_FAILURE() << action << ": control " << id << " of dialog \"" << Title()
-                      << "\" is hidden";
+    if (mustBeEnabled && (!IsWindowEnabled(h) || !IsWindowVisible(h))) {
+        ADD_FAILURE() << action << ": control " << id << " of dialog \"" << Title() << "\" is "
+                      << (IsWindowEnabled(h) ? "hidden" : "disabled");
         return nullptr;
     }
     return h;
@@ -217,8 +199,7 @@ bool Dialog::SetText(int id, const std::string& text)
         ADD_FAILURE() << "SetText: edit " << id << " of dialog \"" << Title() << "\" is read-only";
         return false;
     }
-    // Select everything and replace it: the edit treats this as user input and notifies its
-    // parent by itself (EN_UPDATE, EN_CHANGE), also for multi-line edits.
+    // Replacing the selection is user input to the edit: it notifies its parent itself.
     SendMessageA(edit, EM_SETSEL, 0, -1);
     SendMessageA(edit, EM_REPLACESEL, TRUE, reinterpret_cast<LPARAM>(text.c_str()));
     return true;
@@ -243,11 +224,10 @@ bool Dialog::Check(int id, bool checked)
     if (!h) return false;
     const WPARAM want = checked ? BST_CHECKED : BST_UNCHECKED;
     // A three-state box needs up to two clicks; a radio button cannot be unchecked by a click.
-    for (int i = 0; i < 3 && IsWindow(h); ++i) {
+    for (int i = 0; i <= 3 && IsWindow(h); ++i) {
         if (static_cast<WPARAM>(SendMessageA(h, BM_GETCHECK, 0, 0)) == want) return true;
-        SendMessageA(h, BM_CLICK, 0, 0);
+        if (i < 3) SendMessageA(h, BM_CLICK, 0, 0);
     }
-    if (IsWindow(h) && static_cast<WPARAM>(SendMessageA(h, BM_GETCHECK, 0, 0)) == want) return true;
     ADD_FAILURE() << "Check: control " << id << " of dialog \"" << Title()
                   << "\" did not become " << (checked ? "checked" : "unchecked");
     return false;
@@ -317,9 +297,6 @@ LRESULT Dialog::Send(int id, UINT msg, WPARAM wp, LPARAM lp) const
     HWND h = Item(id);
     return h ? SendMessageA(h, msg, wp, lp) : 0;
 }
-
-// ---------------------------------------------------------------------------------------------
-// DialogDriver
 
 DialogDriver::DialogDriver()
 {
@@ -393,16 +370,9 @@ void DialogDriver::RunScript(HWND hwnd)
     if (m_queue.empty()) return;
     DialogScript script = std::move(m_queue.front());
     m_queue.pop_front();
-    const std::string title = WindowText(hwnd);
     ++m_running;
-    try {
-        Dialog d(hwnd);
-        script(d);
-    } catch (const std::exception& e) {
-        if (m_reportFailures) ADD_FAILURE() << "script for \"" << title << "\" threw: " << e.what();
-    } catch (...) {
-        if (m_reportFailures) ADD_FAILURE() << "script for \"" << title << "\" threw";
-    }
+    Dialog d(hwnd);
+    detail::RunGuarded([&] { script(d); }, m_reportFailures, "script for \"" + WindowText(hwnd) + "\"");
     --m_running;
     // The watch may be gone already (the script's own pumping closed the dialog).
     if (IsWindow(hwnd) && Find(hwnd)) SetTimer(hwnd, kWatchTimer, m_timeout, TimerProc);

@@ -14,38 +14,41 @@
 //     EXPECT_TRUE(driver.Done());                        // every queued script ran
 //     EXPECT_EQ(0, driver.Unanswered());                 // none had to be closed by force
 //
-// How it works: a thread CBT hook sees each top-level dialog (class "#32770") activate. A moment
-// later (a timer on the dialog, which the dialog's own modal loop dispatches, so the dialog is fully
-// initialised) the next queued script runs on it. Scripts run on the test thread, inside the
-// dialog's modal loop, so gtest's EXPECT_* work there. ASSERT_* cannot abort a script (it returns
-// from the lambda only); use EXPECT_* and plain returns.
-//
-// Pressing a button posts WM_COMMAND, as a click does; the dialog reacts when the script has
-// returned. A script that must see the reaction (a button that opens a nested box, a value that
-// changes) pumps with qotest::WaitFor/PumpFor inside the script; a nested dialog that opens during
-// that pump is handled by the next queued script.
-//
-// Robustness: if a dialog is still open some time after its script ran (or no script was queued
-// for it, or the script threw), the driver closes it (IDCANCEL, then WM_CLOSE, then EndDialog) and
-// counts it in Unanswered(); unless switched off, the running test fails with the reason. Scripts still queued when the driver is destroyed fail the test as well. A dialog that is disabled because a
-// nested modal box is open over it is left alone until that box has gone.
+// A thread CBT hook sees each top-level dialog ("#32770") activate; a timer on the dialog, run by
+// its own modal loop once it is initialised, then runs the next queued script on the test thread,
+// so EXPECT_* work there (ASSERT_* only leaves the lambda). Press posts WM_COMMAND as a click does;
+// a script that must see the reaction pumps with WaitFor/PumpFor, and a nested dialog opening then
+// gets the next script. A dialog still open some time after its script, or one without a script,
+// is closed (IDCANCEL, WM_CLOSE, EndDialog), counted in Unanswered() and, unless switched off,
+// fails the test; so do scripts still queued at the end. A dialog disabled under a nested box is
+// left alone until the box has gone.
 #pragma once
 
 #include <windows.h>
 
 #include <deque>
 #include <functional>
-#include <set>
 #include <string>
 #include <vector>
 
 namespace qotest {
 
-// Pumps the calling thread's messages for about `ms` milliseconds.
-void PumpFor(DWORD ms);
+// Pumps the calling thread's messages for about `ms` milliseconds. A WM_QUIT ends the pumping and
+// is posted again for the loop that owns it. PumpWith hands each message to `pre` first (if given)
+// and dispatches it only when `pre` answers false.
+void PumpWith(DWORD ms, BOOL (*pre)(MSG*));
+inline void PumpFor(DWORD ms) { PumpWith(ms, nullptr); }
 
 // Pumps messages until `done()` is true or `ms` milliseconds have passed; answers `done()`.
 bool WaitFor(const std::function<bool()>& done, DWORD ms);
+
+// The window's text (empty for no window).
+std::string WindowText(HWND hwnd);
+
+namespace detail {
+// Runs a driver's script; an exception from it fails the test (if `report`) naming `what`.
+void RunGuarded(const std::function<void()>& script, bool report, const std::string& what);
+}
 
 // The icon that a message box shows.
 enum class IconKind { None, Information, Warning, Error, Question, Other };
@@ -68,30 +71,27 @@ public:
     bool IsEnabled(int id) const;
     bool IsChecked(int id) const;          // BM_GETCHECK == BST_CHECKED
     int Selection(int comboOrListId) const;  // current selection index, -1 if none
-    std::vector<std::string> ComboItems(int id) const;
     std::vector<std::string> ListItems(int id) const;
     std::string ClassName(int id) const;
     std::vector<int> ButtonIds() const;    // visible push buttons of a message box (IDOK, IDYES, ...)
     IconKind Icon() const;                 // icon of a message box
 
     // Acting as a user would
-    // Replaces the text of an edit (or of a combo box's edit) the way typing does: the control
-    // itself sends EN_CHANGE (CBN_EDITCHANGE for a combo box). Other controls get WM_SETTEXT.
+    // Replaces the text of an edit (or of a combo box's edit) as typing does, so the control
+    // notifies its parent itself; other controls get WM_SETTEXT.
     bool SetText(int id, const std::string& text);
-    // Gives the control the focus and sends one WM_CHAR per character; the text goes where the
-    // caret or selection is, exactly as keystrokes would.
+    // Gives the control the focus and sends one WM_CHAR per character, at the caret.
     bool Type(int id, const std::string& text);
     // Clicks a check box or radio button (BM_CLICK) until its state is `checked`.
     bool Check(int id, bool checked = true);
-    // Selects entry `index` of a combo box or list box and notifies the parent with
-    // CBN_SELCHANGE / LBN_SELCHANGE (the latter only with LBS_NOTIFY, as the list box itself does).
+    // Selects entry `index` and notifies the parent with CBN_SELCHANGE / LBN_SELCHANGE (the latter
+    // only with LBS_NOTIFY, as the list box itself does).
     bool Select(int comboOrListId, int index);
     bool SelectText(int comboOrListId, const std::string& text);  // by exact item text
     // Posts WM_COMMAND(id, BN_CLICKED) as a click on the button does (IDYES etc. for a message box).
     bool Press(int buttonId);
     // Posts WM_COMMAND(IDCANCEL) as the Escape key does, whether or not a Cancel button exists.
     void Cancel();
-    // Sends a message to a control (for what the helpers above do not cover).
     LRESULT Send(int id, UINT msg, WPARAM wp = 0, LPARAM lp = 0) const;
 
 private:
@@ -116,13 +116,11 @@ public:
 
     // How long a dialog may stay open after its script before the driver closes it (default 3000 ms).
     void SetTimeout(UINT ms) { m_timeout = ms; }
-    // Whether an unanswered or unexpected dialog and a throwing script also fail the running test
-    // at once (default true). Tests of the driver itself switch it off and check the counts.
+    // Whether unanswered dialogs and throwing scripts fail the running test (default true).
     void SetReportFailures(bool report) { m_reportFailures = report; }
 
-    // Results
     bool Done() const { return m_queue.empty() && m_running == 0; }  // every script ran
-    int Seen() const { return m_seen; }                              // dialogs that appeared
+    int Seen() const { return m_seen; }
     int Unanswered() const { return m_unanswered; }
 
 private:

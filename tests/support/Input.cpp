@@ -15,15 +15,6 @@ void Send(INPUT& in)
     SendInput(1, &in, sizeof(INPUT));
 }
 
-DWORD ButtonFlag(MouseButton b, bool down)
-{
-    switch (b) {
-    case MouseButton::Right: return down ? MOUSEEVENTF_RIGHTDOWN : MOUSEEVENTF_RIGHTUP;
-    case MouseButton::Middle: return down ? MOUSEEVENTF_MIDDLEDOWN : MOUSEEVENTF_MIDDLEUP;
-    default: return down ? MOUSEEVENTF_LEFTDOWN : MOUSEEVENTF_LEFTUP;
-    }
-}
-
 }  // namespace
 
 void BringToFront(HWND hwnd)
@@ -54,8 +45,7 @@ POINT ToScreen(HWND hwnd, int x, int y)
 
 void InjectMove(POINT screen)
 {
-    // SetCursorPos places the pointer exactly; the absolute move event that follows makes the
-    // system deliver WM_MOUSEMOVE as for a real movement.
+    // SetCursorPos places the pointer exactly; the move event makes the system send WM_MOUSEMOVE.
     SetCursorPos(screen.x, screen.y);
     const int w = GetSystemMetrics(SM_CXSCREEN), h = GetSystemMetrics(SM_CYSCREEN);
     INPUT in = {};
@@ -72,7 +62,8 @@ void InjectButton(MouseButton button, bool down)
 {
     INPUT in = {};
     in.type = INPUT_MOUSE;
-    in.mi.dwFlags = ButtonFlag(button, down);
+    if (button == MouseButton::Right) in.mi.dwFlags = down ? MOUSEEVENTF_RIGHTDOWN : MOUSEEVENTF_RIGHTUP;
+    else in.mi.dwFlags = down ? MOUSEEVENTF_LEFTDOWN : MOUSEEVENTF_LEFTUP;
     Send(in);
 }
 
@@ -111,7 +102,6 @@ void Click(HWND hwnd, int x, int y, MouseButton button)
 void DoubleClick(HWND hwnd, int x, int y, MouseButton button)
 {
     MoveMouse(hwnd, x, y);
-    // Both clicks well within the double-click time and at the same spot.
     for (int i = 0; i < 2; ++i) {
         InjectButton(button, true);
         PumpFor(5);

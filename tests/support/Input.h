@@ -12,11 +12,9 @@
 //     qotest::Focus(edit);
 //     qotest::TypeText("Müller");                        // WM_KEYDOWN/WM_CHAR per character
 //
-// Coordinates are client coordinates of the window passed (screen coordinates if it is null).
-// The window must be visible and not covered at that point. Each helper pumps the calling thread's
-// messages for a moment after each event so that a window of the same thread reacts before the
-// next event; the Inject* functions do not pump (for use inside a menu or drag loop, which reads
-// the events itself).
+// Coordinates are client coordinates of the window passed (screen coordinates if it is null); the
+// point must be visible. Each helper pumps a moment after each event; the Inject* functions do not
+// (for use inside a menu or drag loop, which reads the events itself).
 #pragma once
 
 #include <windows.h>
@@ -25,16 +23,13 @@
 
 namespace qotest {
 
-enum class MouseButton { Left, Right, Middle };
+enum class MouseButton { Left, Right };
 
-// Modifier flags for KeyPress.
 enum : unsigned { kShift = 1, kCtrl = 2, kAlt = 4 };
 
-// Window helpers
 void BringToFront(HWND hwnd);  // shows, raises, activates its top-level window and lets it paint
 void Focus(HWND hwnd);         // activates its top-level window and gives `hwnd` the keyboard focus
 
-// Mouse
 POINT ToScreen(HWND hwnd, int x, int y);
 void MoveMouse(HWND hwnd, int x, int y);
 void Click(HWND hwnd, int x, int y, MouseButton button = MouseButton::Left);

@@ -5,8 +5,6 @@
 
 #include <gtest/gtest.h>
 
-#include <exception>
-
 #ifndef MN_GETHMENU
 #define MN_GETHMENU 0x01E1
 #endif
@@ -64,18 +62,15 @@ std::string Label(const std::string& text)
 
 }  // namespace
 
-// ---------------------------------------------------------------------------------------------
-// Menu
-
-std::vector<MenuItem> Menu::ReadItems(HMENU menu)
+std::vector<MenuItem> Menu::Items() const
 {
     std::vector<MenuItem> items;
-    int count = GetMenuItemCount(menu);
+    int count = GetMenuItemCount(m_menu);
     for (int pos = 0; pos < count; ++pos) {
         MENUITEMINFOA mii = {};
         mii.cbSize = sizeof mii;
         mii.fMask = MIIM_FTYPE | MIIM_STATE | MIIM_ID | MIIM_SUBMENU | MIIM_STRING;
-        if (!GetMenuItemInfoA(menu, pos, TRUE, &mii)) continue;
+        if (!GetMenuItemInfoA(m_menu, pos, TRUE, &mii)) continue;
         MenuItem item;
         item.position = pos;
         item.id = mii.wID;
@@ -86,7 +81,7 @@ std::vector<MenuItem> Menu::ReadItems(HMENU menu)
             mii.dwTypeData = &text[0];
             mii.cch += 1;
             mii.fMask = MIIM_STRING;
-            GetMenuItemInfoA(menu, pos, TRUE, &mii);
+            GetMenuItemInfoA(m_menu, pos, TRUE, &mii);
             text.resize(mii.cch);
             item.text = text;
             item.label = Label(text);
@@ -94,14 +89,10 @@ std::vector<MenuItem> Menu::ReadItems(HMENU menu)
         // MFS_GRAYED includes the MFS_DISABLED bit; MF_GRAYED alone is bit 0.
         item.grayed = (mii.fState & MF_GRAYED) != 0;
         item.enabled = (mii.fState & (MF_GRAYED | MF_DISABLED)) == 0;
-        item.checked = (mii.fState & MFS_CHECKED) != 0;
-        item.isDefault = (mii.fState & MFS_DEFAULT) != 0;
         items.push_back(item);
     }
     return items;
 }
-
-std::vector<MenuItem> Menu::Items() const { return ReadItems(m_menu); }
 
 std::vector<std::string> Menu::Labels() const
 {
@@ -146,9 +137,6 @@ bool Menu::ChooseLabel(const std::string& label)
     ADD_FAILURE() << "menu has no item \"" << label << "\"";
     return false;
 }
-
-// ---------------------------------------------------------------------------------------------
-// MenuDriver
 
 MenuDriver::MenuDriver()
 {
@@ -229,11 +217,6 @@ void CALLBACK MenuDriver::TimerProc(HWND, UINT, UINT_PTR id, DWORD)
     else self->CheckClosed();
 }
 
-void MenuDriver::Fail(const std::string& what)
-{
-    if (m_reportFailures) ADD_FAILURE() << what;
-}
-
 void MenuDriver::RunScript()
 {
     HMENU menu = m_menu;
@@ -244,14 +227,8 @@ void MenuDriver::RunScript()
     MenuScript script = std::move(m_queue.front());
     m_queue.pop_front();
     m_running = true;
-    try {
-        Menu m(menu);
-        script(m);
-    } catch (const std::exception& e) {
-        Fail(std::string("menu script threw: ") + e.what());
-    } catch (...) {
-        Fail("menu script threw");
-    }
+    Menu m(menu);
+    detail::RunGuarded([&] { script(m); }, m_reportFailures, "menu script");
     m_running = false;
     if (m_inLoop) StartTimer(m_timeout, false);
 }
@@ -260,8 +237,9 @@ void MenuDriver::CheckClosed()
 {
     if (m_closeStage++ == 0) {
         ++m_unanswered;
-        Fail(m_loopScripted ? "popup menu still open after its script; closed"
-                            : "unexpected popup menu; closed");
+        if (m_reportFailures)
+            ADD_FAILURE() << (m_loopScripted ? "popup menu still open after its script; closed"
+                                             : "unexpected popup menu; closed");
     }
     EndMenu();
     StartTimer(300, false);

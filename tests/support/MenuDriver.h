@@ -13,13 +13,11 @@
 //     qotest::RightClick(list, 20, 30);                  // the window opens its context menu
 //     EXPECT_TRUE(menus.Done());
 //
-// How it works: a thread WH_CALLWNDPROC hook sees the owner window receive WM_ENTERMENULOOP /
-// WM_INITMENUPOPUP; a moment later (a thread timer, which the menu loop dispatches) the next script
-// runs with the menu's HMENU (from MN_GETHMENU on the shown "#32768" window). Items are read
-// with GetMenuItemInfo; Choose clicks the item's rectangle with SendInput.
-// The loop reads those events after the script has returned. A menu still open some time after
-// its script (or one without a script) is closed with EndMenu and counted in Unanswered().
-// Menus tracked with TPM_NONOTIFY send no notifications and are not seen.
+// A thread WH_CALLWNDPROC hook sees the owner get WM_ENTERMENULOOP / WM_INITMENUPOPUP; a thread
+// timer, run by the menu loop, then runs the next script on the shown menu. Choose clicks the
+// item with SendInput; the loop reads the click when the script has returned. A menu still open
+// some time after its script, or one without a script, is closed with EndMenu and counted in
+// Unanswered(). Menus tracked with TPM_NONOTIFY are not seen.
 #pragma once
 
 #include <windows.h>
@@ -39,8 +37,6 @@ struct MenuItem {
     bool separator = false;
     bool enabled = true;   // neither MFS_DISABLED nor MFS_GRAYED
     bool grayed = false;   // MF_GRAYED
-    bool checked = false;
-    bool isDefault = false;
     HMENU submenu = nullptr;
 };
 
@@ -55,8 +51,6 @@ public:
     // Clicks the item with the mouse; a test failure if missing, disabled or a separator.
     bool Choose(UINT id);
     bool ChooseLabel(const std::string& label);
-
-    static std::vector<MenuItem> ReadItems(HMENU menu);
 
 private:
     bool ClickPosition(int position);
@@ -88,7 +82,6 @@ private:
     void OnMenuEnd();
     void RunScript();
     void CheckClosed();
-    void Fail(const std::string& what);
     void StartTimer(UINT ms, bool script);
 
     HHOOK m_hook = nullptr;

@@ -29,28 +29,11 @@
 namespace qotest {
 
 // The application's message loop for about `ms` milliseconds: every message goes to
-// AfxPreTranslateMessage first, so that a page embedded in a frame gets Enter, Escape
-// and the frame's shortcuts as it does in the application. A WM_QUIT ends the pumping
-// and is posted again for the loop that owns it.
+// AfxPreTranslateMessage first, so that a page in a frame gets Enter, Escape and the
+// frame's shortcuts as in the application.
 inline void PumpApp(DWORD ms)
 {
-    const DWORD start = GetTickCount();
-    for (;;) {
-        MSG msg;
-        while (PeekMessageA(&msg, NULL, 0, 0, PM_REMOVE)) {
-            if (msg.message == WM_QUIT) {
-                PostQuitMessage(static_cast<int>(msg.wParam));
-                return;
-            }
-            if (!AfxPreTranslateMessage(&msg)) {
-                TranslateMessage(&msg);
-                DispatchMessageA(&msg);
-            }
-        }
-        const DWORD elapsed = GetTickCount() - start;
-        if (elapsed >= ms) return;
-        MsgWaitForMultipleObjects(0, NULL, FALSE, ms - elapsed, QS_ALLINPUT);
-    }
+    PumpWith(ms, [](MSG* msg) -> BOOL { return AfxPreTranslateMessage(msg); });
 }
 
 // A real key press to the window with the focus (Ctrl held if `ctrl`), read by PumpApp.
@@ -173,13 +156,6 @@ inline std::string MessageOf(const std::function<void()>& action)
     return text;
 }
 
-inline std::string WindowText(HWND hwnd)
-{
-    std::string text(static_cast<size_t>(::GetWindowTextLengthA(hwnd)) + 1, '\0');
-    text.resize(static_cast<size_t>(::GetWindowTextA(hwnd, &text[0], static_cast<int>(text.size()))));
-    return text;
-}
-
 // A path in the system's temporary folder.
 inline std::string TempPath(const std::string& name)
 {
@@ -207,15 +183,6 @@ inline int CountPixels(const Image& img, const RECT& rc, COLORREF colour)
 inline int CountPixels(const Image& img, COLORREF colour)
 {
     return CountPixels(img, RECT{0, 0, img.width, img.height}, colour);
-}
-
-// Whether two pictures show the same inside `rc`.
-inline bool SameIn(const Image& a, const Image& b, const RECT& rc)
-{
-    for (int y = rc.top; y < rc.bottom; ++y)
-        for (int x = rc.left; x < rc.right; ++x)
-            if (a.Pixel(x, y) != b.Pixel(x, y)) return false;
-    return true;
 }
 
 // The caption of a report list's column.

@@ -6,7 +6,6 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
-#include <cstdlib>
 #include <fstream>
 #include <string>
 
@@ -30,22 +29,14 @@ TEST(Capture, PictureShowsWhatTheWindowPainted)
     ASSERT_TRUE(qotest::CaptureImage(win.Hwnd(), img, true));
     EXPECT_EQ(160, img.width);
     EXPECT_EQ(120, img.height);
-    EXPECT_EQ(kBlue, img.Pixel(5, 5));
     EXPECT_EQ(kBlue, img.Pixel(19, 19));
     EXPECT_EQ(kRed, img.Pixel(20, 20));
-    EXPECT_EQ(kRed, img.Pixel(100, 80));
     EXPECT_EQ(CLR_INVALID, img.Pixel(160, 0));
 
-    // The whole window includes the frame around the client area.
     char dir[MAX_PATH];
     GetTempPathA(MAX_PATH, dir);
-    std::string saved = std::getenv("QO_CAPTURE_DIR") ? std::getenv("QO_CAPTURE_DIR") : "";
-    SetEnvironmentVariableA("QO_CAPTURE_DIR", nullptr);
-    _putenv((std::string("QO_CAPTURE_DIR=") + dir + "qo-capture-test").c_str());
-    std::string path = qotest::CapturePath("fenster.png");
-    EXPECT_EQ(std::string(dir) + "qo-capture-test\\fenster.png", path);
+    const std::string path = std::string(dir) + "qo-capture-test.png";
     ASSERT_TRUE(qotest::CaptureWindow(win.Hwnd(), path.c_str()));
-    _putenv((std::string("QO_CAPTURE_DIR=") + saved).c_str());
 
     // A PNG of the whole window, frame included.
     std::ifstream in(path, std::ios::binary);
