@@ -6,23 +6,41 @@
 // to a temporary file next to the target, which then replaces the target in one
 // step, so a crash or a full disk never leaves a half-written configuration.
 //
-// File format (Windows-1252 text, lines end with CR LF):
+// File format (Windows-1252 text; the writer ends lines with CR LF, the reader
+// takes CR LF, LF and CR alike):
 //
+//     ; qotools 2
 //     [section]
 //     key=value
 //
 // * Section and key names are case-insensitive (as Windows INI files are);
 //   the spelling of the first use is kept. Both are unique in a file, and the
 //   order of sections and keys is kept as read or first set.
-// * Values hold any character. In the file a backslash starts an escape:
-//   \\ backslash, \r CR, \n LF, \t tab, \s a blank (used for leading and trailing
-//   blanks, which would otherwise be lost) and \xHH any other byte. Key and
-//   section names use the same escapes, so a key may even contain '='.
+// * Values are written as they are, so that a path reads as a user would type
+//   it (`Datei=C:\daten\kunden.txt`). A value that would not survive as plain
+//   text (a control character such as a line break, a blank or tab at either
+//   end, a leading `"`) is written quoted: `"`, the text with the escapes
+//   \\ \" \r \n \t and \xHH, `"`.
+// * The first line marks a file of this writer. Below it a value is read
+//   quoted only when it is exactly what the writer makes of its text;
+//   everything else is taken as it stands.
+// * Files without the mark are written by hand or by the earlier writer, which
+//   escaped every value (\\ \r \n \t, \s for a blank at either end, \xHH).
+//   A value there is read in that escaped form only when it is exactly what
+//   the earlier writer made of its text and holds one of \\, \s or \xHH
+//   (`C:\\daten\\x.txt`, `\s;\s`); otherwise it is taken as it stands,
+//   so `daten\sicherung.txt` and `C:\temp\neu.txt` mean what they say.
+//   The earlier writer's values whose only escapes are \r \n \t cannot be
+//   told from typed paths and are read as they stand.
+// * Section and key names keep the escaped form in every file (the escapes
+//   above, and \xHH for `= [ ] ; #`, so a key may even contain '='); a
+//   backslash that starts no escape is taken as it stands.
 // * Reading is forgiving: blank lines and lines starting with ';' or '#' are
-//   comments; a line without '=', an unterminated section header, a bad
-//   escape, an empty key or a key before the first section is skipped (keys
-//   after a bad header are skipped until the next good one). A key that appears
-//   twice keeps its first place and its last value. Comments are not kept.
+//   comments; a line without '=', an unterminated section header, raw control
+//   bytes, an empty key or a key before the first section is skipped (keys
+//   after a bad header are skipped until the next good one). A key that
+//   appears twice keeps its first place and its last value. Comments are not
+//   kept.
 #pragma once
 
 #include "QoToolsApi.h"

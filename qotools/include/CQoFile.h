@@ -107,6 +107,12 @@ public:
     // `ansi`, `ascii` or `ansimix`; any other value is ignored.
     void FileCharSet(int charSet);
 
+    // Converts bytes of a text in `charSet` (ansi, ascii, ansimix) to
+    // Windows-1252 in place, as reading such a file does: for texts that
+    // reach the caller by another way than Read (the field names of a
+    // dBase header).
+    static void ConvertToAnsi(int charSet, char *data, std::size_t count);
+
     // --- reading -------------------------------------------------------------
     // Reads up to `count` bytes (fewer only at the end of the file); returns
     // the number read, 0 at the end.

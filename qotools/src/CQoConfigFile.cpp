@@ -14,14 +14,28 @@
 namespace {
 
 char const kHex[] = "0123456789ABCDEF";
+// The first line of every file this writer stores: below it a value is raw
+// unless it is quoted. Files without it are hand-written or come from the
+// earlier writer, which escaped every value.
+char const kMark[] = "; qotools 2";
 
 bool IsNameSpecial(unsigned char c)
 {
     return c == '=' || c == '[' || c == ']' || c == ';' || c == '#';
 }
 
-// The file form of a value or name; see the header for the escapes. Names
-// also escape the characters that give a line its meaning.
+bool IsControl(unsigned char c) { return c < 0x20 || c == 0x7F; }
+
+void AppendHex(unsigned char c, std::string &out)
+{
+    out += "\\x";
+    out += kHex[c >> 4];
+    out += kHex[c & 15];
+}
+
+// The escaped form of names (and of every value of the earlier writer):
+// \\ \r \n \t, \s for a blank at either end, \xHH for other control bytes
+// and, in names, for the characters that give a line its meaning.
 void Escape(std::string const &text, bool name, std::string &out)
 {
     std::size_t const n = text.size();
@@ -40,13 +54,10 @@ void Escape(std::string const &text, bool name, std::string &out)
             continue;
         default: break;
         }
-        if (c < 0x20 || c == 0x7F || (name && IsNameSpecial(c))) {
-            out += "\\x";
-            out += kHex[c >> 4];
-            out += kHex[c & 15];
-        } else {
+        if (IsControl(c) || (name && IsNameSpecial(c)))
+            AppendHex(c, out);
+        else
             out += static_cast<char>(c);
-        }
     }
 }
 
@@ -61,9 +72,12 @@ int HexDigit(char c)
     return -1;
 }
 
-bool Unescape(char const *p, std::size_t n, std::string &out)
+// Undoes Escape. False for a backslash that starts no escape. `marked` tells
+// whether an escape that only the escaped form needs (\\, \s, \xHH) was seen.
+bool Unescape(char const *p, std::size_t n, std::string &out, bool *marked = nullptr)
 {
     out.clear();
+    bool strong = false;
     for (std::size_t i = 0; i < n; ++i) {
         if (p[i] != '\\') {
             out += p[i];
@@ -72,11 +86,98 @@ bool Unescape(char const *p, std::size_t n, std::string &out)
         if (++i == n)
             return false;
         switch (p[i]) {
-        case '\\': out += '\\'; break;
+        case '\\': out += '\\'; strong = true; break;
         case 'r': out += '\r'; break;
         case 'n': out += '\n'; break;
         case 't': out += '\t'; break;
-        case 's': out += ' '; break;
+        case 's': out += ' '; strong = true; break;
+        case 'x': {
+            if (i + 2 >= n)
+                return false;
+            int hi = HexDigit(p[i + 1]);
+            int lo = HexDigit(p[i + 2]);
+            if (hi < 0 || lo < 0)
+                return false;
+            out += static_cast<char>(hi * 16 + lo);
+            i += 2;
+            strong = true;
+            break;
+        }
+        default: return false;
+        }
+    }
+    if (marked)
+        *marked = strong;
+    return true;
+}
+
+// A value that would be changed by the trip through a line (blanks and tabs
+// at its ends are trimmed, a line end ends it, a leading quote would read as
+// the quoted form) or that holds other control bytes is written quoted.
+bool NeedsQuotes(std::string const &text)
+{
+    if (text.empty())
+        return false;
+    char const first = text.front();
+    char const last = text.back();
+    if (first == '"' || first == ' ' || first == '\t' || last == ' ' || last == '\t')
+        return true;
+    for (char c : text)
+        if (IsControl(static_cast<unsigned char>(c)))
+            return true;
+    return false;
+}
+
+void Quote(std::string const &text, std::string &out)
+{
+    out += '"';
+    for (char ch : text) {
+        auto c = static_cast<unsigned char>(ch);
+        switch (c) {
+        case '\\': out += "\\\\"; break;
+        case '"': out += "\\\""; break;
+        case '\r': out += "\\r"; break;
+        case '\n': out += "\\n"; break;
+        case '\t': out += "\\t"; break;
+        default:
+            if (IsControl(c))
+                AppendHex(c, out);
+            else
+                out += ch;
+        }
+    }
+    out += '"';
+}
+
+void WriteValue(std::string const &text, std::string &out)
+{
+    if (NeedsQuotes(text))
+        Quote(text, out);
+    else
+        out += text;
+}
+
+// The inside of a quoted value; false when it is not the quoted form (a bare
+// quote, a backslash that starts no escape).
+bool Unquote(char const *p, std::size_t n, std::string &out)
+{
+    out.clear();
+    for (std::size_t i = 0; i < n; ++i) {
+        char c = p[i];
+        if (c == '"')
+            return false;
+        if (c != '\\') {
+            out += c;
+            continue;
+        }
+        if (++i == n)
+            return false;
+        switch (p[i]) {
+        case '\\': out += '\\'; break;
+        case '"': out += '"'; break;
+        case 'r': out += '\r'; break;
+        case 'n': out += '\n'; break;
+        case 't': out += '\t'; break;
         case 'x': {
             if (i + 2 >= n)
                 return false;
@@ -92,6 +193,44 @@ bool Unescape(char const *p, std::size_t n, std::string &out)
         }
     }
     return true;
+}
+
+// What a value's text in the file stands for. An escaped or quoted reading
+// is taken only when that writer would have written exactly this text for
+// it: anything else is what a user typed, and it is kept as typed.
+void ReadValue(char const *p, std::size_t n, bool markedFile, std::string &out)
+{
+    std::string decoded;
+    std::string canonical;
+    if (markedFile) {
+        if (n >= 2 && p[0] == '"' && p[n - 1] == '"' && Unquote(p + 1, n - 2, decoded) && NeedsQuotes(decoded)) {
+            Quote(decoded, canonical);
+            if (canonical.size() == n && std::memcmp(canonical.data(), p, n) == 0) {
+                out.swap(decoded);
+                return;
+            }
+        }
+    } else {
+        // The earlier writer's form, where it cannot be a typed path: a path
+        // holds \t or \n as often as a tab, but a typed \\, \s or \xHH that is
+        // also canonical is next to unheard of.
+        bool strong = false;
+        if (std::memchr(p, '\\', n) && Unescape(p, n, decoded, &strong) && strong) {
+            Escape(decoded, false, canonical);
+            if (canonical.size() == n && std::memcmp(canonical.data(), p, n) == 0) {
+                out.swap(decoded);
+                return;
+            }
+        }
+    }
+    out.assign(p, n);
+}
+
+// A name in the escaped form; a backslash that starts no escape is text.
+void ReadName(char const *p, std::size_t n, std::string &out)
+{
+    if (!Unescape(p, n, out))
+        out.assign(p, n);
 }
 
 bool IsSpaceOrTab(char c) { return c == ' ' || c == '\t'; }
@@ -317,7 +456,8 @@ std::vector<CQoString> CQoConfigFile::GetKeys(char const *section) const
 
 CQoString CQoConfigFile::ToText() const
 {
-    std::string out;
+    std::string out = kMark;
+    out += "\r\n";
     bool first = true;
     for (Section const &section : m_sections) {
         if (!first)
@@ -329,7 +469,7 @@ CQoString CQoConfigFile::ToText() const
         for (Entry const &entry : section.entries) {
             Escape(entry.key.Str(), true, out);
             out += '=';
-            Escape(entry.value.Str(), false, out);
+            WriteValue(entry.value.Str(), out);
             out += "\r\n";
         }
     }
@@ -350,16 +490,25 @@ void CQoConfigFile::FromText(char const *text, std::size_t length)
     std::string value;
     char const *p = text ? text : "";
     char const *const stop = p + (text ? length : 0);
+    bool markedFile = false;
+    bool firstLine = true;
     while (p < stop) {
+        // CR LF, LF and CR all end a line: editors on every system write one.
         char const *lineEnd = p;
-        while (lineEnd < stop && *lineEnd != '\n')
+        while (lineEnd < stop && *lineEnd != '\n' && *lineEnd != '\r')
             ++lineEnd;
         char const *begin = p;
         char const *end = lineEnd;
-        p = lineEnd < stop ? lineEnd + 1 : stop;
-        if (end > begin && end[-1] == '\r')
-            --end;
+        p = lineEnd;
+        if (p < stop && *p++ == '\r' && p < stop && *p == '\n')
+            ++p;
         TrimRange(begin, end);
+        if (firstLine) {
+            firstLine = false;
+            std::size_t const markLength = sizeof kMark - 1;
+            markedFile = static_cast<std::size_t>(end - begin) == markLength
+                         && std::memcmp(begin, kMark, markLength) == 0;
+        }
         if (begin == end || *begin == ';' || *begin == '#')
             continue;
 
@@ -376,10 +525,9 @@ void CQoConfigFile::FromText(char const *text, std::size_t length)
             char const *nb = begin + 1;
             char const *ne = end - 1;
             TrimRange(nb, ne);
-            // A name is handed around as C text: one that holds a NUL cannot be
-            // kept and is as bad as an invalid escape.
-            if (!Unescape(nb, static_cast<std::size_t>(ne - nb), name) || name.empty()
-                || name.find('\0') != std::string::npos)
+            ReadName(nb, static_cast<std::size_t>(ne - nb), name);
+            // A name is handed around as C text: one that holds a NUL cannot be kept.
+            if (name.empty() || name.find('\0') != std::string::npos)
                 continue;
             current = &parsed.MakeSection(name.c_str());
             continue;
@@ -397,11 +545,10 @@ void CQoConfigFile::FromText(char const *text, std::size_t length)
         char const *ve = end;
         TrimRange(kb, ke);
         TrimRange(vb, ve);
-        if (!Unescape(kb, static_cast<std::size_t>(ke - kb), name) || name.empty()
-            || name.find('\0') != std::string::npos)
+        ReadName(kb, static_cast<std::size_t>(ke - kb), name);
+        if (name.empty() || name.find('\0') != std::string::npos)
             continue;
-        if (!Unescape(vb, static_cast<std::size_t>(ve - vb), value))
-            continue;
+        ReadValue(vb, static_cast<std::size_t>(ve - vb), markedFile, value);
         CQoString key(name);
         CQoString val(value);
         bool found = false;

@@ -103,6 +103,66 @@ std::int64_t TellRaw(std::FILE *fp)
 #endif
 }
 
+#ifdef _WIN32
+// The wide form of a path for the file functions. Past the old 260-character
+// limit an absolute path gets the \\?\ prefix (the limit does not apply to
+// it), so that a long output path works wherever the same input path does.
+std::wstring WidePath(char const *path)
+{
+    int n = MultiByteToWideChar(CP_ACP, 0, path, -1, nullptr, 0);
+    if (n <= 0)
+        return std::wstring();
+    std::wstring wide(static_cast<std::size_t>(n), L'\0');
+    MultiByteToWideChar(CP_ACP, 0, path, -1, &wide[0], n);
+    wide.resize(static_cast<std::size_t>(n - 1));
+    // A temporary name beside the file adds up to 20 characters.
+    if (wide.size() < MAX_PATH - 20 || wide.compare(0, 4, L"\\\\?\\") == 0)
+        return wide;
+    DWORD need = GetFullPathNameW(wide.c_str(), 0, nullptr, nullptr);
+    if (need == 0)
+        return wide;
+    std::wstring full(need, L'\0');
+    DWORD got = GetFullPathNameW(wide.c_str(), need, &full[0], nullptr);
+    if (got == 0 || got >= need)
+        return wide;
+    full.resize(got);
+    for (wchar_t &c : full)
+        if (c == L'/')
+            c = L'\\';
+    if (full.compare(0, 2, L"\\\\") == 0)
+        return L"\\\\?\\UNC\\" + full.substr(2);
+    if (full.size() >= 3 && full[1] == L':' && full[2] == L'\\')
+        return L"\\\\?\\" + full;
+    return wide;
+}
+#endif
+
+std::FILE *OpenStream(char const *path, char const *how)
+{
+#ifdef _WIN32
+    wchar_t wideHow[8] = {};
+    for (std::size_t i = 0; how[i] && i + 1 < sizeof wideHow / sizeof *wideHow; ++i)
+        wideHow[i] = static_cast<wchar_t>(how[i]);
+    return _wfopen(WidePath(path).c_str(), wideHow);
+#else
+    return std::fopen(path, how);
+#endif
+}
+
+// A target that must not be written: read-only (Windows refuses to replace
+// it, Wine's MoveFileEx does not), or natively without any write permission.
+bool IsWriteProtected(char const *path)
+{
+#ifdef _WIN32
+    DWORD attributes = GetFileAttributesW(WidePath(path).c_str());
+    return attributes != INVALID_FILE_ATTRIBUTES && !(attributes & FILE_ATTRIBUTE_DIRECTORY)
+           && (attributes & FILE_ATTRIBUTE_READONLY);
+#else
+    struct stat info;
+    return stat(path, &info) == 0 && S_ISREG(info.st_mode) && !(info.st_mode & (S_IWUSR | S_IWGRP | S_IWOTH));
+#endif
+}
+
 constexpr std::size_t kBlock = 64 * 1024;
 // After a jump the buffer is refilled with this much first, and with twice as
 // much on every following refill up to the buffer's size: reading a record
@@ -149,14 +209,14 @@ bool CQoFile::Open(char const *path, int mode)
     bool const wantRead = (mode & read) != 0 || !wantWrite;
     std::FILE *fp = nullptr;
     if (mode & create) {
-        fp = std::fopen(path, wantRead ? "w+b" : "wb");
+        fp = OpenStream(path, wantRead ? "w+b" : "wb");
     } else if (wantWrite) {
         // Keep an existing file; create a missing one.
-        fp = std::fopen(path, "r+b");
+        fp = OpenStream(path, "r+b");
         if (!fp && errno == ENOENT)
-            fp = std::fopen(path, "w+b");
+            fp = OpenStream(path, "w+b");
     } else {
-        fp = std::fopen(path, "rb");
+        fp = OpenStream(path, "rb");
     }
     if (!fp)
         return false;
@@ -349,10 +409,15 @@ void CQoFile::SyncSystemPosition()
 
 void CQoFile::ConvertIn(char *data, std::size_t count) const
 {
-    if (m_charSet == ansi)
+    ConvertToAnsi(m_charSet, data, count);
+}
+
+void CQoFile::ConvertToAnsi(int charSet, char *data, std::size_t count)
+{
+    if (charSet != ascii && charSet != ansimix)
         return;
     auto *p = reinterpret_cast<unsigned char *>(data);
-    if (m_charSet == ascii) {
+    if (charSet == ascii) {
         for (std::size_t i = 0; i < count; ++i)
             if (p[i] >= 0x80)
                 p[i] = kDos850ToAnsi[p[i] - 0x80];
@@ -447,8 +512,11 @@ bool CQoFile::ReadString(CQoString &line, bool throwOnError)
         char *start = m_buffer.get() + m_pos;
         std::size_t avail = m_end - m_pos;
         any = true;
-        void *lf = std::memchr(start, '\n', avail);
-        std::size_t n = lf ? static_cast<std::size_t>(static_cast<char *>(lf) - start) : avail;
+        // CR LF, LF and CR all end a line.
+        char *lf = static_cast<char *>(std::memchr(start, '\n', avail));
+        char *cr = static_cast<char *>(std::memchr(start, '\r', lf ? static_cast<std::size_t>(lf - start) : avail));
+        char *stop = cr ? cr : lf;
+        std::size_t n = stop ? static_cast<std::size_t>(stop - start) : avail;
         // Converting in place is safe: these bytes are consumed now, and a
         // later Seek drops the buffer.
         if (m_charSet != ansi) {
@@ -456,18 +524,17 @@ bool CQoFile::ReadString(CQoString &line, bool throwOnError)
             m_bufferConverted = true;
         }
         line.Append(start, n);
-        if (lf) {
-            m_pos += n + 1;
-            break;
+        if (!stop) {
+            m_pos = m_end;
+            continue;
         }
-        m_pos = m_end;
+        m_pos += n + 1;
+        // The LF of a CR LF may wait in the next block.
+        if (cr && (m_pos < m_end || FillBuffer(throwOnError)) && m_buffer[m_pos] == '\n')
+            ++m_pos;
+        break;
     }
-    if (!any)
-        return false;
-    int length = line.GetLength();
-    if (length > 0 && line.Str()[static_cast<std::size_t>(length) - 1] == '\r')
-        line.Assign(line.GetString(), static_cast<std::size_t>(length) - 1);
-    return true;
+    return any;
 }
 
 // ---------------------------------------------------------------------------
@@ -655,7 +722,7 @@ bool CQoFile::Exists(char const *path)
     if (!path || !*path)
         return false;
 #ifdef _WIN32
-    return GetFileAttributesA(path) != INVALID_FILE_ATTRIBUTES;
+    return GetFileAttributesW(WidePath(path).c_str()) != INVALID_FILE_ATTRIBUTES;
 #else
     struct stat info;
     return stat(path, &info) == 0;
@@ -664,15 +731,30 @@ bool CQoFile::Exists(char const *path)
 
 bool CQoFile::Remove(char const *path)
 {
-    return path && *path && std::remove(path) == 0;
+    if (!path || !*path)
+        return false;
+#ifdef _WIN32
+    return DeleteFileW(WidePath(path).c_str()) != 0;
+#else
+    return std::remove(path) == 0;
+#endif
 }
 
 bool CQoFile::MoveOver(char const *source, char const *target)
 {
     if (!source || !*source || !target || !*target)
         return false;
+    if (IsWriteProtected(target)) {
 #ifdef _WIN32
-    return MoveFileExA(source, target, MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != 0;
+        SetLastError(ERROR_ACCESS_DENIED);
+#else
+        errno = EACCES;
+#endif
+        return false;
+    }
+#ifdef _WIN32
+    return MoveFileExW(WidePath(source).c_str(), WidePath(target).c_str(),
+                       MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != 0;
 #else
     return std::rename(source, target) == 0;
 #endif
@@ -724,10 +806,27 @@ std::string CQoFile::NewTempFileBeside(char const *target)
     if (folder.empty())
         folder = "/";
 #ifdef _WIN32
-    char name[MAX_PATH];
-    if (GetTempFileNameA(folder.c_str(), "qo", 0, name) == 0)
-        return std::string();
-    return name;
+    // GetTempFileName stops at 260 characters: the name is made here, and
+    // CREATE_NEW makes sure it is a new file.
+    if (folder.back() != '\\' && folder.back() != '/')
+        folder += '\\';
+    static LONG counter = 0;
+    for (int attempt = 0; attempt < 100; ++attempt) {
+        char unique[32];
+        std::snprintf(unique, sizeof unique, "qo%lx%04lx.tmp", static_cast<unsigned long>(GetCurrentProcessId()),
+                      static_cast<unsigned long>(InterlockedIncrement(&counter) + GetTickCount()) & 0xFFFFul);
+        std::string name = folder + unique;
+        HANDLE h = CreateFileW(WidePath(name.c_str()).c_str(), GENERIC_WRITE, 0, nullptr, CREATE_NEW,
+                               FILE_ATTRIBUTE_NORMAL, nullptr);
+        if (h != INVALID_HANDLE_VALUE) {
+            CloseHandle(h);
+            return name;
+        }
+        DWORD error = GetLastError();
+        if (error != ERROR_FILE_EXISTS && error != ERROR_ALREADY_EXISTS)
+            return std::string();
+    }
+    return std::string();
 #else
     if (folder.back() != '/')
         folder += '/';

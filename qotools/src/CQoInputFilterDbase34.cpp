@@ -138,8 +138,14 @@ void CQoInputFilterDbase34::Init(CQoString const &name)
 
     int count = NumFields();
     SetNumColsInternal(count);
-    for (int i = 0; i < count; ++i)
-        m_colNames[std::size_t(i)] = m_header.fields[std::size_t(i)].Name();
+    for (int i = 0; i < count; ++i) {
+        // Field names are text of the file's code page as much as the values.
+        CDbaseField &field = m_header.fields[std::size_t(i)];
+        std::string name = field.Name().Str();
+        CQoFile::ConvertToAnsi(m_nRecordCharSet, &name[0], name.size());
+        field.Name(name.c_str());
+        m_colNames[std::size_t(i)] = field.Name();
+    }
     m_physical = -1;
     m_nextRead = -1;
     if (!m_bSkipDeleted) {

@@ -144,6 +144,13 @@ TEST_F(ProjectFolder, WritesThatCannotBeDoneAnswerFalseAndLeaveTheStoredFileWhol
     EXPECT_EQ(before, ReadFile(path));
     EXPECT_EQ(std::vector<std::string>{"projekt.cfg"}, Listing());
 
+    // A file marked read-only is not replaced (as Windows refuses it).
+    SetFileAttributesA(path.c_str(), FILE_ATTRIBUTE_READONLY);
+    EXPECT_FALSE(project.WriteConfigFile());
+    EXPECT_EQ(before, ReadFile(path));
+    EXPECT_EQ(std::vector<std::string>{"projekt.cfg"}, Listing());
+    SetFileAttributesA(path.c_str(), FILE_ATTRIBUTE_NORMAL);
+
     // Once the file is free again, the write goes through.
     EXPECT_TRUE(project.WriteConfigFile());
     EXPECT_NE(std::string::npos, ReadFile(path).find("neu.txt"));

@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <climits>
+#include <cstring>
 #include <filesystem>
 #include <string>
 #include <vector>
@@ -161,16 +162,86 @@ TEST(CQoConfigFileFormat, WrittenFileIsReadableText)
     cfg.SetValue("Eingabe", "Zeichensatz", 1);
     cfg.SetValue("Ausgabe", "Trenner", " ; ");
     cfg.SetValue("Ausgabe", "Name", "M\374ller\r\nGmbH");
+    cfg.SetValue("Ausgabe", "Begrenzer", "\"");
     ASSERT_TRUE(cfg.Write(path.c_str()));
-    EXPECT_EQ("[Eingabe]\r\n"
-              "Datei=C:\\\\daten\\\\kunden.txt\r\n"
+    // Paths as a user would type them; quotes only where a value needs them.
+    EXPECT_EQ("; qotools 2\r\n"
+              "[Eingabe]\r\n"
+              "Datei=C:\\daten\\kunden.txt\r\n"
               "Zeichensatz=1\r\n"
               "\r\n"
               "[Ausgabe]\r\n"
-              "Trenner=\\s;\\s\r\n"
-              "Name=M\374ller\\r\\nGmbH\r\n",
+              "Trenner=\" ; \"\r\n"
+              "Name=\"M\374ller\\r\\nGmbH\"\r\n"
+              "Begrenzer=\"\\\"\"\r\n",
               ReadBytes(path));
     EXPECT_FALSE(CQoFile::Exists((path + ".~tmp").c_str()));
+}
+
+// What a line of a file reads as: hand-written files (no mark in the first
+// line) and those of the earlier writer, which escaped every backslash, and
+// files of the current writer (with the mark).
+TEST(CQoConfigFileFormat, ValuesReadAsWrittenByHandOrByEitherWriter)
+{
+    struct Case {
+        bool marked;
+        char const *line;
+        std::string value;
+    };
+    Case const cases[] = {
+        {false, "daten\\sicherung.txt", "daten\\sicherung.txt"},
+        {false, "C:\\temp\\neu.txt", "C:\\temp\\neu.txt"},
+        {false, "daten\\tabelle.txt", "daten\\tabelle.txt"},
+        {false, "daten\\kunden.txt", "daten\\kunden.txt"},
+        {false, "\\\\server\\freigabe\\", "\\\\server\\freigabe\\"},
+        {false, "\"C:\\Programme\\x.txt\"", "\"C:\\Programme\\x.txt\""},
+        {false, "\" x \"", "\" x \""},
+        {false, "a\\x41b", "a\\x41b"}, // the earlier writer never escaped an A
+        // the earlier writer's escapes
+        {false, "C:\\\\daten\\\\x.txt", "C:\\daten\\x.txt"},
+        {false, "\\s,\\s", " , "},
+        {false, "\\x01\\\\", std::string("\x01\\")},
+        {false, "\\sa\\r\\nb\\tc", " a\r\nb\tc"},
+        {true, "C:\\\\daten\\x.txt", "C:\\\\daten\\x.txt"},
+        {true, "\\s,\\s", "\\s,\\s"},
+        {true, "\" a \"", " a "},
+        {true, "\"\\x00\\t\\\"\\\\\"", std::string("\0\t\"\\", 4)},
+        {true, "\"a\\\"b\"", "\"a\\\"b\""}, // the writer would not quote a"b
+        {true, "\"\\q \"", "\"\\q \""},
+    };
+    TempFolder tmp;
+    std::string path = tmp.Path("hand.cfg");
+    for (Case const &c : cases) {
+        SCOPED_TRACE(c.line);
+        WriteBytes(path, std::string(c.marked ? "; qotools 2\r\n" : "") + "[S]\r\nk=" + c.line + "\r\n");
+        CQoConfigFile cfg;
+        ASSERT_TRUE(cfg.Open(path.c_str()));
+        CQoString value("fehlt");
+        EXPECT_TRUE(cfg.GetValue("S", "k", value));
+        EXPECT_EQ(c.value, value.Str());
+        // And what was read is written so that it reads the same again.
+        CQoString again("fehlt");
+        EXPECT_TRUE(Reread(cfg, tmp).GetValue("S", "k", again));
+        EXPECT_EQ(c.value, again.Str());
+    }
+}
+
+TEST(CQoConfigFileFormat, LinesEndWithCrLfOrEither)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("zeilen.cfg");
+    for (char const *end : {"\r", "\n", "\r\n"}) {
+        SCOPED_TRACE(static_cast<int>(std::strlen(end)));
+        std::string text = std::string("[Projekt]") + end + "Datei=a.txt" + end + "[Zwei]\r\nk=1\nl=2\r";
+        WriteBytes(path, text);
+        CQoConfigFile cfg;
+        ASSERT_TRUE(cfg.Open(path.c_str()));
+        EXPECT_EQ((std::vector<std::string>{"Projekt", "Zwei"}), Names(cfg.GetSections()));
+        EXPECT_EQ((std::vector<std::string>{"k", "l"}), Names(cfg.GetKeys("Zwei")));
+        CQoString v;
+        EXPECT_TRUE(cfg.GetValue("Projekt", "Datei", v));
+        EXPECT_STREQ("a.txt", v);
+    }
 }
 
 TEST(CQoConfigFileFormat, MalformedLinesAreSkipped)
@@ -204,8 +275,11 @@ TEST(CQoConfigFileFormat, MalformedLinesAreSkipped)
     CQoConfigFile cfg;
     ASSERT_TRUE(cfg.Open(path.c_str()));
     EXPECT_EQ((std::vector<std::string>{"Gut"}), Names(cfg.GetSections()));
-    EXPECT_EQ((std::vector<std::string>{"a", "f"}), Names(cfg.GetKeys("Gut")));
+    // A backslash that starts no escape is text, never a reason to drop a line.
+    EXPECT_EQ((std::vector<std::string>{"a", "b", "c", "d", "f"}), Names(cfg.GetKeys("Gut")));
     CQoString v;
+    EXPECT_TRUE(cfg.GetValue("Gut", "c", v));
+    EXPECT_STREQ("cut \\x4", v);
     EXPECT_TRUE(cfg.GetValue("Gut", "a", v));
     EXPECT_STREQ("3", v); // the later value wins, the first place stays
     EXPECT_TRUE(cfg.GetValue("Gut", "f", v));
@@ -264,6 +338,6 @@ TEST(CQoConfigFileFiles, FailedWriteLeavesTheOldFileIntact)
 
     // And a good write replaces the old file completely.
     EXPECT_TRUE(cfg.Write(path.c_str()));
-    EXPECT_EQ("[Neu]\r\nk=v\r\n", ReadBytes(path));
+    EXPECT_EQ("; qotools 2\r\n[Neu]\r\nk=v\r\n", ReadBytes(path));
     EXPECT_EQ("fremd", ReadBytes(path + ".~tmp"));
 }

@@ -5,9 +5,14 @@
 
 #include <gtest/gtest.h>
 
+#include <cerrno>
 #include <filesystem>
 #include <string>
 #include <vector>
+
+#ifdef _WIN32
+#include <windows.h>
+#endif
 
 namespace {
 
@@ -115,12 +120,12 @@ TEST(CQoFileCharSet, CanBeChosenAfterOpening)
 
 // --- lines -----------------------------------------------------------------
 
-TEST(CQoFileLines, SplitsAtCrLfAndLfAndKeepsTheLastLine)
+TEST(CQoFileLines, SplitsAtCrLfLfAndCrAndKeepsTheLastLine)
 {
     TempFolder tmp;
     std::string path = tmp.Path("lines.txt");
-    WriteBytes(path, "eins\r\nzwei\n\n\r\nf\xFCnf\rx\r\nlast");
-    EXPECT_EQ((std::vector<std::string>{"eins", "zwei", "", "", "f\xFCnf\rx", "last"}),
+    WriteBytes(path, "eins\r\nzwei\n\n\r\nf\xFCnf\rx\r\r\nlast");
+    EXPECT_EQ((std::vector<std::string>{"eins", "zwei", "", "", "f\xFCnf", "x", "", "last"}),
               ReadLines(path, CQoFile::read));
     WriteBytes(path, "only\r");
     EXPECT_EQ(std::vector<std::string>{"only"}, ReadLines(path, CQoFile::read));
@@ -136,6 +141,9 @@ TEST(CQoFileLines, LinesLongerThanTheBufferAndLineEndsAcrossItsEdge)
         longLine[i] = static_cast<char>('a' + (i / 1000) % 26);
     std::string first(block - 1, 'y'); // its CR is the buffer's last byte, the LF the next one's first
     WriteBytes(path, first + "\r\n" + longLine + "\r\nend\n");
+    EXPECT_EQ((std::vector<std::string>{first, longLine, "end"}), ReadLines(path, CQoFile::read, 1));
+    // A lone CR there ends its line, and the next line is not lost.
+    WriteBytes(path, first + "\r" + longLine + "\rend");
     EXPECT_EQ((std::vector<std::string>{first, longLine, "end"}), ReadLines(path, CQoFile::read, 1));
 }
 
@@ -259,4 +267,60 @@ TEST(CQoFileOpen, ErrorsNameTheFileOrAreQuietOnRequest)
         EXPECT_NE(std::string::npos, std::string(e.Message()).find("err.txt"));
     }
     EXPECT_EQ("data", ReadBytes(path));
+}
+
+// --- replacing files ---------------------------------------------------------
+
+TEST(CQoFileReplace, AReadOnlyTargetIsRefusedAndKeptAsItWas)
+{
+    TempFolder tmp;
+    std::string target = tmp.Path("ziel.txt");
+    std::string source = tmp.Path("neu.txt");
+    WriteBytes(target, "alt");
+    WriteBytes(source, "neu");
+    namespace fs = std::filesystem;
+    fs::permissions(target, fs::perms::owner_write | fs::perms::group_write | fs::perms::others_write,
+                    fs::perm_options::remove);
+    errno = 0;
+    EXPECT_FALSE(CQoFile::MoveOver(source.c_str(), target.c_str()));
+#ifdef _WIN32
+    EXPECT_EQ(static_cast<DWORD>(ERROR_ACCESS_DENIED), GetLastError());
+#else
+    EXPECT_EQ(EACCES, errno);
+#endif
+    EXPECT_EQ("alt", ReadBytes(target));
+    EXPECT_EQ("neu", ReadBytes(source));
+    fs::permissions(target, fs::perms::owner_write, fs::perm_options::add);
+    EXPECT_TRUE(CQoFile::MoveOver(source.c_str(), target.c_str()));
+    EXPECT_EQ("neu", ReadBytes(target));
+}
+
+// An output beside a target whose path is longer than the old 260-character
+// limit is written and put in place as an input of that length is read.
+TEST(CQoFileReplace, PathsBeyond260Characters)
+{
+    TempFolder tmp;
+    std::string folder = tmp.Folder().string();
+    for (int i = 0; folder.size() < 300; ++i)
+        folder += "/Ordner_mit_einem_recht_langen_Namen_" + std::to_string(i);
+    std::filesystem::create_directories(folder);
+    std::string target = folder + "/ausgabe.txt";
+#ifdef _WIN32
+    for (char &c : target)
+        if (c == '/')
+            c = '\\';
+#endif
+    std::string temp = CQoFile::NewTempFileBeside(target.c_str());
+    ASSERT_FALSE(temp.empty());
+    {
+        CQoFile out;
+        ASSERT_TRUE(out.Open(temp.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
+        out.Write("Zeile\r\n", 7);
+        out.Close();
+    }
+    ASSERT_TRUE(CQoFile::MoveOver(temp.c_str(), target.c_str()));
+    EXPECT_FALSE(CQoFile::Exists(temp.c_str()));
+    ASSERT_TRUE(CQoFile::Exists(target.c_str()));
+    EXPECT_EQ(std::vector<std::string>{"Zeile"}, ReadLines(target, CQoFile::read));
+    EXPECT_TRUE(CQoFile::Remove(target.c_str()));
 }

@@ -104,12 +104,13 @@ TEST(DbaseInputPeer, EveryValueAndRowPositionAgreesWithDbfread)
     if (!folder.Usable())
         PEER_UNAVAILABLE();
     // 300 records, every seventh deleted; dbfread (raw bytes) gives the
-    // expected text of every live record.
+    // expected text of every live record, and the field names in the file's
+    // code page (one with an umlaut).
     bool ran = RunPython(folder, "bigfile", R"(
 import dbf, dbfread, random
 random.seed(7)
 path = os.path.join(folder, 'big.dbf')
-t = dbf.Table(path, 'ID N(8,0); TEXT C(40); WERT N(12,3); TAG D', dbf_type='db3', codepage='cp850')
+t = dbf.Table(path, 'ID N(8,0); TEXT C(40); GR\u00d6SSE N(12,3); TAG D', dbf_type='db3', codepage='cp850')
 t.open(dbf.READ_WRITE)
 letters = 'abc XYZ\u00e4\u00f6\u00fc\u00df;"\''
 for i in range(300):
@@ -118,6 +119,8 @@ for i in range(300):
 for i in range(0, 300, 7):
     dbf.delete(t[i])
 t.close()
+with open(os.path.join(folder, 'names.txt'), 'w') as out:
+    out.write('\t'.join(n.encode('cp1252').hex() for n in dbfread.DBF(path, encoding='cp850').field_names))
 with open(os.path.join(folder, 'expected.txt'), 'w') as out:
     for rec in dbfread.DBF(path, raw=True, encoding='cp850'):
         vals = []
@@ -139,6 +142,14 @@ with open(os.path.join(folder, 'expected.txt'), 'w') as out:
     dbf.Init(folder.Path("big.dbf").c_str());
     EXPECT_EQ(long(expected.size()), dbf.NumRows());
     EXPECT_EQ(expected, AllRows(dbf));
+    Row names;
+    CQoString name;
+    for (int c = 0; c < dbf.NumCols(); ++c) {
+        dbf.ColName(c, name);
+        names.push_back(name.Str());
+    }
+    EXPECT_EQ(HexFields(ReadPeerLines(folder.Path("names.txt")).at(0)), names);
+    EXPECT_EQ("GR\xF6SSE", names.at(2));
 
     EXPECT_FALSE(dbf.AbsoluteRow(long(expected.size())));
 }

@@ -83,6 +83,22 @@ TEST(TextVFLines, LinesAreCutIntoColumns)
               AllRows(f));
 }
 
+TEST(TextVFLines, CrLfAndCrEndLinesAlike)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("cr.txt");
+    for (std::string end : {"\r", "\n", "\r\n"}) {
+        WriteBytes(path, "Vorspann" + end + "NameOrt" + end + "Li  Ulm" + end + end + "Kai Kiel" + end);
+        CQoInputFilterTextVF f;
+        SetColumns(f, {4, 4});
+        f.Skip(1);
+        f.SetFirstRowHasNames(true);
+        f.Init(path.c_str());
+        EXPECT_EQ(3, f.NumRows()) << end.size();
+        EXPECT_EQ((std::vector<Row>{{"Li", "Ulm"}, {"", ""}, {"Kai", "Kiel"}}), AllRows(f)) << end.size();
+    }
+}
+
 TEST(TextVFLines, TextBeyondTheLastColumnIsDefective)
 {
     TempFolder tmp;

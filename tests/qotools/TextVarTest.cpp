@@ -46,6 +46,32 @@ TEST(TextVarReading, EnclosedFieldsHoldDelimitersQuotesAndLineBreaks)
               AllRows(*f));
 }
 
+TEST(TextVarReading, CrLfAndCrEndLinesAlikeAndMixed)
+{
+    TempFolder tmp;
+    std::string path = tmp.Path("ende.csv");
+    for (std::string end : {"\r", "\n", "\r\n"}) {
+        SCOPED_TRACE(end.size() == 2 ? "CR LF" : end == "\r" ? "CR" : "LF");
+        WriteBytes(path, "Vorspann" + end + "Name;Ort" + end + "Meier;\"Bonn" + end + "Nord\"" + end + end +
+                             "Li;Ulm\r\nSchulz;Berlin\rKoch;Kiel\n");
+        CQoInputFilterTextVar f;
+        f.Delimiter(';');
+        f.Skip(1);
+        f.SetFirstRowHasNames(true);
+        f.Init(path.c_str());
+        CQoString name;
+        f.ColName(1, name);
+        EXPECT_STREQ("Ort", name);
+        EXPECT_EQ(5, f.NumRows());
+        EXPECT_EQ((std::vector<Row>{{"Meier", "Bonn" + end + "Nord"},
+                                    {"", ""},
+                                    {"Li", "Ulm"},
+                                    {"Schulz", "Berlin"},
+                                    {"Koch", "Kiel"}}),
+                  AllRows(f));
+    }
+}
+
 TEST(TextVarReading, TabEscapeNoEncloserSkipAndShortRows)
 {
     TempFolder tmp;
