@@ -314,6 +314,7 @@ std::vector<CString> ObjectNames(Engine& engine, BOOL bViews) {
 
 BOOL FindTable(Engine& engine, const CString& strName, BOOL bView, CString* pstrStored) {
   CString strBare = qodb::BareName(strName);
+  ThrowIfFailedSheet(engine, strBare);
   for (const CString& strStored : ObjectNames(engine, bView)) {
     if (strStored.CompareNoCase(strBare) == 0) {
       if (pstrStored != NULL) *pstrStored = strStored;

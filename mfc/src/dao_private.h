@@ -30,6 +30,12 @@ const int kMaxPasswordLength = 20;     // characters, as Jet allows
 enum FileKind { kindSqlite = 1, kindMdb = 2 };
 
 // The state of an open CDaoDatabase (m_pEngine).
+struct SheetFailure {
+  CString strTable;
+  long lCode = 0;
+  CString strDescription;
+};
+
 struct Engine {
   Engine() = default;
   ~Engine();   // closes; removes the temporary copy of a workbook
@@ -46,12 +52,17 @@ struct Engine {
   // The open recordsets: closed before the connection their handles belong to.
   std::vector<CDaoRecordset*> recordsets;
   CString strTempFile;      // a workbook's copy
+  // A workbook's sheets that could not be read, with the reason raised when
+  // one of them is named.
+  std::vector<SheetFailure> sheetFailures;
 };
 
 // The engine's own tables in a new file.
 void MakeEngineTables(Engine& engine);
 // Copies a workbook into a temporary database (dao_workbook.cpp).
 void OpenWorkbook(Engine& engine, LPCTSTR lpszName);
+// Raises the reason when strName is a sheet of the workbook that could not be read.
+void ThrowIfFailedSheet(Engine& engine, const CString& strName);
 
 Engine& EngineOf(CDaoDatabase* pDatabase);   // asserts that it is open
 

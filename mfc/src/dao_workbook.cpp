@@ -7,6 +7,7 @@
 #include <limits.h>
 #include <algorithm>
 #include <stdio.h>
+#include <stdlib.h>
 
 namespace {
 
@@ -17,10 +18,24 @@ struct ColumnKind {
   size_t nLongestText = 0;
 };
 
+// The shortest text that reads back as the same double (Excel keeps the
+// full value; 15 digits would change one in ten thousand of them).
 CString NumberText(double d) {
   CString str;
-  str.Format("%.15g", d);
+  for (int nDigits = 15; nDigits <= 17; ++nDigits) {
+    str.Format("%.*g", nDigits, d);
+    if (strtod(str, NULL) == d) break;
+  }
   return str;
+}
+
+// Excel counts 29 February 1900, a day that never was (serial 60): serials
+// 1 to 59 are one day later on the calendar than an OLE date of the same
+// number. Serial 60 is read as 28 February 1900 (the last real day before
+// it, time of day kept); below 1 a value is a time without a date, which
+// OLE dates hold the same way.
+double OleDateOfSerial(double dSerial) {
+  return dSerial >= 1 && dSerial < 60 ? dSerial + 1 : dSerial;
 }
 
 // A cell as the field stores it (NULL for an empty cell or an error value in
@@ -40,7 +55,7 @@ qodao::Value CellValue(short nFieldType, int nType, double dValue, const CString
     break;
   case CDaoWorkbookReader::cellDate:
     if (nFieldType == dbDate || nFieldType == dbText || nFieldType == dbMemo) {
-      COleDateTime date(dValue);
+      COleDateTime date(OleDateOfSerial(dValue));
       str = date.Format(nFieldType == dbDate ? "%Y-%m-%d %H:%M:%S" : "%d.%m.%Y");
       if (nFieldType == dbDate && date.GetYear() < 0) return value;
     } else {
@@ -158,6 +173,50 @@ void ImportSheet(qodao::Engine& engine, CDaoWorkbookReader& reader, int nSheet) 
   });
 }
 
+// The copies are named qox<process id>-<n>.tmp, so that an open can tell the
+// copies of a process that has ended (killed, crashed) and remove them: a
+// workbook's copy is as large as the workbook's data.
+CString NewCopyName(const char* pszFolder) {
+  static LONG nCounter = 0;
+  for (int nAttempt = 0; nAttempt < 100; ++nAttempt) {
+    CString strName;
+    strName.Format("%sqox%08lx-%lx.tmp", pszFolder, (unsigned long)GetCurrentProcessId(),
+                   (unsigned long)InterlockedIncrement(&nCounter));
+    HANDLE hFile = CreateFileA(strName, GENERIC_WRITE, 0, NULL, CREATE_NEW, FILE_ATTRIBUTE_NORMAL, NULL);
+    if (hFile != INVALID_HANDLE_VALUE) {
+      CloseHandle(hFile);
+      return strName;
+    }
+    if (GetLastError() != ERROR_FILE_EXISTS && GetLastError() != ERROR_ALREADY_EXISTS) break;
+  }
+  return CString();
+}
+
+void RemoveStaleCopies(const char* pszFolder) {
+  CString strPattern = CString(pszFolder) + "qox*-*.tmp";
+  WIN32_FIND_DATAA found;
+  HANDLE hFind = FindFirstFileA(strPattern, &found);
+  if (hFind == INVALID_HANDLE_VALUE) return;
+  do {
+    char* pszEnd = NULL;
+    const char* pszId = found.cFileName + 3;
+    unsigned long nProcess = strtoul(pszId, &pszEnd, 16);
+    if (pszEnd != pszId + 8 || *pszEnd != '-' || nProcess == GetCurrentProcessId()) continue;
+    // A process that still runs may still use its copy; so may one whose
+    // state cannot be asked (then OpenProcess fails with access denied).
+    HANDLE hProcess = OpenProcess(SYNCHRONIZE, FALSE, nProcess);
+    if (hProcess != NULL) {
+      BOOL bEnded = WaitForSingleObject(hProcess, 0) == WAIT_OBJECT_0;
+      CloseHandle(hProcess);
+      if (!bEnded) continue;
+    } else if (GetLastError() != ERROR_INVALID_PARAMETER) {
+      continue;
+    }
+    DeleteFileA(CString(pszFolder) + found.cFileName);   // fails harmlessly while in use
+  } while (FindNextFileA(hFind, &found));
+  FindClose(hFind);
+}
+
 } // namespace
 
 void AFXAPI AfxDaoRegisterWorkbookReader(AFX_DAO_WORKBOOK_FACTORY pfnFactory) { g_pfnWorkbookFactory = pfnFactory; }
@@ -177,18 +236,48 @@ void OpenWorkbook(Engine& engine, LPCTSTR lpszName) {
   reader->Open(lpszName);
 
   char szFolder[MAX_PATH] = {0};
-  char szFile[MAX_PATH] = {0};
   DWORD nFolder = GetTempPathA(MAX_PATH, szFolder);
-  if (nFolder == 0 || nFolder >= MAX_PATH || GetTempFileNameA(szFolder, "qox", 0, szFile) == 0)
+  if (nFolder == 0 || nFolder >= MAX_PATH - 32)
     Throw(3000, "Für die Arbeitsmappe konnte keine temporäre Datei angelegt werden.");
-  engine.strTempFile = szFile;
-  Guard([&] { engine.db.OpenEx("Driver=SQLite3;Database=" + CString(szFile), CDatabase::noOdbcDialog); });
+  RemoveStaleCopies(szFolder);
+  engine.strTempFile = NewCopyName(szFolder);
+  if (engine.strTempFile.IsEmpty())
+    Throw(3000, "Für die Arbeitsmappe konnte keine temporäre Datei angelegt werden.");
+  Guard([&] { engine.db.OpenEx("Driver=SQLite3;Database=" + engine.strTempFile, CDatabase::noOdbcDialog); });
   MakeEngineTables(engine);
   int nSheets = reader->GetSheetCount();
   if (nSheets < 0 || nSheets > kMaxObjects) Throw(3161, "Die Arbeitsmappe meldet eine ungültige Zahl von Blättern.");
-  for (int i = 0; i < nSheets; ++i) ImportSheet(engine, *reader, i);
+  // A sheet the engine cannot take costs only itself: the others are read,
+  // and naming it later raises what went wrong with it.
+  for (int i = 0; i < nSheets; ++i) {
+    CString strTable = reader->GetSheetName(i) + "$";
+    try {
+      ImportSheet(engine, *reader, i);
+    } catch (CDaoException* e) {
+      SheetFailure failure;
+      failure.strTable = strTable;
+      failure.lCode = e->m_pErrorInfo != NULL ? e->m_pErrorInfo->m_lErrorCode : 3343;
+      CString strWhy = e->m_pErrorInfo != NULL ? e->m_pErrorInfo->m_strDescription : CString();
+      e->Delete();
+      if (strWhy.Find(strTable) < 0)
+        strWhy = "Das Blatt '" + strTable + "' der Arbeitsmappe kann nicht gelesen werden: " + strWhy;
+      failure.strDescription = strWhy;
+      engine.sheetFailures.push_back(failure);
+      // What the failed import left behind goes.
+      try {
+        engine.db.ExecuteSQL("drop table if exists " + Quote(engine, strTable));
+      } catch (CException* e2) {
+        e2->Delete();
+      }
+    }
+  }
   Guard([&] { engine.db.ExecuteSQL("PRAGMA query_only = 1"); });
   engine.bReadOnly = TRUE;
+}
+
+void ThrowIfFailedSheet(Engine& engine, const CString& strName) {
+  for (const SheetFailure& failure : engine.sheetFailures)
+    if (failure.strTable.CompareNoCase(strName) == 0) Throw(failure.lCode, failure.strDescription);
 }
 
 Engine::~Engine() {

@@ -114,3 +114,79 @@ TEST(DaoWorkbookTest, SheetsAreTablesWithTypedFieldsAndTheCopyGoesAtClose) {
   db.Close();
   EXPECT_EQ(nOpen - 1, countCopies());
 }
+
+namespace {
+const char kWriteOddWorkbook[] = R"PY(
+import openpyxl
+wb = openpyxl.Workbook()
+ws = wb.active
+ws.title = 'Werte'
+ws.append(['Text', 'Datum'])
+for value, serial in [(0.1 + 0.2, 1), ('x', 59), (1 / 3, 61), (123456789.12345679, 0.75)]:
+    ws.append([value, serial])
+    ws.cell(row=ws.max_row, column=2).number_format = 'dd.mm.yyyy'
+wide = wb.create_sheet('Breit')
+wide.append(['S%d' % i for i in range(300)])
+wb.create_sheet('Danach').append(['Name'])
+wb.save(os.path.join(folder, 'mappe.xlsx'))
+)PY";
+
+std::string TempCopy(DWORD dwProcess, const char* pszTail) {
+  char szFolder[MAX_PATH];
+  GetTempPathA(MAX_PATH, szFolder);
+  char szName[64];
+  wsprintfA(szName, "qox%08lx-%s.tmp", (unsigned long)dwProcess, pszTail);
+  return std::string(szFolder) + szName;
+}
+} // namespace
+
+// Numbers as Excel stores them, dates before March 1900 as Excel shows them
+// (a time without a date stays one),
+// one sheet the engine cannot take leaves the others readable and says why,
+// and copies left by a killed process are cleared by the next open.
+TEST(DaoWorkbookTest, EveryReadableSheetWithExactValuesAndNoStaleCopies) {
+  PeerFolder folder;
+  if (!folder.Usable() || !RunPython(folder, "odd", kWriteOddWorkbook)) PEER_UNAVAILABLE();
+  std::string dead = TempCopy(0x7FFFFFF0, "1");
+  std::string mine = TempCopy(GetCurrentProcessId(), "fremd");
+  for (const std::string& path : {dead, mine}) CloseHandle(CreateFileA(path.c_str(), GENERIC_WRITE, 0, NULL, CREATE_ALWAYS, 0, NULL));
+  struct Registration {
+    Registration() { AfxDaoRegisterWorkbookReader(MakeXlsxSource); }
+    ~Registration() { AfxDaoRegisterWorkbookReader(NULL); }
+  } registration;
+  CDaoDatabase db;
+  db.Open(folder.Path("mappe.xlsx").c_str(), FALSE, TRUE, "Excel 8.0;");
+  EXPECT_EQ(INVALID_FILE_ATTRIBUTES, GetFileAttributesA(dead.c_str()));
+  EXPECT_NE(INVALID_FILE_ATTRIBUTES, GetFileAttributesA(mine.c_str()));
+  DeleteFileA(mine.c_str());
+
+  CDaoRecordset rs(&db);
+  rs.Open(dbOpenDynaset, "select * from [Werte$]");
+  const char* texts[] = {"0.30000000000000004", "x", "0.3333333333333333", "123456789.12345679"};
+  const char* dates[] = {"01.01.1900 00:00", "28.02.1900 00:00", "01.03.1900 00:00", "30.12.1899 18:00"};
+  for (int i = 0; i < 4; ++i, rs.MoveNext()) {
+    EXPECT_EQ(CString(texts[i]), TextOf(rs.GetFieldValue("Text"))) << i;
+    EXPECT_EQ(CString(dates[i]), COleDateTime(rs.GetFieldValue("Datum").date).Format("%d.%m.%Y %H:%M")) << i;
+  }
+  rs.Close();
+  CDaoRecordset after(&db);
+  after.Open(dbOpenDynaset, "select * from [Danach$]");
+  CDaoFieldInfo info;
+  after.GetFieldInfo(0, info);
+  EXPECT_EQ(CString("Name"), info.m_strName);
+  after.Close();
+  for (int nType : {dbOpenDynaset, dbOpenTable}) {
+    DaoFailure failure = DaoError([&] {
+      CDaoRecordset wide(&db);
+      wide.Open(nType, "Breit$");
+    });
+    EXPECT_EQ(3190, failure.lCode);
+    EXPECT_NE(-1, failure.strDescription.Find("Breit")) << (LPCSTR)failure.strDescription;
+    EXPECT_NE(-1, failure.strDescription.Find("300")) << (LPCSTR)failure.strDescription;
+  }
+  DaoFailure failure = DaoError([&] {
+    CDaoTableDef table(&db);
+    table.Open("Breit$");
+  });
+  EXPECT_EQ(3190, failure.lCode);
+}
