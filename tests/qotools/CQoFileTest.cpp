@@ -10,10 +10,6 @@
 #include <string>
 #include <vector>
 
-#ifdef _WIN32
-#include <windows.h>
-#endif
-
 namespace {
 
 // The umlauts and ß in Windows-1252 and in DOS code page 850.
@@ -270,6 +266,10 @@ TEST(CQoFileOpen, ErrorsNameTheFileOrAreQuietOnRequest)
 }
 
 // --- replacing files ---------------------------------------------------------
+
+#ifdef _WIN32
+#include <windows.h> // last: its macros clash with the names above
+#endif
 
 TEST(CQoFileReplace, AReadOnlyTargetIsRefusedAndKeptAsItWas)
 {
