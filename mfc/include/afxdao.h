@@ -21,6 +21,11 @@
 //     rs.Open(dbOpenDynaset, "select * from Kunden");
 //     for (; !rs.IsEOF(); rs.MoveNext()) { COleVariant v; rs.GetFieldValue(0, v); ... }
 //
+// Names of new tables, fields, indexes and queries follow Jet's rule: 1 to 64
+// characters, no control character, none of . ! [ ] `, no leading blank
+// (3125 otherwise, before anything is made). Brackets are never taken as
+// quoting in a name given to Create: "[Kunden]" is refused, not stripped.
+//
 // Failures are CDaoException (thrown as pointers, ended with Delete()) whose
 // m_pErrorInfo carries DAO's error number and a description: 3021 no current
 // record, 3024 file not found, 3031 wrong or missing password, 3161 an Excel
@@ -232,12 +237,32 @@ AFX_API void AFXAPI AfxDaoRegisterWorkbookReader(AFX_DAO_WORKBOOK_FACTORY pfnFac
 
 // --- CDaoWorkspace ---------------------------------------------------------------------
 
-// Only the default workspace exists; a CDaoDatabase made without one uses it.
+// A workspace groups the databases opened in it, and its transactions cover
+// them all. A CDaoDatabase made without one uses the default workspace (one
+// per process); a caller whose transaction must not reach other databases of
+// the process gives its database a workspace object of its own (it needs no
+// Create or Open here: there is one user and one engine).
+//
+//     ws.BeginTrans();
+//     try { ... changes to tables, table definitions, indexes ...; ws.CommitTrans(); }
+//     catch (CDaoException* e) { ws.Rollback(); ... }
+//
+// Transactions nest (up to 5 levels, as DAO allows): a rollback takes back
+// only what was done since the matching BeginTrans. What the engine does as
+// one step by itself (Append, DeleteTableDef, SetName, CreateIndex) is a
+// level of its own inside the caller's transaction. Closing a database rolls
+// back what its transactions hold.
 class AFX_API CDaoWorkspace : public CObject {
   DECLARE_DYNAMIC(CDaoWorkspace)
 public:
   CDaoWorkspace();
   virtual ~CDaoWorkspace();
+
+  void BeginTrans();    // a sixth level raises 3003
+  void CommitTrans();   // without a BeginTrans: 3034
+  void Rollback();      // without a BeginTrans: 3034; never leaves a level open
+
+  void* m_pState;   // the engine's: the open databases and the level (dao_transaction.cpp)
 };
 
 // --- CDaoDatabase ----------------------------------------------------------------------
@@ -306,6 +331,10 @@ public:
 
   BOOL IsOpen() const;
   CString GetName();
+  // Renames the table (an appended one: in the file, with its field
+  // attributes and indexes, at once; views that name the old one keep that
+  // name). Another table or query of that name: 3010.
+  void SetName(LPCTSTR lpszName);
   long GetAttributes();
   long GetRecordCount();
 

@@ -61,6 +61,9 @@ bool Cursor::Next() {
     if (rc == SQL_NO_DATA) {
       m_bAtEnd = true;
       ++m_lRow;   // stands after the last row
+      // A finished read holds no lock on the file: another connection of
+      // this program (an output into the same file) can commit.
+      SQLFreeStmt(m_hstmt, SQL_CLOSE);
       return false;
     }
     m_engine.db.Check(rc, m_hstmt, "SQLFetch");

@@ -19,6 +19,64 @@ void MakeEngineTables(Engine& engine) {
   });
 }
 
+namespace {
+
+std::vector<Engine*>& OpenFiles() {
+  static std::vector<Engine*> s_files;
+  return s_files;
+}
+
+// SQLite's wait for a lock: the driver's (100 s) would stall a conversion
+// that reads and writes one file; two seconds cover a commit of the other.
+void WaitShortly(Engine& engine) {
+  try {
+    QueryValue(engine, "pragma busy_timeout = 2000");
+  } catch (CDaoException* e) {
+    e->Delete();   // the driver's own wait stays
+  }
+}
+
+} // namespace
+
+void RegisterOpenFile(Engine& engine) {
+  if (engine.kind != kindSqlite) return;
+  char szFull[MAX_PATH * 2] = {0};
+  DWORD nFull = GetFullPathNameA(engine.strName, (DWORD)sizeof(szFull), szFull, NULL);
+  engine.strFullPath = nFull > 0 && nFull < sizeof(szFull) ? CString(szFull) : engine.strName;
+  for (Engine* pOther : OpenFiles()) {
+    if (pOther->strFullPath.CompareNoCase(engine.strFullPath) != 0) continue;
+    WaitShortly(*pOther);
+    WaitShortly(engine);
+  }
+  OpenFiles().push_back(&engine);
+}
+
+void UnregisterOpenFile(Engine& engine) {
+  std::vector<Engine*>& files = OpenFiles();
+  for (size_t i = 0; i < files.size(); ++i)
+    if (files[i] == &engine) {
+      files.erase(files.begin() + (long)i);
+      return;
+    }
+}
+
+CString FilesOpenTwice() {
+  CString strNames;
+  const std::vector<Engine*>& files = OpenFiles();
+  for (size_t i = 0; i < files.size(); ++i) {
+    bool bTwice = false, bListed = false;
+    for (size_t j = 0; j < files.size(); ++j) {
+      if (j == i || files[j]->strFullPath.CompareNoCase(files[i]->strFullPath) != 0) continue;
+      bTwice = true;
+      if (j < i) bListed = true;
+    }
+    if (!bTwice || bListed) continue;
+    if (!strNames.IsEmpty()) strNames += "', '";
+    strNames += files[i]->strName;
+  }
+  return strNames;
+}
+
 Engine& EngineOf(CDaoDatabase* pDatabase) {
   ASSERT(pDatabase != NULL && pDatabase->m_pEngine != NULL);
   return *static_cast<Engine*>(pDatabase->m_pEngine);
@@ -79,6 +137,37 @@ ProbeResult Probe(LPCTSTR lpszName, int* pnJetVersion = NULL) {
   if (nRead >= 8 && memcmp(head, "\xD0\xCF\x11\xE0\xA1\xB1\x1A\xE1", 8) == 0) return probeXls;
   if (nRead >= 4 && memcmp(head, "PK\x03\x04", 4) == 0) return probeZip;
   return probeOther;
+}
+
+[[noreturn]] void ThrowInvalidPath(LPCTSTR lpszName, LPCSTR lpszWhy) {
+  CString strError;
+  strError.Format("'%s' is not a valid path: %s", lpszName != NULL ? lpszName : "", lpszWhy);
+  Throw(3044, strError);
+}
+
+// What a project can name but no database file can be: checked before the
+// file is touched (a device would be opened and read, a network path makes
+// the driver wait, an overlong one is cut by it).
+void CheckPath(LPCTSTR lpszName) {
+  if (lpszName == NULL || *lpszName == '\0') ThrowInvalidPath(lpszName, "es ist kein Dateiname angegeben.");
+  if (strlen(lpszName) >= MAX_PATH) ThrowInvalidPath(lpszName, "der Pfad ist länger als 259 Zeichen.");
+  if ((lpszName[0] == '\\' || lpszName[0] == '/') && (lpszName[1] == '\\' || lpszName[1] == '/'))
+    ThrowInvalidPath(lpszName, "Netzwerkpfade werden nicht unterstützt.");
+  LPCTSTR pszLeaf = lpszName;
+  for (LPCTSTR p = lpszName; *p != '\0'; ++p)
+    if (*p == '\\' || *p == '/' || *p == ':') pszLeaf = p + 1;
+  CString strStem = pszLeaf;
+  int nDot = strStem.Find('.');
+  if (nDot >= 0) strStem = strStem.Left(nDot);
+  strStem.TrimRight(' ');
+  strStem.MakeUpper();
+  bool bDevice = strStem == "CON" || strStem == "PRN" || strStem == "AUX" || strStem == "NUL" ||
+                 (strStem.GetLength() == 4 && (strStem.Left(3) == "COM" || strStem.Left(3) == "LPT") &&
+                  strStem[3] >= '1' && strStem[3] <= '9');
+  if (bDevice) ThrowInvalidPath(lpszName, "der Name bezeichnet ein Gerät, keine Datei.");
+  DWORD dwAttributes = GetFileAttributesA(lpszName);
+  if (dwAttributes != INVALID_FILE_ATTRIBUTES && (dwAttributes & FILE_ATTRIBUTE_DIRECTORY))
+    ThrowInvalidPath(lpszName, "das ist ein Ordner.");
 }
 
 [[noreturn]] void ThrowUnrecognized(LPCTSTR lpszName) {
@@ -234,7 +323,7 @@ CDaoDatabase::~CDaoDatabase() { Close(); }
 void CDaoDatabase::Create(LPCTSTR lpszName, LPCTSTR lpszLocale, int dwOptions) {
   UNUSED(dwOptions);
   ASSERT(!IsOpen());
-  ASSERT(lpszName != NULL && *lpszName != '\0');
+  CheckPath(lpszName);
   if (GetFileAttributesA(lpszName) != INVALID_FILE_ATTRIBUTES) {
     CString strError;
     strError.Format("Database '%s' already exists.", lpszName);
@@ -273,17 +362,21 @@ void CDaoDatabase::Create(LPCTSTR lpszName, LPCTSTR lpszLocale, int dwOptions) {
     throw;
   }
   m_pEngine = engine.release();
+  RegisterOpenFile(EngineOf(this));
+  JoinWorkspace(this);
 }
 
 void CDaoDatabase::Open(LPCTSTR lpszName, BOOL bExclusive, BOOL bReadOnly, LPCTSTR lpszConnect) {
   UNUSED(bExclusive);
   ASSERT(!IsOpen());
-  ASSERT(lpszName != NULL && *lpszName != '\0');
+  CheckPath(lpszName);
   std::unique_ptr<Engine> engine(new Engine);
   engine->strName = lpszName;
   engine->strConnect = lpszConnect != NULL ? lpszConnect : "";
   OpenEngine(*engine, lpszName, bReadOnly, lpszConnect);
   m_pEngine = engine.release();
+  if (EngineOf(this).strTempFile.IsEmpty()) RegisterOpenFile(EngineOf(this));   // not a workbook's copy
+  JoinWorkspace(this);
 }
 
 void CDaoDatabase::Close() {
@@ -300,8 +393,10 @@ void CDaoDatabase::Close() {
     }
     if (!pEngine->recordsets.empty() && pEngine->recordsets.back() == pSet) pEngine->recordsets.pop_back();
   }
+  LeaveWorkspace(this);
+  UnregisterOpenFile(*pEngine);
   m_pEngine = NULL;
-  delete pEngine;   // CDatabase closes its recordsets and the connection
+  delete pEngine;   // CDatabase closes its recordsets and the connection, rolling back what is pending
 }
 
 BOOL CDaoDatabase::IsOpen() const { return m_pEngine != NULL; }
@@ -419,10 +514,14 @@ void CDaoDatabase::DeleteTableDef(LPCTSTR lpszName) {
   CString strStored;
   if (!FindTable(engine, lpszName, FALSE, &strStored)) ThrowNotInCollection(lpszName);
   if (engine.bReadOnly) ThrowReadOnly();
+  Transaction transaction(engine);
   Guard([&] {
     engine.db.ExecuteSQL("drop table " + Quote(engine, strStored));
     engine.db.ExecuteSQL("delete from qo_dao_fields where tbl = " + QuoteLiteral(strStored));
+    if (QueryValue(engine, "select count(*) from sqlite_master where name = 'qo_dao_indexes'").bytes == "1")
+      engine.db.ExecuteSQL("delete from qo_dao_indexes where tbl = " + QuoteLiteral(strStored));
   });
+  transaction.Commit();
 }
 
 void CDaoDatabase::DeleteQueryDef(LPCTSTR lpszName) {

@@ -4,7 +4,6 @@
 #include "dao_private.h"
 
 IMPLEMENT_DYNAMIC(CDaoException, CException)
-IMPLEMENT_DYNAMIC(CDaoWorkspace, CObject)
 
 CDaoException::CDaoException() : m_pErrorInfo(NULL), m_scode(S_OK), m_nAfxDaoError(NO_AFX_DAO_ERROR) {}
 
@@ -47,10 +46,6 @@ void AFXAPI AfxThrowDaoError(long lErrorCode, LPCTSTR lpszDescription) {
   throw pException;
 }
 
-CDaoWorkspace::CDaoWorkspace() {}
-
-CDaoWorkspace::~CDaoWorkspace() {}
-
 CDaoIndexInfo::CDaoIndexInfo()
     : m_pFieldInfos(NULL), m_nFields(0), m_bPrimary(FALSE), m_bUnique(FALSE), m_bClustered(FALSE),
       m_bIgnoreNulls(FALSE), m_bRequired(FALSE), m_bForeign(FALSE), m_lDistinctCount(0), m_bCleanupFieldInfo(FALSE) {}
@@ -71,13 +66,26 @@ void ThrowFromDb(CDBException* e) {
   if (strText.IsEmpty()) strText = "Die Datenquelle hat einen Fehler ohne Meldung gemeldet.";
   long lFirst = e->m_lFirstRowNotStored;
   e->Delete();
+  long lCode = 3146;   // DAO's number for a failure reported by an ODBC data source
+  if (strText.Find("database is locked") >= 0) {
+    CString strTwice = FilesOpenTwice();
+    if (!strTwice.IsEmpty()) {
+      // The usual cause: the same file is the input of the running conversion.
+      CString strFull;
+      strFull.Format("Could not update; currently locked. Die Datenbankdatei '%s' ist in diesem Programm zugleich "
+                     "zum Lesen geöffnet (etwa als Eingabe); solange sie dort gelesen wird, kann sie nicht "
+                     "geschrieben werden. Schreiben Sie in eine andere Datei.",
+                     (LPCSTR)strTwice);
+      strText = strFull;
+      lCode = 3218;
+    }
+  }
   if (lFirst >= 0) {
     CString strFull;
     strFull.Format("Der Datensatz %ld und alle folgenden wurden nicht gespeichert: %s", lFirst + 1, (LPCSTR)strText);
     strText = strFull;
   }
-  // 3146 is DAO's number for a failure reported by an ODBC data source.
-  Throw(3146, strText);
+  Throw(lCode, strText);
 }
 
 void ThrowReadOnly() { Throw(3027, "Cannot update. Database or object is read-only."); }

@@ -26,6 +26,7 @@ const long kMaxTextSize = 255;         // characters of a dbText field
 const long kMaxBinarySize = 510;       // bytes of a dbBinary field
 const int kMaxObjects = 32767;         // tables or queries listed (the counts are short)
 const int kMaxPasswordLength = 20;     // characters, as Jet allows
+const int kMaxNameLength = 64;         // characters of a table, field or index name
 
 enum FileKind { kindSqlite = 1, kindMdb = 2 };
 
@@ -55,7 +56,53 @@ struct Engine {
   // A workbook's sheets that could not be read, with the reason raised when
   // one of them is named.
   std::vector<SheetFailure> sheetFailures;
+  // Open transaction levels: the outermost is the connection's transaction,
+  // each inner one a savepoint of it (see Transaction).
+  int nTransDepth = 0;
+  CDaoWorkspace* pWorkspace = NULL;   // whose transactions cover this file
+  CString strFullPath;      // an Access-type file's resolved path, while it is open
 };
+
+// Access-type files open in this process. A file open on two connections
+// (an input and an output of one conversion) gets a short wait for the
+// other's lock, and a lock conflict then says so (ThrowFromDb).
+void RegisterOpenFile(Engine& engine);
+void UnregisterOpenFile(Engine& engine);
+// The files open on more than one connection, "" when none.
+CString FilesOpenTwice();
+
+// A unit of work that is stored whole or not at all. Outside any transaction
+// it is a transaction of its own; inside one (the caller's, through
+// CDaoWorkspace::BeginTrans, or another unit) it is a savepoint, so that the
+// caller's rollback takes it back too and its own failure takes back only itself.
+class Transaction {
+public:
+  explicit Transaction(Engine& engine);
+  ~Transaction();   // rolls back what was not committed; never raises
+  Transaction(const Transaction&) = delete;
+  Transaction& operator=(const Transaction&) = delete;
+  void Commit();
+
+private:
+  Engine& m_engine;
+  int m_nLevel;   // 1 the outermost
+  bool m_bOpen = true;
+};
+// The level functions behind Transaction and the workspace's transactions.
+void BeginLevel(Engine& engine);
+void EndLevel(Engine& engine, bool bCommit);
+
+// Jet's rule for the name of a table, field, index or query: 1 to 64
+// characters, no control character, none of . ! [ ] `, no leading blank.
+// Raises 3125 naming it. A name that breaks it would make an object no other
+// program could address, or one whose brackets a caller meant as quoting.
+void CheckName(const CString& strName);
+
+// A database's place in its workspace (Open and Create join, Close leaves).
+void JoinWorkspace(CDaoDatabase* pDatabase);
+void LeaveWorkspace(CDaoDatabase* pDatabase);
+// Stores the rows the open recordsets of the file still hold back (dao_recordset.cpp).
+void FlushAppends(Engine& engine);
 
 // The engine's own tables in a new file.
 void MakeEngineTables(Engine& engine);

@@ -88,6 +88,7 @@ CDaoQueryDef::~CDaoQueryDef() {
 void CDaoQueryDef::Create(LPCTSTR lpszName, LPCTSTR lpszSQL) {
   ASSERT(!IsOpen());
   ASSERT(m_pDatabase != NULL && m_pDatabase->IsOpen());
+  if (lpszName != NULL && *lpszName != '\0') CheckName(lpszName);
   QueryDefState& st = StateOf(m_pState);
   st = QueryDefState();
   st.strName = lpszName != NULL ? lpszName : "";

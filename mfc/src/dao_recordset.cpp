@@ -258,6 +258,10 @@ void RequireCurrent(RecordsetState& st) {
 
 namespace qodao {
 
+void FlushAppends(Engine& engine) {
+  for (CDaoRecordset* pSet : engine.recordsets) Flush(engine, StateOf(pSet->m_pState));
+}
+
 std::vector<FieldDef> ResultFields(Engine& engine, const CString& strSQL) {
   CString strTable = SimpleTable(strSQL);
   CString strStored;
@@ -293,8 +297,8 @@ CDaoRecordset::~CDaoRecordset() {
 void CDaoRecordset::Open(int nOpenType, LPCTSTR lpszSQL, int nOptions) {
   ASSERT(!IsOpen());
   ASSERT(m_pDatabase != NULL && m_pDatabase->IsOpen());
-  ASSERT(lpszSQL != NULL && *lpszSQL != '\0');
   Engine& engine = EngineOf(m_pDatabase);
+  if (lpszSQL == NULL || *lpszSQL == '\0') Throw(3078, "Es ist weder eine Tabelle noch eine Abfrage angegeben.");
   if (nOpenType == AFX_DAO_USE_DEFAULT_TYPE) nOpenType = dbOpenDynaset;
   CString strSQL = lpszSQL;
   strSQL.Trim();

@@ -34,11 +34,25 @@ void EnsureIndexCatalogue(Engine& engine) {
   });
 }
 
+// SQLite's index names are one namespace for the whole file; DAO's are per table.
+CString SqlIndexName(const CString& strTable, const CString& strIndex) { return "qo_" + strTable + "_" + strIndex; }
+
+BOOL IsReservedName(const CString& strName) {
+  return strName.Left(7).CompareNoCase("qo_dao_") == 0 || strName.Left(7).CompareNoCase("sqlite_") == 0;
+}
+
+[[noreturn]] void ThrowTableExists(const CString& strName) {
+  CString strError;
+  strError.Format("Table '%s' already exists.", (LPCSTR)strName);
+  Throw(3010, strError);
+}
+
 void MakeIndex(CDaoTableDef* pTd, const CDaoIndexInfo& info) {
   Engine& engine = EngineOf(pTd->m_pDatabase);
   TableDefState& st = StateOf(pTd->m_pState);
-  if (info.m_strName.IsEmpty() || info.m_nFields <= 0 || info.m_nFields > 10 || info.m_pFieldInfos == NULL)
+  if (info.m_nFields <= 0 || info.m_nFields > 10 || info.m_pFieldInfos == NULL)
     Throw(3264, "No field defined--cannot append TableDef or Index.");
+  CheckName(info.m_strName);
   CString strColumns;
   for (short i = 0; i < info.m_nFields; ++i) {
     int n = FindField(st.fields, info.m_pFieldInfos[i].m_strName);
@@ -59,8 +73,8 @@ void MakeIndex(CDaoTableDef* pTd, const CDaoIndexInfo& info) {
     strError.Format("Index '%s' already exists.", (LPCSTR)info.m_strName);
     Throw(3375, strError);
   }
-  // SQLite's index names are one namespace for the whole file; DAO's are per table.
-  CString strSqlName = "qo_" + st.strName + "_" + info.m_strName;
+  CString strSqlName = SqlIndexName(st.strName, info.m_strName);
+  Transaction transaction(engine);
   Guard([&] {
     engine.db.ExecuteSQL(CString("create ") + (info.m_bUnique || info.m_bPrimary ? "unique " : "") + "index " +
                          Quote(engine, strSqlName) + " on " + Quote(engine, st.strName) + " (" + strColumns + ")");
@@ -68,6 +82,7 @@ void MakeIndex(CDaoTableDef* pTd, const CDaoIndexInfo& info) {
                          QuoteLiteral(st.strName) + ", " + QuoteLiteral(info.m_strName) + ", " +
                          QuoteLiteral(strSqlName) + ", " + (info.m_bPrimary ? "1" : "0") + ")");
   });
+  transaction.Commit();
 }
 
 struct IndexRow {
@@ -119,10 +134,10 @@ CDaoTableDef::~CDaoTableDef() {
 void CDaoTableDef::Create(LPCTSTR lpszName, long lAttributes, LPCTSTR lpszSrcTable, LPCTSTR lpszConnect) {
   ASSERT(!IsOpen());
   ASSERT(m_pDatabase != NULL && m_pDatabase->IsOpen());
-  ASSERT(lpszName != NULL && *lpszName != '\0');
   if (lpszSrcTable != NULL || (lpszConnect != NULL && *lpszConnect != '\0'))
     Throw(3251, "Operation is not supported for this type of object: verknüpfte Tabellen gibt es in dieser "
                 "Datenbank nicht.");
+  CheckName(lpszName != NULL ? lpszName : "");
   TableDefState& st = StateOf(m_pState);
   st = TableDefState();
   st.strName = lpszName;
@@ -146,8 +161,7 @@ void CDaoTableDef::CreateField(CDaoFieldInfo& fieldinfo) {
   TableDefState& st = OpenState(this);
   Engine& engine = EngineOf(m_pDatabase);
   if (engine.bReadOnly) ThrowReadOnly();
-  if (fieldinfo.m_strName.IsEmpty() || fieldinfo.m_strName.GetLength() > 64)
-    Throw(3125, "Ein Feldname muss 1 bis 64 Zeichen lang sein.");
+  CheckName(fieldinfo.m_strName);
   if (FindField(st.fields, fieldinfo.m_strName) >= 0) Throw(3191, "Cannot define field more than once.");
   if ((int)st.fields.size() >= kMaxFields) Throw(3190, "Too many fields defined.");
   FieldDef field;
@@ -169,6 +183,7 @@ void CDaoTableDef::CreateField(CDaoFieldInfo& fieldinfo) {
     // A field added to an existing table.
     CString strSQL = "alter table " + Quote(engine, st.strName) + " add column " + Quote(engine, field.strName) + " " +
                      strDeclared;
+    Transaction transaction(engine);
     Guard([&] {
       engine.db.ExecuteSQL(strSQL);
       CString strRow;
@@ -176,6 +191,7 @@ void CDaoTableDef::CreateField(CDaoFieldInfo& fieldinfo) {
       engine.db.ExecuteSQL("insert or replace into qo_dao_fields (tbl, fld, attributes, required, allowzero) values (" +
                            QuoteLiteral(st.strName) + ", " + QuoteLiteral(field.strName) + strRow);
     });
+    transaction.Commit();
   }
   st.fields.push_back(field);
 }
@@ -186,12 +202,8 @@ void CDaoTableDef::Append() {
   Engine& engine = EngineOf(m_pDatabase);
   if (engine.bReadOnly) ThrowReadOnly();
   if (st.fields.empty()) Throw(3264, "No field defined--cannot append TableDef or Index.");
-  if (FindTable(engine, st.strName, FALSE) || FindTable(engine, st.strName, TRUE) ||
-      st.strName.Left(7).CompareNoCase("qo_dao_") == 0 || st.strName.Left(7).CompareNoCase("sqlite_") == 0) {
-    CString strError;
-    strError.Format("Table '%s' already exists.", (LPCSTR)st.strName);
-    Throw(3010, strError);
-  }
+  if (FindTable(engine, st.strName, FALSE) || FindTable(engine, st.strName, TRUE) || IsReservedName(st.strName))
+    ThrowTableExists(st.strName);
   CString strSQL = "create table " + Quote(engine, st.strName) + " (";
   for (size_t i = 0; i < st.fields.size(); ++i) {
     const FieldDef& field = st.fields[i];
@@ -201,24 +213,19 @@ void CDaoTableDef::Append() {
     if (field.bRequired) strSQL += " not null";
   }
   strSQL += ")";
+  // The table and its catalogue rows together or not at all.
+  Transaction transaction(engine);
   Guard([&] {
-    // The table and its catalogue rows together or not at all.
-    engine.db.BeginTrans();
-    try {
-      engine.db.ExecuteSQL(strSQL);
-      for (const FieldDef& field : st.fields) {
-        CString strRow;
-        strRow.Format(", %ld, %d, %d)", field.lAttributes, field.bRequired ? 1 : 0, field.bAllowZeroLength ? 1 : 0);
-        engine.db.ExecuteSQL("insert or replace into qo_dao_fields (tbl, fld, attributes, required, allowzero) "
-                             "values (" +
-                             QuoteLiteral(st.strName) + ", " + QuoteLiteral(field.strName) + strRow);
-      }
-      engine.db.CommitTrans();
-    } catch (CException*) {
-      engine.db.Rollback();
-      throw;
+    engine.db.ExecuteSQL(strSQL);
+    for (const FieldDef& field : st.fields) {
+      CString strRow;
+      strRow.Format(", %ld, %d, %d)", field.lAttributes, field.bRequired ? 1 : 0, field.bAllowZeroLength ? 1 : 0);
+      engine.db.ExecuteSQL("insert or replace into qo_dao_fields (tbl, fld, attributes, required, allowzero) "
+                           "values (" +
+                           QuoteLiteral(st.strName) + ", " + QuoteLiteral(field.strName) + strRow);
     }
   });
+  transaction.Commit();
   st.bNew = FALSE;
   st.fields = TableFields(engine, st.strName);
 }
@@ -250,6 +257,84 @@ void CDaoTableDef::Close() {
 BOOL CDaoTableDef::IsOpen() const { return StateOf(m_pState).bOpen; }
 
 CString CDaoTableDef::GetName() { return OpenState(this).strName; }
+
+void CDaoTableDef::SetName(LPCTSTR lpszName) {
+  TableDefState& st = OpenState(this);
+  CString strNew = lpszName != NULL ? lpszName : "";
+  CheckName(strNew);
+  if (st.bNew) {
+    st.strName = strNew;
+    return;
+  }
+  Engine& engine = EngineOf(m_pDatabase);
+  if (engine.bReadOnly) ThrowReadOnly();
+  if (strNew == st.strName) return;
+  const BOOL bSameTable = strNew.CompareNoCase(st.strName) == 0;
+  if (IsReservedName(strNew) || (!bSameTable && (FindTable(engine, strNew, FALSE) || FindTable(engine, strNew, TRUE))))
+    ThrowTableExists(strNew);
+  const CString strOld = st.strName;
+  Transaction transaction(engine);
+  Guard([&] {
+    // SQLite keeps the table's indexes under names that carry the table's:
+    // each is made again under the new one, as the catalogue then says.
+    struct Moved {
+      CString strIndex, strSqlName, strColumns;
+      BOOL bUnique;
+    };
+    std::vector<Moved> moved;
+    EnsureIndexCatalogue(engine);
+    for (const IndexRow& row : ListIndexes(engine, strOld)) {
+      Value catalogued = QueryValue(engine, "select count(*) from qo_dao_indexes where sqlname = " +
+                                                QuoteLiteral(row.strSqlName));
+      if (catalogued.bytes != "1") continue;   // not made through CreateIndex: keeps its name
+      Moved index{row.strName, row.strSqlName, CString(), row.bUnique};
+      Cursor columns(engine, "PRAGMA index_xinfo(" + Quote(engine, row.strSqlName) + ")");
+      while (columns.Next()) {
+        if (columns.Get(5).bytes != "1" || columns.Get(2).bNull) continue;
+        if (!index.strColumns.IsEmpty()) index.strColumns += ", ";
+        index.strColumns += Quote(engine, CString(columns.Get(2).bytes.c_str()));
+        if (columns.Get(3).bytes == "1") index.strColumns += " desc";
+      }
+      moved.push_back(index);
+    }
+    for (const Moved& index : moved) engine.db.ExecuteSQL("drop index " + Quote(engine, index.strSqlName));
+    // The connection's null trigger is named after the table it serves.
+    engine.db.ExecuteSQL("drop trigger if exists temp." + Quote(engine, "qo_dao_null_" + strOld));
+    // Views that name the old table keep naming that name (a table put in its
+    // place later serves them), and a view that names a table that is gone
+    // does not stop the rename.
+    engine.db.ExecuteSQL("pragma legacy_alter_table = on");
+    try {
+      CString strFrom = strOld;
+      if (bSameTable) {
+        // SQLite refuses a rename that only changes the letter case.
+        CString strStep = "qo_dao_rename_" + strOld;
+        engine.db.ExecuteSQL("alter table " + Quote(engine, strFrom) + " rename to " + Quote(engine, strStep));
+        strFrom = strStep;
+      }
+      engine.db.ExecuteSQL("alter table " + Quote(engine, strFrom) + " rename to " + Quote(engine, strNew));
+    } catch (CDBException*) {
+      try {
+        engine.db.ExecuteSQL("pragma legacy_alter_table = off");
+      } catch (CDBException* e) {
+        e->Delete();
+      }
+      throw;
+    }
+    engine.db.ExecuteSQL("pragma legacy_alter_table = off");
+    engine.db.ExecuteSQL("update qo_dao_fields set tbl = " + QuoteLiteral(strNew) + " where tbl = " +
+                         QuoteLiteral(strOld));
+    for (const Moved& index : moved) {
+      CString strSqlName = SqlIndexName(strNew, index.strIndex);
+      engine.db.ExecuteSQL(CString("create ") + (index.bUnique ? "unique " : "") + "index " +
+                           Quote(engine, strSqlName) + " on " + Quote(engine, strNew) + " (" + index.strColumns + ")");
+      engine.db.ExecuteSQL("update qo_dao_indexes set tbl = " + QuoteLiteral(strNew) + ", sqlname = " +
+                           QuoteLiteral(strSqlName) + " where sqlname = " + QuoteLiteral(index.strSqlName));
+    }
+  });
+  transaction.Commit();
+  st.strName = strNew;
+}
 
 long CDaoTableDef::GetAttributes() {
   TableDefState& st = OpenState(this);

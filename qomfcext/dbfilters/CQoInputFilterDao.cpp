@@ -5,6 +5,7 @@
 #include <CQoInterActive.h>
 
 #include "CQoPasswortDlg.h"
+#include "QoBatchMessageBox.h"
 #include "QoDaoError.h"
 #include "QoWorkbookReader.h"
 #include "resource.h"
@@ -183,6 +184,7 @@ void CQoInputFilterDao::Init(const CQoString& name)
 {
     m_strFileName = name;
     m_strDatabaseName = name;
+    m_strLastError.Empty();
     CloseResources();
     CQoInputFilter::Init(name);
     for (;;) {
@@ -195,8 +197,11 @@ void CQoInputFilterDao::Init(const CQoString& name)
             if (code == 3029 || code == 3031) {
                 e->Delete();
                 CString password;
-                if (!CQoPasswortDlg::Ask(name, password))
-                    return;   // cancelled: the filter stays closed
+                if (!CQoPasswortDlg::Ask(name, password)) {
+                    // Cancelled (or batch mode): the filter stays closed.
+                    m_strLastError = (const char*)CQoPasswortDlg::RefusedText(name);
+                    return;
+                }
                 Password((const char*)password);
                 continue;
             }
@@ -204,13 +209,14 @@ void CQoInputFilterDao::Init(const CQoString& name)
                 e->Delete();
                 CString text;
                 text.LoadString(IDS_EXCEL_UNREADABLE);
-                AfxMessageBox(text, MB_OK);
+                m_strLastError = (const char*)text;
+                QoBatchMessageBox(0, IDOK, text, MB_OK);
                 return;
             }
-            CQoString text = QoDaoTakeMessage(e);
+            m_strLastError = QoDaoTakeMessage(e);
             if (!CQoInterActive::IsQuiet())
-                CQoException::Throw(text, nullptr);
-            break;   // batch mode: closed, every read finds nothing
+                CQoException::Throw(m_strLastError, nullptr);
+            break;   // batch mode: closed, every read finds nothing; LastError says why
         }
     }
     if (!m_strTableName.IsEmpty() && m_tableType != tableNone)

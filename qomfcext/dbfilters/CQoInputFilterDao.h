@@ -9,10 +9,12 @@
 //
 // Every value becomes text by ConvertOleVariant. A database protected by a
 // password is opened after the user typed it in CQoPasswortDlg (asked again
-// until it fits or the user cancels; in batch mode too). Other errors while
-// opening are raised as CQoException, except in quiet (batch) mode, where the
-// filter stays closed and reads nothing; errors while selecting a table are
-// always raised; errors while moving make the move answer false.
+// until it fits or the user cancels). In batch mode nobody is asked: a
+// missing or wrong password (give it with Password) leaves the filter closed
+// with a log line. Other errors while opening are raised as CQoException,
+// except in quiet (batch) mode, where the filter stays closed and reads
+// nothing; LastError then tells the host why. Errors while selecting a table
+// are always raised; errors while moving make the move answer false.
 #pragma once
 
 #include <afxdao.h>
@@ -49,6 +51,9 @@ public:
     void Password(const CQoString& password);
     const CQoString& Password() const { return m_strPassword; }
     CDaoDatabase& GetDatabase() { return m_database; }
+    // Why the last Init left the database closed (the engine's description,
+    // the password or the workbook message); empty after a successful open.
+    const CQoString& LastError() const { return m_strLastError; }
     void SetShowError(bool show) { m_bShowError = show; }
 
     // The text of a field value: numbers, dates, currency, booleans and
@@ -70,6 +75,7 @@ private:
     CDaoRecordset* m_pRecordset;
     CQoString m_strPassword;     // ";PWD=..." or empty
     CQoString m_strConnectPrefix;
+    CQoString m_strLastError;
     CDaoTableDef* m_pTableDef;
     CDaoDatabase m_database;
     bool m_bShowError;

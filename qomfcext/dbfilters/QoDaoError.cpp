@@ -7,7 +7,7 @@ long QoDaoCode(CDaoException* e)
     return e && e->m_pErrorInfo ? e->m_pErrorInfo->m_lErrorCode : 0;
 }
 
-CQoString QoDaoTakeMessage(CDaoException* e)
+CQoString QoDaoMessage(CDaoException* e)
 {
     CQoString text;
     if (e->m_pErrorInfo)
@@ -19,8 +19,25 @@ CQoString QoDaoTakeMessage(CDaoException* e)
     }
     if (text.IsEmpty())
         text = "DAO-Fehler";
+    return text;
+}
+
+CQoString QoDaoTakeMessage(CDaoException* e)
+{
+    CQoString text = QoDaoMessage(e);
     e->Delete();
     return text;
+}
+
+void QoDaoPrefix(CDaoException* e, const CQoString& prefix)
+{
+    CQoString text = QoDaoMessage(e);
+    if (!e->m_pErrorInfo) {
+        e->m_pErrorInfo = new CDaoErrorInfo;
+        e->m_pErrorInfo->m_lErrorCode = 0;
+        e->m_pErrorInfo->m_lHelpContext = 0;
+    }
+    e->m_pErrorInfo->m_strDescription = (prefix + text).GetString();
 }
 
 void QoDaoRaise(CDaoException* e)

@@ -11,6 +11,11 @@
 long QoDaoCode(CDaoException* e);
 // The description of the engine's exception, which is deleted.
 CQoString QoDaoTakeMessage(CDaoException* e);
+// The description, the exception kept.
+CQoString QoDaoMessage(CDaoException* e);
+// Puts `prefix` before the description, so that what is shown or raised
+// says where the error happened.
+void QoDaoPrefix(CDaoException* e, const CQoString& prefix);
 [[noreturn]] void QoDaoRaise(CDaoException* e);
 // With `show`: the exception's message box, false; otherwise raised.
 bool QoDaoShowOrRaise(CDaoException* e, bool show);

@@ -29,6 +29,11 @@ void QoBatchMessageBoxSetMode(bool batch)
     g_batchMode = batch;
 }
 
+bool QoBatchMessageBoxGetMode()
+{
+    return g_batchMode;
+}
+
 int QoBatchMessageBox(int number, UINT autoAnswer, const char* text, UINT type, UINT helpId)
 {
     if (!text)

@@ -22,3 +22,6 @@ QOMFCEXT_API int QoBatchMessageBox(int number, UINT autoAnswer, UINT textId,
                                    UINT type = MB_OK, UINT helpId = 0);
 // Switches batch mode on or off; it is off when the library is loaded.
 QOMFCEXT_API void QoBatchMessageBoxSetMode(bool batch);
+// Whether batch mode is on: nothing may then wait for a user (the library's
+// own prompts answer as a cancel does).
+QOMFCEXT_API bool QoBatchMessageBoxGetMode();

@@ -8,14 +8,18 @@
 #include <CQoDaoDatabase.h>
 #include <CQoException.h>
 #include <CQoInputFilterDao.h>
+#include <CQoLog.h>
 #include <CQoOutputFilterDao.h>
+#include <QoBatchMessageBox.h>
 
 #include <DialogDriver.h>
 
 #include "../qotools/PythonPeer.h"
 
+#include <filesystem>
 #include <fstream>
 #include <functional>
+#include <sstream>
 #include <vector>
 
 using odbctest::Folder;
@@ -54,6 +58,65 @@ void WriteT(const std::string& path, const std::vector<Row>& rows, const char* p
     }
     out.ReleaseDB();
 }
+
+// Everything a user could tell apart in the file: every table with its
+// fields (type, size, attributes), its indexes and its rows.
+std::string Dump(const std::string& path)
+{
+    CDaoDatabase db;
+    db.Open(path.c_str());
+    std::ostringstream out;
+    for (int t = 0; t < db.GetTableDefCount(); ++t) {
+        CDaoTableDefInfo info;
+        db.GetTableDefInfo(t, info);
+        CDaoTableDef table(&db);
+        table.Open(info.m_strName);
+        out << "table " << (LPCSTR)info.m_strName << "\n";
+        for (int f = 0; f < table.GetFieldCount(); ++f) {
+            CDaoFieldInfo field;
+            table.GetFieldInfo(f, field, AFX_DAO_ALL_INFO);
+            out << " field " << (LPCSTR)field.m_strName << " " << field.m_nType << " " << field.m_lSize << " "
+                << field.m_lAttributes << " " << field.m_bAllowZeroLength << "\n";
+        }
+        for (int i = 0; i < table.GetIndexCount(); ++i) {
+            CDaoIndexInfo index;
+            table.GetIndexInfo(i, index, AFX_DAO_ALL_INFO);
+            out << " index " << (LPCSTR)index.m_strName << " on";
+            for (int k = 0; k < index.m_nFields; ++k)
+                out << " " << (LPCSTR)index.m_pFieldInfos[k].m_strName;
+            out << "\n";
+        }
+        CDaoRecordset rows(&db);
+        rows.Open(&table);
+        for (; !rows.IsEOF(); rows.MoveNext()) {
+            out << " row";
+            for (int f = 0; f < rows.GetFieldCount(); ++f) {
+                CQoString text;
+                CQoInputFilterDao::ConvertOleVariant(rows.GetFieldValue(f), text);
+                out << " [" << text.GetString() << "]";
+            }
+            out << "\n";
+        }
+    }
+    return out.str();
+}
+
+std::string ReadFile(const std::string& path)
+{
+    std::ifstream in(path, std::ios::binary);
+    return std::string((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
+}
+
+// The process log, written to a file of the test's folder while it lives.
+class LogToFile {
+public:
+    explicit LogToFile(const std::string& path) : m_path(path) { _theLog.Open(path.c_str()); }
+    ~LogToFile() { _theLog.Close(); }
+    std::string Text() const { return ReadFile(m_path); }
+
+private:
+    std::string m_path;
+};
 
 const std::vector<Row> kRows = {
     {"M\xFCller; \"Hans\"", "1", "abc"},
@@ -293,4 +356,263 @@ open(os.path.join(folder, 'alt.xls'), 'wb').write(b'\xd0\xcf\x11\xe0\xa1\xb1\x1a
     EXPECT_EQ("", ErrorOf([&] { old.Init(folder.Path("alt.xls").c_str()); }));
     EXPECT_TRUE(driver.Done());
     EXPECT_FALSE(old.FirstRow());
+}
+
+namespace {
+
+// A run of the output filter over table T that fails or is given up somewhere.
+struct FailedRun {
+    const char* what;
+    std::function<void(CQoOutputFilterDao&)> define;   // after T's worked-example columns
+    std::function<void(CQoOutputFilterDao&)> run;      // after UseDB; may raise
+};
+
+void DefineT(CQoOutputFilterDao& out)
+{
+    out.SetTableName("T");
+    out.NumCols(3);
+    out.ColumnName(0, "A");
+    out.SetLength(0, 40);
+    out.ColumnName(1, "B");
+    out.SetType(1, CQoOutputFilterDB::dbtypeInteger);
+    out.ColumnName(2, "K");
+    out.SetLength(2, 5);
+    out.SetIndexed(2, true);
+}
+
+void WriteRows(CQoOutputFilterDao& out, const std::vector<Row>& rows)
+{
+    for (const Row& row : rows) {
+        out.InitRow();
+        for (int c = 0; c < (int)row.size(); ++c)
+            out.Value(c, row[c].c_str());
+        out.WriteRow();
+    }
+}
+
+} // namespace
+
+TEST(DaoFilters, AFailedOrCancelledRunLeavesTheOldTableAsItWas)
+{
+    const std::string longName(65, 'x');
+    const FailedRun runs[] = {
+        {"cancelled by the host", nullptr,
+         [](CQoOutputFilterDao& out) {
+             ASSERT_TRUE(out.Init());
+             WriteRows(out, {{"neu", "1", "n"}, {"neu2", "2", "m"}});
+             out.Discard();
+         }},
+        {"a row failed", nullptr,
+         [](CQoOutputFilterDao& out) {
+             ASSERT_TRUE(out.Init());
+             WriteRows(out, {{"neu", "1", "n"}});
+             EXPECT_NE("", ErrorOf([&] { WriteRows(out, {{"neu", "keine Zahl", "n"}}); }));
+             std::string end = ErrorOf([&] { out.ReleaseDB(); });
+             EXPECT_NE(std::string::npos, end.find("unver\xE4ndert")) << end;
+         }},
+        {"names that differ only in case", [](CQoOutputFilterDao& out) { out.ColumnName(1, "a"); },
+         [](CQoOutputFilterDao& out) { EXPECT_NE("", ErrorOf([&] { out.Init(); })); }},
+        {"256 columns",
+         [](CQoOutputFilterDao& out) {
+             out.NumCols(256);
+             for (int c = 3; c < 256; ++c)
+                 out.ColumnName(c, ("F" + std::to_string(c)).c_str()), out.SetLength(c, 1);
+         },
+         [](CQoOutputFilterDao& out) { EXPECT_NE("", ErrorOf([&] { out.Init(); })); }},
+        {"a column name too long", [&](CQoOutputFilterDao& out) { out.ColumnName(0, longName.c_str()); },
+         [](CQoOutputFilterDao& out) { EXPECT_NE("", ErrorOf([&] { out.Init(); })); }},
+        {"brackets in the table name", [](CQoOutputFilterDao& out) { out.SetTableName("[T]"); },
+         [](CQoOutputFilterDao& out) {
+             EXPECT_NE(std::string::npos, ErrorOf([&] { out.Init(); }).find("'[T]' is not a valid name"));
+         }},
+    };
+    for (const FailedRun& r : runs) {
+        SCOPED_TRACE(r.what);
+        Folder folder;
+        std::string path = folder.Path("ziel.mdb");
+        WriteT(path, kRows);
+        const std::string before = Dump(path);
+        {
+            CQoOutputFilterDao out;
+            DefineT(out);
+            if (r.define)
+                r.define(out);
+            out.UseDB(path.c_str());
+            r.run(out);
+        }
+        EXPECT_EQ(before, Dump(path));
+    }
+}
+
+TEST(DaoFilters, TheTableIsReplacedOnlyWhenTheRunIsComplete)
+{
+    Folder folder;
+    std::string path = folder.Path("ziel.mdb");
+    WriteT(path, kRows);
+    const std::string before = Dump(path);
+
+    // A run killed after Init leaves its table under the temporary name (the
+    // copy of the file is what a killed process leaves)...
+    std::string killed = folder.Path("abgebrochen.mdb");
+    {
+        CQoOutputFilterDao out;
+        DefineT(out);
+        out.UseDB(path.c_str());
+        ASSERT_TRUE(out.Init());
+        EXPECT_EQ(0u, Dump(path).find(before)) << "the old table is untouched while the new one fills";
+        std::filesystem::copy_file(path, killed);
+        out.Discard();
+    }
+    EXPECT_NE(before, Dump(killed));
+    // ...which the next run removes; a complete run ends with the new rows
+    // under the old name, its fields and its index, and nothing else.
+    WriteT(killed, {{"neu", "9", "n"}});
+    WriteT(path, {{"neu", "9", "n"}});
+    EXPECT_EQ(Dump(path), Dump(killed));
+    EXPECT_EQ("table T\n field A 10 40 34 1\n field B 4 4 33 0\n field K 10 5 34 1\n index T2 on K\n"
+              " row [neu] [9] [n]\n",
+              Dump(path));
+
+    // The destructor completes a run the host did not end, unless an error is
+    // on its way out.
+    try {
+        CQoOutputFilterDao out;
+        DefineT(out);
+        out.UseDB(path.c_str());
+        ASSERT_TRUE(out.Init());
+        WriteRows(out, {{"halb", "1", "h"}});
+        throw std::runtime_error("Abbruch");
+    } catch (const std::runtime_error&) {
+    }
+    EXPECT_NE(std::string::npos, Dump(path).find("[neu]"));
+    {
+        CQoOutputFilterDao out;
+        DefineT(out);
+        out.UseDB(path.c_str());
+        ASSERT_TRUE(out.Init());
+        WriteRows(out, {{"ganz", "1", "g"}});
+    }
+    EXPECT_NE(std::string::npos, Dump(path).find("[ganz]"));
+}
+
+TEST(DaoFilters, AnOutputPathThatCannotHoldADatabaseIsACheckedError)
+{
+    Folder folder;
+    const std::string longPath = folder.Path((std::string(250, 'l') + ".mdb").c_str());
+    const std::string paths[] = {
+        folder.Path("fehlt\\ziel.mdb"), folder.Path(""), "NUL", "CON", "COM1", "\\\\server\\share\\x.mdb", longPath,
+    };
+    for (const std::string& path : paths) {
+        SCOPED_TRACE(path);
+        CQoOutputFilterDao out;
+        DefineT(out);
+        std::string error = ErrorOf([&] { out.UseDB(path.c_str()); });
+        EXPECT_NE(std::string::npos, error.find(path)) << error;
+        EXPECT_FALSE(out.Init());
+    }
+    EXPECT_TRUE(std::filesystem::is_empty(std::filesystem::path(folder.Path(""))))
+        << "no empty file is left behind";
+}
+
+TEST(DaoFilters, ValuesAreStoredWholeOrRefusedNamingRecordAndColumn)
+{
+    Folder folder;
+    std::string path = folder.Path("ziel.mdb");
+    struct Case {
+        const char* what;
+        CQoString value;
+        int column;
+        const char* error;
+    } cases[] = {
+        {"a number too big", "99999999999", 1, "Satz 2, Spalte B: Numeric field overflow."},
+        {"a NUL inside", CQoString("ab\0cd", 5), 0, "Satz 2, Spalte A: "},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        CQoOutputFilterDao out;
+        DefineT(out);
+        out.UseDB(path.c_str());
+        ASSERT_TRUE(out.Init());
+        WriteRows(out, {{"eins", "1", "e"}});
+        std::string error = ErrorOf([&] {
+            out.InitRow();
+            out.Value(c.column, c.value);
+            out.WriteRow();
+        });
+        EXPECT_EQ(0u, error.find(c.error)) << error;
+        out.Discard();
+    }
+}
+
+TEST(DaoFilters, ABatchRunNeverWaitsForThePassword)
+{
+    Folder folder;
+    std::string path = folder.Path("geheim.mdb");
+    {
+        CDaoDatabase db;
+        db.Create(path.c_str(), ";LANGID=0x0409;CP=1252;COUNTRY=0;pwd=Sesam");
+    }
+    LogToFile log(folder.Path("lauf.log"));
+    QoBatchMessageBoxSetMode(true);
+    qotest::DialogDriver driver;   // no dialog may appear
+
+    CQoInputFilterDao in(CQoFile::typeAccess);
+    in.SetTableName("T");
+    in.SetTableType(CQoInputFilterDB::tableTable);
+    EXPECT_EQ("", ErrorOf([&] { in.Init(path.c_str()); }));
+    EXPECT_FALSE(in.GetDatabase().IsOpen());
+    EXPECT_EQ("Die Datenbank '" + path + "' ist durch ein Passwort gesch\xFCtzt; das Passwort fehlt oder ist falsch.",
+              in.LastError().GetString());
+
+    CQoOutputFilterDao out;
+    DefineT(out);
+    out.UseDB(path.c_str());
+    EXPECT_FALSE(out.Init());
+    EXPECT_EQ(in.LastError().GetString(), std::string(out.LastError().GetString()));
+    QoBatchMessageBoxSetMode(false);
+
+    EXPECT_EQ(0, driver.Unanswered());
+    std::string text = log.Text();
+    size_t first = text.find(path);
+    ASSERT_NE(std::string::npos, first) << text;
+    EXPECT_NE(std::string::npos, text.find(path, first + 1)) << "one line for each filter: " << text;
+}
+
+TEST(DaoFilters, AnOutputIntoTheFileBeingReadIsRefusedAtOnceAndLosesNothing)
+{
+    // The input's connection holds its read lock while it is read: the
+    // output's second connection to that file waits two seconds, not
+    // minutes, and says why it cannot write.
+    for (const char* target : {"U", "T"}) {
+        SCOPED_TRACE(target);
+        Folder folder;
+        std::string path = folder.Path("beides.mdb");
+        WriteT(path, kRows);
+        const std::string before = Dump(path);
+        CQoInputFilterDao in(CQoFile::typeAccess);
+        in.SetTableName("T");
+        in.SetTableType(CQoInputFilterDB::tableTable);
+        in.Init(path.c_str());
+        CQoOutputFilterDao out;
+        DefineT(out);
+        out.SetTableName(target);
+        out.UseDB(path.c_str());
+        std::string error = ErrorOf([&] {
+            out.Init();
+            for (bool ok = in.FirstRow(); ok; ok = in.NextRow()) {
+                out.InitRow();
+                for (int col = 0; col < 3; ++col) {
+                    CQoString value;
+                    in.Value(col, value);
+                    out.Value(col, value);
+                }
+                out.WriteRow();
+            }
+            out.ReleaseDB();
+        });
+        EXPECT_NE(std::string::npos, error.find("'" + path + "' ist in diesem Programm zugleich zum Lesen")) << error;
+        in.CloseResources();
+        out.Discard();
+        EXPECT_EQ(0u, Dump(path).find(before));
+    }
 }

@@ -124,3 +124,115 @@ TEST_F(DaoTableDefTest, StoredQueriesAreViewsAndTemporaryOnesAreNeverStored) {
   m_db.DeleteQueryDef("Grosse");
   EXPECT_EQ(0, m_db.GetQueryDefCount());
 }
+
+TEST_F(DaoTableDefTest, NamesJetRefusesAreRefusedBeforeAnythingIsMade) {
+  const std::string longest(64, 'n');
+  const std::string tooLong(65, 'n');
+  const char* refused[] = {"[Kunden]", "a.b", "a!b", "a`b", " vorn", "Tab\tulator", "", tooLong.c_str()};
+  MakeTable("T", {{"A", dbLong, 0}});
+  CDaoTableDef existing(&m_db);
+  existing.Open("T");
+  for (const char* name : refused) {
+    SCOPED_TRACE(name);
+    CDaoTableDef td(&m_db);
+    DaoFailure failure = DaoError([&] { td.Create(name); });
+    EXPECT_EQ(3125, failure.lCode);
+    if (*name != '\0' && strchr(name, '\t') == nullptr) EXPECT_EQ(0, failure.strDescription.Find(CString("'") + name + "'"));
+    td.Create("Neu");
+    EXPECT_EQ(3125, DaoError([&] { td.CreateField(name, dbLong, 0); }).lCode);
+    CDaoIndexFieldInfo key[] = {{"A", FALSE}};
+    CDaoIndexInfo index;
+    index.m_strName = name;
+    index.m_pFieldInfos = key;
+    index.m_nFields = 1;
+    EXPECT_EQ(3125, DaoError([&] { existing.CreateIndex(index); }).lCode);
+    EXPECT_EQ(3125, DaoError([&] { existing.SetName(name); }).lCode);
+  }
+  MakeTable(longest.c_str(), {{longest.c_str(), dbLong, 0}});
+  EXPECT_EQ(2, m_db.GetTableDefCount()) << "nothing but T and the longest name";
+}
+
+TEST_F(DaoTableDefTest, ATableIsSwappedInOneTransactionWithItsFieldsAndIndexes) {
+  // "Alt" is the table in use, with a view on it; "Neu" its successor.
+  MakeTable("Alt", {{"X", dbLong, 0}});
+  m_db.Execute("insert into Alt (X) values (1)");
+  CDaoQueryDef view(&m_db);
+  view.Create("Sicht", "select * from Alt");
+  view.Append();
+  CDaoTableDef neu(&m_db);
+  neu.Create("Neu");
+  neu.CreateField("Nr", dbLong, 0);
+  CDaoFieldInfo name;
+  name.m_strName = "Name";
+  name.m_nType = dbText;
+  name.m_lSize = 40;
+  name.m_lAttributes = dbVariableField;
+  name.m_bRequired = FALSE;
+  name.m_bAllowZeroLength = FALSE;
+  neu.CreateField(name);
+  neu.Append();
+  CDaoIndexFieldInfo key[] = {{"Nr", FALSE}};
+  CDaoIndexInfo unique;
+  unique.m_strName = "Schluessel";
+  unique.m_pFieldInfos = key;
+  unique.m_nFields = 1;
+  unique.m_bUnique = TRUE;
+  neu.CreateIndex(unique);
+  m_db.Execute("insert into Neu (Nr, Name) values (7, 'sieben')");
+  auto swap = [&] {
+    m_db.DeleteTableDef("Alt");
+    neu.SetName("Alt");
+    CDaoIndexFieldInfo byName[] = {{"Name", FALSE}};
+    CDaoIndexInfo index;
+    index.m_strName = "Alt1";
+    index.m_pFieldInfos = byName;
+    index.m_nFields = 1;
+    neu.CreateIndex(index);
+  };
+  auto tables = [&] {
+    std::string names;
+    for (int i = 0; i < m_db.GetTableDefCount(); ++i) {
+      CDaoTableDefInfo info;
+      m_db.GetTableDefInfo(i, info);
+      names += std::string(info.m_strName) + " ";
+    }
+    return names;
+  };
+
+  CDaoWorkspace* ws = m_db.m_pWorkspace;
+  EXPECT_EQ(3034, DaoError([&] { ws->CommitTrans(); }).lCode);
+  ws->BeginTrans();
+  swap();
+  // A unit of the caller's own, given up inside the transaction, takes back only itself.
+  ws->BeginTrans();
+  MakeTable("Zwischen", {{"Z", dbLong, 0}});
+  ws->Rollback();
+  ws->Rollback();
+  neu.Close();
+  EXPECT_EQ("Alt Neu ", tables());
+  neu.Open("Neu");
+  EXPECT_EQ(1, neu.GetIndexCount());
+  CDaoRecordset old(&m_db);
+  old.Open(&view);
+  EXPECT_EQ(1, old.GetFieldValue(0).lVal);
+  old.Close();
+
+  ws->BeginTrans();
+  swap();
+  ws->CommitTrans();
+  EXPECT_EQ("Alt ", tables());
+  CDaoTableDef swapped(&m_db);
+  swapped.Open("Alt");
+  CDaoFieldInfo info;
+  swapped.GetFieldInfo(1, info, AFX_DAO_ALL_INFO);
+  EXPECT_FALSE(info.m_bAllowZeroLength) << "the field's attributes move with the table";
+  ASSERT_EQ(2, swapped.GetIndexCount());
+  CDaoIndexInfo index;
+  swapped.GetIndexInfo(0, index);
+  EXPECT_EQ(CString("Schluessel"), index.m_strName);
+  EXPECT_TRUE(index.m_bUnique);
+  EXPECT_EQ(3146, DaoError([&] { m_db.Execute("insert into Alt (Nr, Name) values (7, 'doppelt')"); }).lCode);
+  CDaoRecordset viaView(&m_db);
+  viaView.Open(&view);
+  EXPECT_EQ(CString("sieben"), TextOf(viaView.GetFieldValue("Name"))) << "the view serves the new table";
+}
