@@ -125,6 +125,9 @@ public:
   // --- the layer's own, used by CRecordset -------------------------------------
   enum TextForm { textBytes = 0, textUtf8 = 1 };
   int GetTextForm() const { return m_nTextForm; }
+  // What the driver quotes names with (SQL_IDENTIFIER_QUOTE_CHAR); "" when it
+  // quotes none.
+  CString GetIdentifierQuote() const { return m_strIdentifierQuote; }
   // Raises CDBException when nRetCode is an error (SQL_ERROR, SQL_INVALID_HANDLE).
   void Check(RETCODE nRetCode, HSTMT hstmt, LPCSTR lpszCall);
   HSTMT AllocStatement();

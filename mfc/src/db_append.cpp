@@ -286,24 +286,30 @@ void CRecordset::SendBatch() {
     return rc;
   };
   // Runs `hstmt` for nSets parameter sets; a failing set counts as failure
-  // also where the driver goes on after it.
+  // also where the driver goes on after it. The diagnostics are read at once:
+  // every later call on the handle (even resetting an attribute) clears them,
+  // and the server's own words would be lost.
   std::vector<SQLUSMALLINT> status;
-  HSTMT hFailed = SQL_NULL_HSTMT;
+  CDBException* pException = NULL;
   auto execute = [&](HSTMT hstmt, size_t nSets, SQLRETURN rc) -> SQLRETURN {
     status.assign(nSets, (SQLUSMALLINT)0xFFFF);
+    LPCSTR lpszCall = "SQLBindParameter";
     if (SQL_SUCCEEDED(rc)) rc = SQLSetStmtAttr(hstmt, SQL_ATTR_PARAMSET_SIZE, (SQLPOINTER)(SQLULEN)nSets, 0);
     if (SQL_SUCCEEDED(rc)) rc = SQLSetStmtAttr(hstmt, SQL_ATTR_PARAM_STATUS_PTR, status.data(), 0);
-    if (SQL_SUCCEEDED(rc)) rc = SQLExecute(hstmt);
+    if (SQL_SUCCEEDED(rc)) {
+      lpszCall = "SQLExecute";
+      rc = SQLExecute(hstmt);
+    }
     BOOL bFailed = !SQL_SUCCEEDED(rc) && rc != SQL_NO_DATA;
     for (size_t r = 0; r < nSets && !bFailed; ++r) bFailed = status[r] == SQL_PARAM_ERROR;
+    if (bFailed) {
+      pException = new CDBException(rc == SQL_SUCCESS_WITH_INFO || SQL_SUCCEEDED(rc) ? SQL_ERROR : rc);
+      pException->BuildErrorString(m_pDatabase, hstmt, lpszCall);
+    }
     // The status array ends with this call: the statement must not keep it.
     SQLSetStmtAttr(hstmt, SQL_ATTR_PARAM_STATUS_PTR, NULL, 0);
     SQLFreeStmt(hstmt, SQL_CLOSE);
-    if (bFailed) {
-      hFailed = hstmt;
-      return rc == SQL_SUCCESS_WITH_INFO || SQL_SUCCEEDED(rc) ? SQL_ERROR : rc;
-    }
-    return SQL_SUCCESS;
+    return bFailed ? SQL_ERROR : SQL_SUCCESS;
   };
 
   SQLRETURN rc = SQL_SUCCESS;
@@ -318,11 +324,6 @@ void CRecordset::SendBatch() {
     rc = execute(st.hMulti, nMultiRows / nPerInsert, rcBind);
   }
   if (rc == SQL_SUCCESS && nMultiRows < nRows) rc = execute(m_hstmt, nRows - nMultiRows, bind(m_hstmt, 1, nMultiRows));
-  CDBException* pException = NULL;
-  if (rc != SQL_SUCCESS) {
-    pException = new CDBException(rc);
-    pException->BuildErrorString(m_pDatabase, hFailed, "SQLExecute");
-  }
 
   for (qodb::QueuedColumn& column : st.queue) {
     column.data.clear();

@@ -154,7 +154,9 @@ BOOL CRecordset::Open(UINT nOpenType, LPCTSTR lpszSQL, DWORD dwOptions) {
   // A bare table name stands for all of its rows, as in MFC.
   CString strSQL = lpszSQL != NULL ? lpszSQL : (LPCSTR)GetDefaultSQL();
   strSQL.Trim();
-  ASSERT(!strSQL.IsEmpty());
+  // A statement may come from a user: none at all is the data source's kind
+  // of failure, not a programming error.
+  if (strSQL.IsEmpty()) qodb::Throw(SQL_ERROR, "Die SQL-Anweisung ist leer.");
   CString strHead = strSQL.Left(7);
   strHead.MakeLower();
   if (strHead.Left(6) != "select" && strHead.Left(4) != "with" && strHead.Left(1) != "{") {

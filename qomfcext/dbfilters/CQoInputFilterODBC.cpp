@@ -5,6 +5,7 @@
 
 #include "CQoODBCRecordset.h"
 #include "QoDbError.h"
+#include "QoSqlName.h"
 
 CQoInputFilterODBC::CQoInputFilterODBC()
     : m_pRecordset(NULL), m_lRow(0)
@@ -33,13 +34,16 @@ void CQoInputFilterODBC::Init(const CQoString& connect)
         m_strDatabaseName = connect;
     CloseResources();
     CQoInputFilter::Init(m_strDatabaseName);
+    m_strLastError.Empty();
     try {
         m_database.OpenEx(m_strDatabaseName, CDatabase::useCursorLib);
     } catch (CDBException* e) {
         CQoString text = QoDbTakeMessage(e);
-        // A batch run goes on without the source; its reads find nothing.
+        // A batch run goes on without the source; its reads find nothing,
+        // and the host can still say why.
         if (!CQoInterActive::IsQuiet())
             CQoException::Throw(text, nullptr);
+        m_strLastError = text;
     }
     if (!m_strTableName.IsEmpty() && m_tableType != tableNone)
         InitTable(m_strTableName, m_tableType, true);
@@ -50,12 +54,24 @@ void CQoInputFilterODBC::InitTable(const char* name, tabletype type, bool countR
     if (!m_database.IsOpen())
         return;
     CString statement;
-    if (type == tableTable)
-        statement.Format("select * from %s", name ? name : "");
-    else if (type == tableSql)
+    if (type == tableTable) {
+        CQoString problem;
+        if (!QoCheckSqlName(name ? name : "", problem)) {
+            CQoString text;
+            text.Format("Der Tabellenname \x84%s\x93 %s.", name ? name : "", problem.GetString());
+            text.Replace('\n', ' ');
+            text.Replace('\r', ' ');
+            CQoException::Throw(text, nullptr);
+        }
+        statement.Format("select * from %s", name);
+    } else if (type == tableSql) {
         statement = name ? name : "";
-    else
+        statement.Trim();
+        if (statement.IsEmpty())
+            CQoException::Throw("Die Eingabe enth\xE4lt keine SQL-Anweisung.", nullptr);
+    } else {
         return;
+    }
 
     delete m_pRecordset;
     m_pRecordset = NULL;
@@ -117,7 +133,7 @@ bool CQoInputFilterODBC::FirstRow()
     try {
         m_pRecordset->MoveFirst();
     } catch (CDBException* e) {
-        e->Delete();
+        m_strLastError = QoDbTakeMessage(e);
         m_lCurrentRow = -1;
         return false;
     }
@@ -134,7 +150,7 @@ bool CQoInputFilterODBC::NextRow()
     try {
         m_pRecordset->MoveNext();
     } catch (CDBException* e) {
-        e->Delete();
+        m_strLastError = QoDbTakeMessage(e);
         return false;
     }
     if (m_pRecordset->IsEOF())
@@ -160,7 +176,7 @@ bool CQoInputFilterODBC::AbsoluteRow(long row)
         m_lCurrentRow = row;
         return true;
     } catch (CDBException* e) {
-        e->Delete();
+        m_strLastError = QoDbTakeMessage(e);
         return false;
     } catch (const CQoException&) {
         return false;   // counting failed

@@ -13,7 +13,9 @@
 // Every value arrives as text, whatever the column's type. Connection errors
 // are raised as CQoException, except in quiet (batch) mode, where the filter
 // stays without connection and reads nothing; errors while moving make the
-// move answer false. The driver's cursor is never held beyond the current
+// move answer false. What was swallowed so is kept in LastError(), so that a
+// batch host can name the reason. A table name must be a name and nothing
+// else (QoCheckSqlName); a statement is the host's SQL as it stands. The driver's cursor is never held beyond the current
 // row: reading keeps memory flat whatever the result's size.
 #pragma once
 
@@ -41,11 +43,21 @@ public:
     virtual void Init(const CQoString& connect) override;
     virtual ~CQoInputFilterODBC();
 
+    // The driver's message of the last failure that Init did not raise (the
+    // connection in quiet mode) or that a move answered with false; empty
+    // after a successful connect.
+    const CQoString& LastError() const { return m_strLastError; }
+    // The connection, e.g. for the driver's identifier quote.
+    CDatabase& GetDatabase() { return m_database; }
+
 protected:
     virtual long CalculateRecordCount() override;
-    virtual void CloseResources() override;
 
 public:
+    // Closes the result and the connection (public as in the base: a host
+    // that reads the table it replaces closes the input before the output
+    // ends).
+    virtual void CloseResources() override;
     // Opens a table by name (tableTable) or runs a statement (tableSql) on
     // the open connection; other types change nothing.
     virtual void InitTable(const char* name, tabletype type, bool countRows) override;
@@ -59,4 +71,5 @@ private:
     CDatabase m_database;
     CQoODBCRecordset* m_pRecordset;
     long m_lRow;     // the row the cursor stands on, 0-based
+    CQoString m_strLastError;
 };

@@ -103,6 +103,11 @@ TEST_P(DbConnectTest, ConnectionIsPreparedForFlatReading) {
   } else {
     EXPECT_EQ(CDatabase::textUtf8, m_db.GetTextForm());
     EXPECT_GE(m_db.GetConnect().Find("StepAPI=1"), 0) << (LPCSTR)m_db.GetConnect();
+    // A host that wants a result held in memory (no read lock while it reads) says so.
+    CDatabase held;
+    held.OpenEx(m_strConnect + ";StepAPI=0");
+    EXPECT_GE(held.GetConnect().Find("StepAPI=0"), 0) << (LPCSTR)held.GetConnect();
+    EXPECT_LT(held.GetConnect().Find("StepAPI=1"), 0) << (LPCSTR)held.GetConnect();
   }
 }
 
