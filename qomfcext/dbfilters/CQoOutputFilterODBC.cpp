@@ -3,6 +3,7 @@
 #include <CQoException.h>
 #include <CQoLog.h>
 
+#include <cstring>
 #include <exception>
 
 #include "CQoODBCRecordset.h"
@@ -54,7 +55,7 @@ CQoString IndexName(const CQoString& table, int number)
 } // namespace
 
 CQoOutputFilterODBC::CQoOutputFilterODBC()
-    : m_pRecordset(NULL), m_bRowFailed(false), m_lRows(0)
+    : m_pRecordset(NULL), m_bRowFailed(false), m_bKeepsNul(false), m_lRows(0)
 {
 }
 
@@ -312,6 +313,10 @@ bool CQoOutputFilterODBC::Init()
         return true;
     }
     m_strNewTable = table;
+    // SQLite keeps text by length; other stores end text at a NUL.
+    CString dbms = m_database.GetDatabaseName();
+    dbms.MakeLower();
+    m_bKeepsNul = dbms.Find("sqlite") >= 0;
 
     try {
         m_pRecordset = new CQoODBCRecordset(&m_database);
@@ -362,7 +367,17 @@ void CQoOutputFilterODBC::Value(int col, const CQoString& value)
         where.Format("Spalte %d", col);
         CQoException::Throw(CQoException::indexError, where);
     }
-    // By length: a NUL inside the value is part of it.
+    // By length: a NUL inside the value is part of it. A store that cannot
+    // hold one (its driver would cut the value there) refuses the value.
+    if (!m_bKeepsNul && std::memchr(value.GetString(), '\0', (std::size_t)value.GetLength()) != nullptr) {
+        CQoString name, text;
+        GetColumnName(col, name);
+        text.Format("Datensatz %ld, Spalte %s: der Wert enth\xE4lt ein NUL-Zeichen, das diese Datenbank nicht "
+                    "speichern kann.", m_lRows + 1, Shown(name).GetString());
+        m_bRowFailed = true;
+        QoDbShowOrRaise(Unchanged(NewFailure(text)), GetShowError());
+        return;
+    }
     m_pRecordset->m_values[col] = CString(value.GetString(), value.GetLength());
 }
 
@@ -371,6 +386,8 @@ bool CQoOutputFilterODBC::WriteRow(CQoString*)
     if (!m_database.IsOpen() || !HasOpenRecordset())
         return false;
     ++m_lRows;
+    if (m_bRowFailed)
+        return false;   // the run is lost already; its report has been given
     try {
         return m_pRecordset->Update() != FALSE;
     } catch (CDBException* e) {

@@ -33,8 +33,9 @@
 // gives them (quoted in the driver's way if they need it: QoQuoteSqlName with
 // GetDatabase().GetIdentifierQuote()), but a name that would be more than a
 // name is refused by Init before anything is sent (see QoCheckSqlName).
-// Values never enter SQL text; they are stored whole, NUL bytes included,
-// where the driver stores them.
+// Values never enter SQL text; they are stored whole, a NUL byte included
+// where the store keeps one (SQLite); elsewhere such a value is refused,
+// naming record and column, rather than cut.
 #pragma once
 
 #include <afxdb.h>
@@ -100,5 +101,6 @@ private:
     CQoODBCRecordset* m_pRecordset;
     CQoString m_strNewTable;   // the table being filled; empty when none
     bool m_bRowFailed;         // a row was refused: the run cannot end well
+    bool m_bKeepsNul;          // the store keeps a NUL inside a text value
     long m_lRows;              // rows handed to WriteRow since Init
 };

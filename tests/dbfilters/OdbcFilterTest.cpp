@@ -526,6 +526,31 @@ TEST(OdbcFiltersSqlite, ANulInsideAValueIsStoredWhole)
     EXPECT_EQ("61620063C3A4\n", ReadFileBytes(folder.Path("hex.txt")));
 }
 
+// PostgreSQL keeps no NUL in text: the value is refused, never cut.
+TEST(OdbcFiltersPostgres, ANulInsideAValueIsRefusedNotCut)
+{
+    Folder folder;
+    std::string connect = Connect(postgres, folder);
+    SKIP_WITHOUT(connect);
+    WriteRows(connect, "mit_nul");
+    std::string error = ErrorOf([&] {
+        CQoOutputFilterODBC out;
+        Prepare(out, connect, "mit_nul");
+        out.Init();
+        Put(out, kRows[0]);
+        CQoString value;
+        value.Assign("ab\0cd", 5);
+        out.InitRow();
+        out.Value(0, value);
+        out.Value(1, "2");
+        out.WriteRow();
+        out.ReleaseDB();
+    });
+    EXPECT_NE(std::string::npos, error.find("Datensatz 2")) << error;
+    EXPECT_NE(std::string::npos, error.find("name")) << error;
+    EXPECT_EQ(kRows, Query(connect, "select * from mit_nul"));
+}
+
 TEST(OdbcFiltersSqlite, FilesThatAreNoDatabaseGiveClearErrorsAndBatchModeReadsNothing)
 {
     Folder folder;

@@ -84,6 +84,10 @@ TEST_P(DbConnectTest, StatementFailuresRaiseAndNoRowsIsNoFailure) {
   CString strError = DbError([&] { m_db.ExecuteSQL("select * from mfcdb_no_such_table"); }, nullptr, &strState);
   EXPECT_GE(strError.Find("mfcdb_no_such_table"), 0) << (LPCSTR)strError;
   EXPECT_FALSE(strState.IsEmpty());
+  // A statement of blanks (a user's empty query) is a failure, not the end of the program.
+  CTextSet blank(&m_db);
+  EXPECT_NE("", DbError([&] { blank.Open(CRecordset::snapshot, " \t ", CRecordset::readOnly); }));
+  EXPECT_FALSE(blank.IsOpen());
   // The connection is still usable after a failed statement.
   EXPECT_EQ(0, Count("mfcdb_noop"));
 }
