@@ -4,6 +4,7 @@
 // UTF-8, SQLite's stored text is UTF-8 too).
 #include "dao_private.h"
 
+#include <charconv>
 #include <errno.h>
 #include <limits.h>
 #include <math.h>
@@ -210,13 +211,13 @@ void Cursor::ExactReal(Value& value) {
   value.bytes.assign((LPCSTR)strText, (size_t)strText.GetLength());
 }
 
+// Shortest form, fixed or with an exponent, whichever is shorter: "0.1",
+// "123456789.12345679", "1e+300". No printf: under Wine it costs more than
+// reading the value.
 CString RoundTripText(double d) {
-  CString str;
-  for (int nDigits = 15; nDigits <= 17; ++nDigits) {
-    str.Format("%.*g", nDigits, d);
-    if (strtod(str, NULL) == d) break;
-  }
-  return str;
+  char sz[64];
+  std::to_chars_result result = std::to_chars(sz, sz + sizeof(sz), d);
+  return CString(sz, (int)(result.ptr - sz));
 }
 
 Value QueryValue(Engine& engine, const CString& strSQL) {
