@@ -4,7 +4,11 @@
 // UTF-8, SQLite's stored text is UTF-8 too).
 #include "dao_private.h"
 
+#include <charconv>
+#include <errno.h>
 #include <limits.h>
+#include <math.h>
+#include <stdlib.h>
 #include <string.h>
 
 namespace qodao {
@@ -13,6 +17,56 @@ Cursor::Cursor(Engine& engine, const CString& strSQL) : m_engine(engine) {
   m_sql = qodb::ToDriver(engine.db.GetTextForm(), strSQL);
   if (m_sql.size() > (size_t)INT_MAX) Throw(3000, "Die SQL-Anweisung ist zu lang.");
   Execute();
+  if (engine.kind == kindSqlite && IsSelect(strSQL)) ReadRealsExactly();
+}
+
+// The SQLite driver hands out a floating-point value only as SQLite's text of
+// it, 15 significant digits, whatever C type is asked for: a workbook's
+// 0.1 + 0.2 would come back as 0.3. So a statement with such columns runs
+// wrapped: each of them yields "R<m> <e>", the value as m * 2^e with whole
+// numbers (exact, and within 2^54), or "T" and the value's own text when it
+// is not a finite, non-zero floating-point value. The columns keep the
+// names and types of the statement itself. A statement the wrapping does not
+// fit (more columns than SQLite takes, a trailing semicolon, a driver
+// without SQLite's math functions) runs as it is.
+void Cursor::ReadRealsExactly() {
+  std::vector<bool> exact(m_columns.size(), false);
+  bool bAny = false;
+  for (size_t i = 0; i < m_columns.size(); ++i) {
+    SWORD nType = m_columns[i].nSqlType;
+    exact[i] = nType == SQL_DOUBLE || nType == SQL_FLOAT || nType == SQL_REAL;
+    bAny = bAny || exact[i];
+  }
+  if (!bAny) return;
+  std::string names, select;
+  for (size_t i = 0; i < m_columns.size(); ++i) {
+    char szName[32];
+    wsprintfA(szName, "qo_c%u", (unsigned)(i + 1));
+    std::string c = szName;
+    names += (i > 0 ? "," : "") + c;
+    select += i > 0 ? ", " : "";
+    if (!exact[i]) {
+      select += c;
+      continue;
+    }
+    // k puts the value's highest bit at 2^53 or 2^54 (log2 may be one off
+    // near a power of two); 2^k is applied in two halves so that neither
+    // overflows for the smallest and largest doubles.
+    std::string k = "(53 - cast(floor(log2(abs(" + c + "))) as integer))";
+    select += "case when typeof(" + c + ") = 'real' and " + c + " <> 0 and " + c + " - " + c + " = 0 then 'R' || cast(" +
+              c + " * pow(2, " + k + " / 2) * pow(2, " + k + " - " + k + " / 2) as integer) || ' ' || (-" + k +
+              ") else 'T' || " + c + " end";
+  }
+  std::string original = m_sql;
+  m_sql = "with qo_rows(" + names + ") as (\n" + original + "\n) select " + select + " from qo_rows";
+  try {
+    Execute();
+    m_exactReal.swap(exact);
+  } catch (CDaoException* e) {
+    e->Delete();
+    m_sql = original;
+    Execute();
+  }
 }
 
 Cursor::~Cursor() { CDatabase::FreeStatement(m_hstmt); }
@@ -28,6 +82,8 @@ void Cursor::Execute() {
     SQLSMALLINT nCols = 0;
     m_engine.db.Check(SQLNumResultCols(m_hstmt, &nCols), m_hstmt, "SQLNumResultCols");
     if (nCols < 0 || nCols > qodb::kMaxColumns) Throw(3000, "Der ODBC-Treiber meldet eine ungültige Spaltenzahl.");
+    if (!m_columns.empty() && (size_t)nCols != m_columns.size())
+      Throw(3000, "Der ODBC-Treiber meldet eine andere Spaltenzahl als zuvor.");
     if (m_columns.empty()) {
       for (SQLSMALLINT i = 1; i <= nCols; ++i) {
         SQLCHAR szName[512] = {0};
@@ -132,6 +188,36 @@ void Cursor::ReadValue(SQLUSMALLINT nColumn, Value& value) {
     CString strText = qodb::Narrow((const WCHAR*)bytes.data(), (int)(bytes.size() / sizeof(WCHAR)));
     value.bytes.assign((LPCSTR)strText, (size_t)strText.GetLength());
   }
+  if (nColumn <= m_exactReal.size() && m_exactReal[nColumn - 1]) ExactReal(value);
+}
+
+// A value of a wrapped floating-point column back in the engine's form.
+void Cursor::ExactReal(Value& value) {
+  if (value.bytes.empty()) return;
+  if (value.bytes[0] == 'T') {
+    value.bytes.erase(0, 1);
+    return;
+  }
+  const char* p = value.bytes.c_str() + 1;
+  char* pEnd = NULL;
+  errno = 0;
+  long long llMantissa = strtoll(p, &pEnd, 10);
+  const char* pExponent = pEnd;
+  long lExponent = strtol(pExponent, &pEnd, 10);
+  if (value.bytes[0] != 'R' || errno != 0 || pExponent == p || *pEnd != '\0' || llabs(llMantissa) > (1LL << 55) ||
+      lExponent < -1200 || lExponent > 1100)
+    Throw(3000, "Der ODBC-Treiber hat eine Zahl in unerwarteter Form geliefert.");
+  CString strText = RoundTripText(ldexp((double)llMantissa, (int)lExponent));
+  value.bytes.assign((LPCSTR)strText, (size_t)strText.GetLength());
+}
+
+// Shortest form, fixed or with an exponent, whichever is shorter: "0.1",
+// "123456789.12345679", "1e+300". No printf: under Wine it costs more than
+// reading the value.
+CString RoundTripText(double d) {
+  char sz[64];
+  std::to_chars_result result = std::to_chars(sz, sz + sizeof(sz), d);
+  return CString(sz, (int)(result.ptr - sz));
 }
 
 Value QueryValue(Engine& engine, const CString& strSQL) {

@@ -205,8 +205,13 @@ public:
 
 private:
   void Execute();
+  void ReadRealsExactly();
+  void ExactReal(Value& value);
   void ReadValue(SQLUSMALLINT nColumn, Value& value);
   bool m_bRowRead = false;
+  // Floating-point columns are read through an exact form of the value (see
+  // ReadRealsExactly); these say which ones.
+  std::vector<bool> m_exactReal;
 
   Engine& m_engine;
   std::string m_sql;
@@ -216,6 +221,9 @@ private:
   long m_lRow = -1;
   bool m_bAtEnd = false;
 };
+
+// The shortest decimal text that reads back as the same double.
+CString RoundTripText(double d);
 
 // One value of the first row of a query (NULL when none).
 Value QueryValue(Engine& engine, const CString& strSQL);

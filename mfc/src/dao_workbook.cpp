@@ -6,6 +6,7 @@
 
 #include <limits.h>
 #include <algorithm>
+#include <cmath>
 #include <stdio.h>
 #include <stdlib.h>
 
@@ -20,14 +21,7 @@ struct ColumnKind {
 
 // The shortest text that reads back as the same double (Excel keeps the
 // full value; 15 digits would change one in ten thousand of them).
-CString NumberText(double d) {
-  CString str;
-  for (int nDigits = 15; nDigits <= 17; ++nDigits) {
-    str.Format("%.*g", nDigits, d);
-    if (strtod(str, NULL) == d) break;
-  }
-  return str;
-}
+CString NumberText(double d) { return qodao::RoundTripText(d); }
 
 // Excel counts 29 February 1900, a day that never was (serial 60): serials
 // 1 to 59 are one day later on the calendar than an OLE date of the same
@@ -69,6 +63,20 @@ qodao::Value CellValue(short nFieldType, int nType, double dValue, const CString
   return value;
 }
 
+// The longest text a cell may hold: what the engine's cursor reads back as
+// one value (UTF-16, one unit for each Windows-1252 character). A longer one
+// would be stored but arrive as no value at all, so its sheet is refused
+// with the cell named instead.
+const size_t kMaxCellText = (size_t)(qodb::kMaxValueBytes / (SQLLEN)sizeof(WCHAR));
+
+[[noreturn]] void RefuseLongCell(const CString& strTable, long lRow, const CString& strField, const CString& strText) {
+  CString strError;
+  strError.Format("Das Blatt '%s' hat in Zeile %ld, Spalte '%s' einen Text von %d Zeichen; gelesen werden höchstens "
+                  "%lu Zeichen in einer Zelle.",
+                  (LPCSTR)strTable, lRow, (LPCSTR)strField, strText.GetLength(), (unsigned long)kMaxCellText);
+  qodao::Throw(3163, strError);
+}
+
 void ImportSheet(qodao::Engine& engine, CDaoWorkbookReader& reader, int nSheet) {
   using namespace qodao;
   CString strTable = reader.GetSheetName(nSheet) + "$";
@@ -102,7 +110,7 @@ void ImportSheet(qodao::Engine& engine, CDaoWorkbookReader& reader, int nSheet) 
       for (int n = 2; taken(strName); ++n) strName.Format("F%d_%d", c + 1, n);
       names.push_back(strName);
     }
-    while (reader.NextRow()) {
+    for (long lRow = 2; reader.NextRow(); ++lRow) {
       for (int c = 0; c < nColumns; ++c) {
         reader.GetCell(c, nType, dValue, strText);
         ColumnKind& kind = kinds[(size_t)c];
@@ -113,6 +121,7 @@ void ImportSheet(qodao::Engine& engine, CDaoWorkbookReader& reader, int nSheet) 
         case CDaoWorkbookReader::cellText:
           kind.bText = true;
           if ((size_t)strText.GetLength() > kind.nLongestText) kind.nLongestText = (size_t)strText.GetLength();
+          if ((size_t)strText.GetLength() > kMaxCellText) RefuseLongCell(strTable, lRow, names[(size_t)c], strText);
           break;
         default: break;
         }
@@ -148,6 +157,7 @@ void ImportSheet(qodao::Engine& engine, CDaoWorkbookReader& reader, int nSheet) 
                     "SQLPrepare");
     std::vector<std::string> data(names.size());
     std::vector<SQLLEN> lengths(names.size());
+    std::vector<double> numbers(names.size());
     reader.RewindSheet();
     reader.NextRow();   // the names
     engine.db.BeginTrans();
@@ -155,6 +165,16 @@ void ImportSheet(qodao::Engine& engine, CDaoWorkbookReader& reader, int nSheet) 
       while (reader.NextRow()) {
         for (size_t c = 0; c < names.size(); ++c) {
           reader.GetCell((int)c, nType, dValue, strText);
+          if (types[c] == dbDouble && nType == CDaoWorkbookReader::cellNumber && std::isfinite(dValue)) {
+            // As the double itself: the driver would read a number's text
+            // into SQLite's REAL with its own, less exact conversion.
+            numbers[c] = dValue;
+            lengths[c] = (SQLLEN)sizeof(double);
+            engine.db.Check(SQLBindParameter(stmt.get(), (SQLUSMALLINT)(c + 1), SQL_PARAM_INPUT, SQL_C_DOUBLE,
+                                             SQL_DOUBLE, 0, 0, &numbers[c], 0, &lengths[c]),
+                            stmt.get(), "SQLBindParameter");
+            continue;
+          }
           Value value = CellValue(types[c], nType, dValue, strText);
           data[c] = value.bNull ? std::string() : qodb::ToDriver(nTextForm, value.bytes.c_str(), (int)value.bytes.size());
           lengths[c] = value.bNull ? SQL_NULL_DATA : (SQLLEN)data[c].size();

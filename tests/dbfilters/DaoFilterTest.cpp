@@ -358,6 +358,65 @@ open(os.path.join(folder, 'alt.xls'), 'wb').write(b'\xd0\xcf\x11\xe0\xa1\xb1\x1a
     EXPECT_FALSE(old.FirstRow());
 }
 
+// A cell longer than Excel takes and numbers that 15 digits do not tell
+// apart reach the conversion whole, in a column of numbers and in one of
+// mixed kinds; a cell longer than the engine reads back as one value (32 Mi
+// characters) makes its sheet fail naming the cell, never an empty value.
+// openpyxl writes 16 digits and cuts text at 32,767 characters, so the
+// sheets are patched.
+TEST(DaoFilters, WorkbookCellsArriveWithEveryCharacterAndDigitOrAreRefused)
+{
+    PeerFolder folder;
+    if (!folder.Usable() || !RunPython(folder, "write", R"PY(
+import openpyxl, zipfile
+wb = openpyxl.Workbook()
+ws = wb.active
+ws.title = 'Daten'
+ws.append(['Text', 'Zahl', 'Gemischt'])
+ws.append(['LANG', 1001, 1002])
+ws.append(['kurz', 1003, 'x'])
+huge = wb.create_sheet('Riesig')
+huge.append(['Nr', 'Inhalt'])
+huge.append([1, 'kurz'])
+huge.append([2, 'RIESIG'])
+wb.save(os.path.join(folder, 'tmp.xlsx'))
+exact = {1001: 0.1 + 0.2, 1002: 123456789.12345679, 1003: 1 / 3}
+with zipfile.ZipFile(os.path.join(folder, 'tmp.xlsx')) as src, \
+     zipfile.ZipFile(os.path.join(folder, 'lang.xlsx'), 'w', zipfile.ZIP_DEFLATED) as dst:
+    for item in src.infolist():
+        data = src.read(item.filename)
+        data = data.replace(b'>LANG<', b'>' + b''.join(b'%05d;' % i for i in range(6666)) + b'Ende<')
+        data = data.replace(b'>RIESIG<', b'>' + b''.join(b'%07d;' % i for i in range(4194305)) + b'<')
+        for k, v in exact.items():
+            data = data.replace(b'<v>%d</v>' % k, b'<v>%s</v>' % repr(v).encode())
+        dst.writestr(item, data)
+)PY"))
+        PEER_UNAVAILABLE();
+    CQoInputFilterDao in(CQoFile::typeExcel);
+    in.SetTableName("Daten$");
+    in.SetTableType(CQoInputFilterDB::tableTable);
+    in.Init(folder.Path("lang.xlsx").c_str());
+    ASSERT_TRUE(in.FirstRow());
+    CQoString text;
+    in.Value(0, text);
+    EXPECT_EQ(40000, text.GetLength());
+    EXPECT_EQ(std::string("06665;Ende"), std::string(text.GetString()).substr(text.GetLength() - 10));
+    in.Value(1, text);
+    EXPECT_EQ(0.1 + 0.2, strtod(text.GetString(), nullptr)) << text.GetString();
+    in.Value(2, text);
+    EXPECT_EQ(123456789.12345679, strtod(text.GetString(), nullptr)) << text.GetString();
+    ASSERT_TRUE(in.NextRow());
+    in.Value(0, text);
+    EXPECT_EQ(std::string("kurz"), text.GetString());
+    in.Value(1, text);
+    EXPECT_EQ(1.0 / 3, strtod(text.GetString(), nullptr)) << text.GetString();
+
+    // 4,194,305 entries of 8 characters: one more than 32 Mi characters.
+    std::string error = ErrorOf([&] { in.InitTable("Riesig$", CQoInputFilterDB::tableTable, true); });
+    for (const char* part : {"Riesig$", "Zeile 3", "Inhalt", "33554440"})
+        EXPECT_NE(std::string::npos, error.find(part)) << error;
+}
+
 namespace {
 
 // A run of the output filter over table T that fails or is given up somewhere.

@@ -8,6 +8,10 @@
 #include "CQoXlsxReader.h"
 #include "PythonPeer.h"
 
+#include <algorithm>
+#include <fstream>
+#include <functional>
+
 namespace {
 
 // What a program does to let the engine read workbooks: CQoException becomes
@@ -187,4 +191,78 @@ TEST(DaoWorkbookTest, EveryReadableSheetWithExactValuesAndNoStaleCopies) {
     table.Open("Breit$");
   });
   EXPECT_EQ(3190, failure.lCode);
+}
+
+namespace {
+// Numbers Excel keeps but 15 digits do not tell apart, in a column of numbers
+// and in one of mixed kinds (text). openpyxl writes numbers with 16 digits,
+// so its sheet is patched.
+const char kWriteExactWorkbook[] = R"PY(
+import openpyxl, zipfile
+values = [0.1 + 0.2, 1 / 3, 123456789.12345679, 9007199254740993.0, -1.7435332921043034e-297,
+          1.2345678901234567e300, 2.2250738585072014e-308, 0.0, -2.5]
+wb = openpyxl.Workbook()
+ws = wb.active
+ws.title = 'Zahlen'
+ws.append(['Zahl', 'Gemischt'])
+for i in range(len(values)):
+    ws.append([1000 + i, 2000 + i])
+ws.append([None, 'Text'])
+wb.save(os.path.join(folder, 'tmp.xlsx'))
+with zipfile.ZipFile(os.path.join(folder, 'tmp.xlsx')) as src, \
+     zipfile.ZipFile(os.path.join(folder, 'genau.xlsx'), 'w', zipfile.ZIP_DEFLATED) as dst:
+    for item in src.infolist():
+        data = src.read(item.filename)
+        for i, v in enumerate(values):
+            for base in (1000, 2000):
+                data = data.replace(b'<v>%d</v>' % (base + i), b'<v>%s</v>' % repr(v).encode())
+        dst.writestr(item, data)
+open(os.path.join(folder, 'values.txt'), 'w').write('\n'.join(repr(v) for v in values))
+)PY";
+
+void ReadExactWorkbook(CDaoDatabase& db, const std::vector<double>& values) {
+  CDaoRecordset rs(&db);
+  rs.Open(dbOpenTable, "Zahlen$");
+  for (size_t i = 0; i < values.size(); ++i, rs.MoveNext()) {
+    ASSERT_FALSE(rs.IsEOF());
+    COleVariant number = rs.GetFieldValue("Zahl");
+    ASSERT_EQ(VT_R8, number.vt) << i;
+    EXPECT_EQ(values[i], number.dblVal) << i;
+    CString strMixed = TextOf(rs.GetFieldValue("Gemischt"));
+    EXPECT_EQ(values[i], strtod(strMixed, NULL)) << i << ": " << (LPCSTR)strMixed;
+  }
+  rs.Close();
+  std::vector<double> sorted(values);
+  std::sort(sorted.begin(), sorted.end(), std::greater<double>());
+  CDaoRecordset query(&db);
+  query.Open(dbOpenDynaset, "select Zahl from [Zahlen$] where Zahl is not null order by Zahl desc");
+  for (size_t i = 0; i < sorted.size(); ++i, query.MoveNext()) {
+    ASSERT_FALSE(query.IsEOF());
+    EXPECT_EQ(sorted[i], query.GetFieldValue(0).dblVal) << i;
+  }
+  EXPECT_TRUE(query.IsEOF());
+}
+} // namespace
+
+// Every digit of a number arrives, whether its column holds numbers only
+// (read as doubles, also through SQL that sorts them) or mixed kinds (read as
+// text).
+TEST(DaoWorkbookTest, NumbersKeepEveryDigit) {
+  PeerFolder folder;
+  if (!folder.Usable() || !RunPython(folder, "exact", kWriteExactWorkbook)) PEER_UNAVAILABLE();
+  std::vector<double> values;
+  {
+    std::ifstream in(folder.Path("values.txt"));
+    for (std::string line; std::getline(in, line);) values.push_back(strtod(line.c_str(), NULL));
+  }
+  ASSERT_EQ(9u, values.size());
+  struct Registration {
+    Registration() { AfxDaoRegisterWorkbookReader(MakeXlsxSource); }
+    ~Registration() { AfxDaoRegisterWorkbookReader(NULL); }
+  } registration;
+  CDaoDatabase db;
+  DaoFailure failure = DaoError([&] { db.Open(folder.Path("genau.xlsx").c_str(), FALSE, TRUE, "Excel 8.0;"); });
+  ASSERT_EQ(0, failure.lCode) << (LPCSTR)failure.strDescription;
+  failure = DaoError([&] { ReadExactWorkbook(db, values); });
+  EXPECT_EQ(0, failure.lCode) << (LPCSTR)failure.strDescription;
 }
