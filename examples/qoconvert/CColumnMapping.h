@@ -69,6 +69,9 @@ public:
     const CMultiColumnHandler& Handler() const { return m_handler; }
     // The number of the input's columns at the last Build.
     int NumInputColumns() const { return m_nInputColumns; }
+    // After Build: one text for each written column that the project
+    // composes of an input column the input does not have (it stays empty).
+    std::vector<CQoString> MissingSources() const;
 
     // The function of each output column, as the combination page holds it:
     // a single input column's function, or the combination whose parts the
@@ -100,4 +103,7 @@ private:
     bool m_bComposition;      // the handler holds a stored or edited composition
     bool m_bSelectionPending; // m_selection waits for the next Build
     CColumnView::Selection m_selection;
+    // The stored composition's inner columns that name their input column:
+    // (inner column id, input column).
+    std::vector<std::pair<int, int>> m_sources;
 };

@@ -15,6 +15,7 @@
 #include <CQoOutputFilterODBC.h>
 #include <CQoOutputFilterTextFix.h>
 #include <CQoOutputFilterTextVar.h>
+#include <QoSqlName.h>
 
 #include "CInputRecords.h"
 
@@ -79,7 +80,7 @@ private:
 };
 
 CConversion::CConversion()
-    : m_bSkipDefective(false), m_pProgress(nullptr), m_lSkipped(0)
+    : m_bSkipDefective(false), m_pProgress(nullptr), m_lSkipped(0), m_bInputFromMemory(false)
 {
     Clear();
 }
@@ -98,6 +99,8 @@ void CConversion::Clear()
     m_outputTable.Empty();
     m_inputDatabase.Empty();
     m_outputDatabase.Empty();
+    m_inputPassword.Empty();
+    m_outputPassword.Empty();
     m_outputFormat = formatDelimited;
     m_filterSettings.Clear();
     m_bFilters = false;
@@ -117,6 +120,10 @@ void CConversion::ReadConfig(CQoConfigFile& config)
     config.GetValue(kOutput, "Tabelle", m_outputTable);
     config.GetValue(kInput, "Datenbank", m_inputDatabase);
     config.GetValue(kOutput, "Datenbank", m_outputDatabase);
+    config.GetValue(kInput, "Passwort", m_inputPassword);
+    config.GetValue(kOutput, "Passwort", m_outputPassword);
+    // A statement of blanks only is no statement.
+    m_inputSql.Trim();
     ReadFormat(config, kInput, inputDbase,
                "0 Trennzeichen, 1 feste Satzl\xE4nge, 2 feste Spalten, 3 dBase", m_inputFormat);
     ReadFormat(config, kOutput, formatDbase, "0 Trennzeichen, 1 feste L\xE4nge, 2 dBase", m_outputFormat);
@@ -187,6 +194,8 @@ void CConversion::WriteConfig(CQoConfigFile& config) const
     Store(config, kOutput, "Datenbank", m_outputDatabase);
     Store(config, kOutput, "ODBC", m_outputConnect);
     Store(config, kOutput, "Tabelle", m_outputTable);
+    Store(config, kInput, "Passwort", m_inputPassword);
+    Store(config, kOutput, "Passwort", m_outputPassword);
     if (m_bFilters) {
         config.SetValue(kInput, "Format", m_inputFormat);
         config.SetValue(kOutput, "Format", m_outputFormat);
@@ -266,30 +275,133 @@ CQoString CConversion::InFolder(const CQoString& folder, const CQoString& file)
 }
 
 namespace {
-// The value of Database= or DBQ= in a connect string, made absolute against
-// the project folder like the file names.
+// One key=value part of a connect string: as written, and its key and value
+// (a value in braces may hold ';').
+struct ConnectPart {
+    CQoString text;   // as written; rebuilt from key and value when one changes
+    CQoString key;    // trimmed
+    CQoString value;
+};
+
+std::vector<ConnectPart> SplitConnect(const CQoString& connect)
+{
+    std::vector<ConnectPart> parts;
+    const char* p = connect.GetString();
+    const char* const end = p + connect.GetLength();
+    while (p < end) {
+        const char* start = p;
+        bool braced = false;
+        while (p < end && (braced || *p != ';')) {
+            if (*p == '{')
+                braced = true;
+            else if (*p == '}')
+                braced = false;
+            ++p;
+        }
+        ConnectPart part;
+        part.text = CQoString(start, static_cast<int>(p - start));
+        if (p < end)
+            ++p;   // the ';'
+        int equals = part.text.Find('=');
+        if (equals >= 0) {
+            part.key = part.text.Left(equals);
+            part.key.Trim();
+            part.value = part.text.Mid(equals + 1);
+        }
+        parts.push_back(part);
+    }
+    return parts;
+}
+
+CQoString JoinConnect(const std::vector<ConnectPart>& parts)
+{
+    CQoString text;
+    for (size_t i = 0; i < parts.size(); ++i) {
+        if (i > 0)
+            text += ";";
+        text += parts[i].text;
+    }
+    return text;
+}
+
+void SetPart(ConnectPart& part, const CQoString& value)
+{
+    part.value = value;
+    part.text = part.key + "=" + value;
+}
+
+// The value of `key` (without braces), empty when the string has none.
+CQoString ConnectValue(const CQoString& connect, const char* key)
+{
+    for (const ConnectPart& part : SplitConnect(connect)) {
+        if (_stricmp(part.key, key) != 0)
+            continue;
+        CQoString value = part.value;
+        value.Trim();
+        if (value.GetLength() >= 2 && value.GetAt(0) == '{' && value.GetAt(value.GetLength() - 1) == '}')
+            value = value.Mid(1, value.GetLength() - 2);
+        return value;
+    }
+    return CQoString();
+}
+
+// Drivers whose Database= names a file (the others name a database of a server).
+bool IsFileDriver(const CQoString& connect)
+{
+    CQoString driver = ConnectValue(connect, "Driver");
+    driver.MakeLower();
+    static const char* const kFileDrivers[] = {"sqlite", "mdb", "access", "excel", "dbase", "text", "paradox"};
+    for (const char* kind : kFileDrivers)
+        if (driver.Find(kind) >= 0)
+            return true;
+    return false;
+}
+
+// The SQLite file a connect string names, empty for any other source.
+CQoString SqliteFile(const CQoString& connect)
+{
+    CQoString driver = ConnectValue(connect, "Driver");
+    driver.MakeLower();
+    return driver.Find("sqlite") >= 0 ? ConnectValue(connect, "Database") : CQoString();
+}
+
+// The connect string with `key` set to `value` (replaced when present).
+CQoString WithKey(const CQoString& connect, const char* key, const char* value)
+{
+    std::vector<ConnectPart> parts = SplitConnect(connect);
+    bool found = false;
+    for (ConnectPart& part : parts)
+        if (_stricmp(part.key, key) == 0) {
+            SetPart(part, value);
+            found = true;
+        }
+    if (!found) {
+        ConnectPart part;
+        part.key = key;
+        SetPart(part, value);
+        parts.push_back(part);
+    }
+    return JoinConnect(parts);
+}
+
+// A file database's file named in DBQ= (always a file) or, for drivers of
+// files, in Database=, made absolute against the project folder like the
+// file names; a server's database name stays as it is.
 CQoString ConnectInFolder(const CQoString& folder, const CQoString& connect)
 {
-    CQoString result;
-    int start = 0;
-    while (start <= connect.GetLength()) {
-        int end = connect.Find(';', start);
-        if (end < 0)
-            end = connect.GetLength();
-        CQoString part = connect.Mid(start, end - start);
-        int equals = part.Find('=');
-        if (equals > 0) {
-            CQoString key = part.Left(equals);
-            key.Trim();
-            if (_stricmp(key, "Database") == 0 || _stricmp(key, "DBQ") == 0)
-                part = part.Left(equals + 1) + CConversion::InFolder(folder, part.Mid(equals + 1));
+    if (folder.IsEmpty())
+        return connect;
+    std::vector<ConnectPart> parts = SplitConnect(connect);
+    const bool fileDriver = IsFileDriver(connect);
+    for (ConnectPart& part : parts) {
+        if (_stricmp(part.key, "DBQ") == 0 || (fileDriver && _stricmp(part.key, "Database") == 0)) {
+            CQoString value = part.value;
+            value.Trim();
+            if (!value.IsEmpty() && value.GetAt(0) != '{')
+                SetPart(part, CConversion::InFolder(folder, value));
         }
-        if (!result.IsEmpty() || start > 0)
-            result += ";";
-        result += part;
-        start = end + 1;
     }
-    return result;
+    return JoinConnect(parts);
 }
 }
 
@@ -319,16 +431,49 @@ long CConversion::Run()
 }
 
 namespace {
-// A column name as SQL takes it whatever it holds: in double quotes.
-CQoString Quoted(const CQoString& name)
+[[noreturn]] void RefuseName(const char* what, const CQoString& name, const CQoString& problem)
 {
-    CQoString quoted = "\"";
-    for (int i = 0; i < name.GetLength(); ++i) {
-        quoted += CQoString(name.GetString() + i, 1);
-        if (name.GetAt(i) == '"')
-            quoted += "\"";
+    CQoString text;
+    text.Format("%s '%s' kann nicht in SQL stehen: %s", what, name.GetString(), problem.GetString());
+    CQoException::Throw(text, what);
+}
+
+// A table or column name as the driver takes it: a name the user quoted
+// already (", [ or `) must be one clean name as it stands; any other is put
+// in the driver's identifier quote whole, so that no name can end a
+// statement or start another.
+CQoString SqlName(const CQoString& name, const CString& quote, const char* what)
+{
+    CQoString problem;
+    if (name.IsEmpty()) {
+        problem = "der Name ist leer";
+        RefuseName(what, name, problem);
     }
-    return quoted + "\"";
+    for (int i = 0; i < name.GetLength(); ++i)
+        if (static_cast<unsigned char>(name.GetAt(i)) < 0x20) {
+            problem = "er enth\xE4lt ein Steuerzeichen";
+            RefuseName(what, name, problem);
+        }
+    const bool quoted = strchr("\"[`", name.GetAt(0)) != nullptr;
+    if (quoted || quote.IsEmpty()) {
+        if (!QoCheckSqlName(name, problem))
+            RefuseName(what, name, problem);
+        return name;
+    }
+    return QoQuoteSqlName(name, quote);
+}
+
+// A table name of an Access-type database: brackets are Access's way of
+// quoting a name in SQL, not part of it.
+CQoString AccessName(const CQoString& name)
+{
+    CQoString text = name;
+    text.Trim();
+    if (text.GetLength() >= 2 && text.GetAt(0) == '[' && text.GetAt(text.GetLength() - 1) == ']') {
+        text = text.Mid(1, text.GetLength() - 2);
+        text.Replace("]]", "]");
+    }
+    return text;
 }
 }
 
@@ -352,13 +497,14 @@ CQoInputFilter* CConversion::MakeInputFilter(bool run) const
         bool excel = _stricmp(m_inputDatabase.Right(5), ".xlsx") == 0;
         CQoInputFilterDao* dao = new CQoInputFilterDao(excel ? CQoFile::typeExcel : CQoFile::typeAccess);
         filter.reset(dao);
+        dao->Password(m_inputPassword);
         // A project names its table with its keys; the page's pick comes back
         // through TakeInputSettings.
         if (!m_inputSql.IsEmpty()) {
             dao->SetTableName(m_inputSql);
             dao->SetTableType(CQoInputFilterDB::tableSql);
         } else if (!m_inputTable.IsEmpty()) {
-            dao->SetTableName(m_inputTable);
+            dao->SetTableName(AccessName(m_inputTable));
             dao->SetTableType(CQoInputFilterDB::tableTable);
         }
         return filter.release();
@@ -400,17 +546,39 @@ void CConversion::OpenInputFilter(CQoInputFilter& filter, const CQoString& folde
         CQoString table = odbc.GetTableName();
         CQoInputFilterDB::tabletype type = odbc.GetTableType();
         odbc.SetTableName(CQoString());
-        odbc.Init(ConnectInFolder(folder, m_inputConnect));
+        CQoString connect = ConnectInFolder(folder, m_inputConnect);
+        // The SQLite driver answers from memory when it does not step: the
+        // file is then not locked while the output writes into it.
+        if (m_bInputFromMemory)
+            connect = WithKey(connect, "StepAPI", "0");
+        odbc.Init(connect);
+        if (!odbc.GetDatabase().IsOpen()) {
+            CQoString text;
+            text.Format("Die ODBC-Eingabe kann nicht verbunden werden: %s", odbc.LastError().GetString());
+            CQoException::Throw(text, "ODBC");
+        }
         odbc.SetTableName(table);
-        if (!table.IsEmpty())
-            odbc.InitTable(table, type, numbered);
+        if (!table.IsEmpty()) {
+            if (type == CQoInputFilterDB::tableTable) {
+                odbc.InitTable(SqlName(table, odbc.GetDatabase().GetIdentifierQuote(), "Die Eingabetabelle"), type,
+                               numbered);
+                odbc.SetTableName(table);   // the project keeps the name as the user wrote it
+            } else {
+                odbc.InitTable(table, type, numbered);
+            }
+        }
         break;
     }
     case inputDatabase: {
         CQoInputFilterDao& dao = static_cast<CQoInputFilterDao&>(filter);
-        dao.Init(InFolder(folder, m_inputDatabase));
-        if (!dao.GetDatabase().IsOpen())
-            CQoException::Throw("Die Datenbank ist nicht ge\xF6" "ffnet.", m_inputDatabase);
+        CQoString name = InFolder(folder, m_inputDatabase);
+        dao.Init(name);
+        if (!dao.GetDatabase().IsOpen()) {
+            CQoString text;
+            text.Format("Die Datenbank '%s' ist nicht ge\xF6" "ffnet: %s", name.GetString(),
+                        dao.LastError().IsEmpty() ? "die Passworteingabe wurde abgebrochen" : dao.LastError().GetString());
+            CQoException::Throw(text, m_inputDatabase);
+        }
         break;
     }
     default:
@@ -465,9 +633,10 @@ CQoOutputFilter* CConversion::NewOutputFilter() const
     case outputDatabase: {
         CQoOutputFilterDao* dao = new CQoOutputFilterDao;
         filter.reset(dao);
+        dao->Password(m_outputPassword);
         if (stored)
             dao->ReadConfig(settings, kOutputFilter);
-        dao->SetTableName(m_outputTable);
+        dao->SetTableName(AccessName(m_outputTable));
         return filter.release();
     }
     case formatDbase:
@@ -550,18 +719,33 @@ CQoOutputFilter* CConversion::NewOutput(CQoOutputSource& source, CQoFile& file, 
     FitOutputColumns(*output, source);
     switch (OutputKind()) {
     case outputOdbc: {
-        // Any column name is taken by SQL in double quotes.
+        CQoOutputFilterODBC* odbc = static_cast<CQoOutputFilterODBC*>(output.get());
+        odbc->UseDB(m_outputConnect);
+        // Every name in the connected driver's quote: a column name read
+        // from a file's first line, or a table name of a project, is a name
+        // and nothing else.
+        const CString quote = odbc->GetDatabase().GetIdentifierQuote();
+        odbc->SetTableName(SqlName(m_outputTable, quote, "Die Ausgabetabelle"));
         CQoString name;
         for (int c = 0; c < output->NumCols(); ++c) {
             output->GetColumnName(c, name);
-            output->ColumnName(c, Quoted(name));
+            output->ColumnName(c, SqlName(name, quote, "Die Ausgabespalte"));
         }
-        static_cast<CQoOutputFilterODBC*>(output.get())->UseDB(m_outputConnect);
         return output.release();
     }
-    case outputDatabase:
-        static_cast<CQoOutputFilterDao*>(output.get())->UseDB(m_outputDatabase);
+    case outputDatabase: {
+        CQoOutputFilterDao* dao = static_cast<CQoOutputFilterDao*>(output.get());
+        dao->UseDB(m_outputDatabase);
+        // An open refused (a password missing or wrong, the prompt cancelled)
+        // leaves the database closed with the reason.
+        if (!dao->LastError().IsEmpty()) {
+            CQoString text;
+            text.Format("Die Datenbank '%s' ist nicht ge\xF6" "ffnet: %s", m_outputDatabase.GetString(),
+                        dao->LastError().GetString());
+            CQoException::Throw(text, m_outputDatabase);
+        }
         return output.release();
+    }
     default:
         temp = OpenOutputBeside(file, CQoFile::binary);
         output->UseFile(&file, true);
@@ -569,14 +753,69 @@ CQoOutputFilter* CConversion::NewOutput(CQoOutputSource& source, CQoFile& file, 
     }
 }
 
+namespace {
+// A table's rows go into a new table that takes the old one's place only at
+// the end (ReleaseDB, ReleaseFile); Discard leaves the old table as it was.
+void FinishOutput(CQoOutputFilter& output)
+{
+    if (CQoOutputFilterODBC* odbc = dynamic_cast<CQoOutputFilterODBC*>(&output))
+        odbc->ReleaseDB();
+    else
+        output.ReleaseFile();   // a table of a file database, or a file: closing stores what is queued
+}
+
+void DiscardOutput(CQoOutputFilter& output)
+{
+    if (CQoOutputFilterODBC* odbc = dynamic_cast<CQoOutputFilterODBC*>(&output))
+        odbc->Discard();
+    else if (CQoOutputFilterDao* dao = dynamic_cast<CQoOutputFilterDao*>(&output))
+        dao->Discard();
+}
+}
+
+CQoString CConversion::InputSqliteFile() const
+{
+    if (!m_inputConnect.IsEmpty())
+        return SqliteFile(m_inputConnect);
+    return m_inputDatabase;
+}
+
+CQoString CConversion::OutputSqliteFile() const
+{
+    if (!m_outputConnect.IsEmpty())
+        return SqliteFile(m_outputConnect);
+    return m_outputDatabase;   // a file database is written as an SQLite file
+}
+
+void CConversion::CheckSameDatabase()
+{
+    // The output fills a new table while the input reads; the old table is
+    // replaced only after the input has let go of it, so one table can be
+    // read and replaced in one run. SQLite locks the whole file, though: a
+    // reader that steps through its rows keeps a writer from committing.
+    m_bInputFromMemory = false;
+    const CQoString in = InputSqliteFile();
+    const CQoString out = OutputSqliteFile();
+    if (in.IsEmpty() || out.IsEmpty() || !CQoFile::SameFile(in, out))
+        return;
+    if (!m_inputConnect.IsEmpty()) {
+        m_bInputFromMemory = true;   // the driver reads the whole result at once
+        _theLog << "Eingabe und Ausgabe liegen in derselben Datenbankdatei; die Eingabe wird vorab ganz gelesen"
+                << CQoLog::endl;
+        return;
+    }
+    CQoString text;
+    text.Format("Eingabe und Ausgabe liegen in derselben Datenbankdatei '%s'. Als Datei-Datenbank kann sie nicht "
+                "zugleich gelesen und geschrieben werden; lesen Sie die Eingabe \xFC" "ber ODBC "
+                "(ODBC=Driver=SQLite3;Database=...).",
+                out.GetString());
+    CQoException::Throw(text, "CConversion::Run");
+}
+
 long CConversion::RunRecords()
 {
-    // The output table is replaced before the input is read: the same table
-    // of the same database would be emptied before it is read.
-    if (!m_inputDatabase.IsEmpty() && !m_outputDatabase.IsEmpty()
-        && CQoFile::SameFile(m_inputDatabase, m_outputDatabase) && m_inputSql.IsEmpty()
-        && _stricmp(m_inputTable, m_outputTable) == 0)
-        CQoException::Throw("Die Ausgabetabelle ist die Eingabetabelle; sie w\xFCrde geleert.", m_outputTable);
+    // Refused or arranged before anything is read or written.
+    CheckSameDatabase();
 
     m_lSkipped = 0;
     std::unique_ptr<CQoInputFilter> input(NewInput());
@@ -590,6 +829,8 @@ long CConversion::RunRecords()
     records.FreezeView();
     // The output columns: composed of the input's, chosen and ordered.
     m_columns.Build(records);
+    for (const CQoString& missing : m_columns.MissingSources())
+        _theLog << "W: " << missing.GetString() << CQoLog::endl;
     CColumnView& view = m_columns.View();
     int const columns = view.GetNumColumns();
     if (columns == 0)
@@ -621,13 +862,15 @@ long CConversion::RunRecords()
         }
         if (logged != nullptr)
             logged->Flush();
-        if (OutputIsDatabase() && m_outputDatabase.IsEmpty())
-            static_cast<CQoOutputFilterODBC*>(output.get())->ReleaseDB();
-        else
-            output->ReleaseFile();   // a table: closing it stores what is queued
+        // The input lets go of its table before the output's new table
+        // takes the old one's place (it may be the same table).
+        if (CQoInputFilterDB* table = dynamic_cast<CQoInputFilterDB*>(input.get()))
+            table->CloseResources();
+        FinishOutput(*output);
     } catch (...) {
         if (logged != nullptr)
             logged->Flush();
+        DiscardOutput(*output);
         if (!temp.empty()) {
             try {
                 output->ReleaseFile();

@@ -119,8 +119,9 @@ public:
 
     // Converts every record; returns the number of records written. Raises
     // CQoException when a file cannot be opened, read or written, or when
-    // the output is the input. The target is replaced only by a complete
-    // output.
+    // the output is the input. The target (a file, or a table) is replaced
+    // only by a complete output: a cancelled or failed run leaves it as it
+    // was.
     //
     // Defective records of a delimited input go to the record-repair hook
     // (CQoInterActive) and each leaves a line in the log with the answer.
@@ -147,6 +148,10 @@ public:
     // File databases (empty: none).
     CQoString m_inputDatabase;
     CQoString m_outputDatabase;
+    // Passwords of file databases ("Passwort" in [Eingabe] and [Ausgabe];
+    // kept in the project as written: the project file is the user's).
+    CQoString m_inputPassword;
+    CQoString m_outputPassword;
     int m_outputFormat;
 
     // The output columns; the window builds them over its preview's records,
@@ -174,6 +179,11 @@ private:
     // input) and answers its name; PutOutputInPlace makes it the output.
     std::string OpenOutputBeside(CQoFile& file, int mode);
     void PutOutputInPlace(const std::string& temp);
+    // Input and output in one database: refused, or arranged so that the
+    // input's reading does not keep the output from storing.
+    void CheckSameDatabase();
+    CQoString InputSqliteFile() const;
+    CQoString OutputSqliteFile() const;
     static int FileMode(int charset);
     static void ReadCharset(CQoConfigFile& config, const char* section, int& charset);
     static void ReadFormat(CQoConfigFile& config, const char* section, int last, const char* allowed, int& format);
@@ -184,6 +194,8 @@ private:
     bool m_bFilters;
     CConversionProgress* m_pProgress;
     long m_lSkipped;
+    // The run reads an SQLite input whole at once (it shares its file with the output).
+    bool m_bInputFromMemory;
     CColumnMapping m_columns;
 
     friend class CConversionInput;

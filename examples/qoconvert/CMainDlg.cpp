@@ -503,7 +503,14 @@ void CMainDlg::OnConvert()
     }
     m_job.WriteConfig(config);
     if (!config.Write(theApp.m_projectFile)) {
-        Status("Projektdatei nicht gespeichert.");
+        // Nothing is converted with settings that were not kept.
+        DWORD attributes = GetFileAttributesA(theApp.m_projectFile);
+        CString text;
+        text.Format(attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_READONLY)
+                        ? "Die Projektdatei '%s' ist schreibgesch\xFCtzt; nicht gespeichert, nicht konvertiert."
+                        : "Die Projektdatei '%s' kann nicht gespeichert werden; nicht konvertiert.",
+                    (const char*)theApp.m_projectFile);
+        Status(text);
         return;
     }
 

@@ -12,6 +12,9 @@
 #include "CMainDlg.h"
 #include "QoConvertRun.h"
 
+#include <csignal>
+#include <cstdlib>
+
 CQoConvertApp theApp;
 
 BEGIN_MESSAGE_MAP(CQoConvertApp, CSingleWinApp)
@@ -28,6 +31,17 @@ int RepairDuringConversion(CQoString const& file, CQoString& data, int& pos)
     if (GetCurrentThreadId() == theApp.m_nThreadID)
         return CQoInterActive::repairNoHandler;
     return CRepairRecordDlgDoIt(file, data, pos);
+}
+
+// A program that stops itself (abort, an exception nothing catches) must not
+// end with a code that reads as a result: the runtime's own code 3 is
+// "converted, records left out" to whoever started the run.
+extern "C" void OnAbort(int)
+{
+    static const char text[] = "qoconvert: Programmfehler, die Konvertierung ist nicht abgeschlossen\r\n";
+    DWORD written = 0;
+    WriteFile(GetStdHandle(STD_ERROR_HANDLE), text, sizeof text - 1, &written, NULL);
+    _exit(qoConvertFailed);
 }
 }
 
@@ -70,6 +84,7 @@ void CQoConvertApp::SetProjectFolder(const CQoString& folder)
 
 BOOL CQoConvertApp::InitInstance()
 {
+    std::signal(SIGABRT, OnAbort);
     ParseArguments();
     // A batch run works beside a running window and beside other batch runs;
     // only the interactive program is there once.

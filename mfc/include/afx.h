@@ -57,12 +57,14 @@ struct CRuntimeClass;
 // ---------------------------------------------------------------------------
 // Diagnostics
 //
-// ASSERT checks in every build: a failed assertion is a programming error of the
-// caller, and carrying on would corrupt memory. The failure is reported on
-// stderr and through OutputDebugString (never a dialog, so batch runs do not
-// block), then the process stops through AfxDebugBreak. VERIFY evaluates its
-// expression in every build as well. TRACE writes to the debugger only in
-// _DEBUG builds.
+// ASSERT checks a caller's promise in _DEBUG builds, as MFC's does; a release
+// build compiles it away, so a condition that input (a file, a project, a
+// user) can reach is never left to an assertion: it is a checked error with
+// a message. A failed assertion is reported on stderr and through
+// OutputDebugString (never a dialog, so batch runs do not block), then the
+// process stops through AfxDebugBreak with the breakpoint status, a code no
+// caller mistakes for a result of its own. VERIFY evaluates its expression in
+// every build. TRACE writes to the debugger only in _DEBUG builds.
 // ---------------------------------------------------------------------------
 
 AFX_API BOOL AFXAPI AfxAssertFailedLine(LPCSTR lpszFileName, int nLine);
@@ -72,14 +74,21 @@ AFX_API void AFXAPI AfxAssertValidObject(const CObject* pOb, LPCSTR lpszFileName
 AFX_API BOOL AFXAPI AfxIsValidAddress(const void* lp, UINT_PTR nBytes, BOOL bReadWrite = TRUE);
 AFX_API BOOL AFXAPI AfxIsValidString(LPCSTR lpsz, int nLength = -1);
 
+#ifdef _DEBUG
 #define ASSERT(f) \
   do { if (!(f) && AfxAssertFailedLine(__FILE__, __LINE__)) AfxDebugBreak(); } while (0)
 #define VERIFY(f) ASSERT(f)
 #define ASSERT_VALID(pOb) (AfxAssertValidObject((pOb), __FILE__, __LINE__))
+#define DEBUG_ONLY(f) (f)
+#else
+#define ASSERT(f) ((void)0)
+#define VERIFY(f) ((void)(f))
+#define ASSERT_VALID(pOb) ((void)0)
+#define DEBUG_ONLY(f) ((void)0)
+#endif
 #define ASSERT_KINDOF(class_name, object) ASSERT((object)->IsKindOf(RUNTIME_CLASS(class_name)))
 #define ASSERT_POINTER(p, type) ASSERT(((p) != NULL) && AfxIsValidAddress((p), sizeof(type), FALSE))
 #define ASSERT_NULL_OR_POINTER(p, type) ASSERT(((p) == NULL) || AfxIsValidAddress((p), sizeof(type), FALSE))
-#define DEBUG_ONLY(f) ((void)0)
 
 #ifdef _DEBUG
 #define TRACE AfxTrace

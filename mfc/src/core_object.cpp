@@ -25,8 +25,10 @@ BOOL AFXAPI AfxAssertFailedLine(LPCSTR lpszFileName, int nLine) {
 
 void AFXAPI AfxDebugBreak() {
   if (::IsDebuggerPresent()) ::DebugBreak();
-  // No dialog (batch runs must not block) and no further code of a broken program.
-  ::TerminateProcess(::GetCurrentProcess(), 3);
+  // No dialog (batch runs must not block) and no further code of a broken
+  // program. The status is the one an unhandled breakpoint ends a process
+  // with: small codes are results that callers of a program read as their own.
+  ::TerminateProcess(::GetCurrentProcess(), (UINT)STATUS_BREAKPOINT);
 }
 
 void AFX_CDECL AfxTrace(LPCSTR lpszFormat, ...) {

@@ -72,14 +72,6 @@ TEST(CArrayTest, SizeConstructsAndDestroysEveryElement) {
   EXPECT_EQ(0, n[4]); // regrown elements start at zero again
 }
 
-TEST(CArrayDeathTest, IndexOutsideTheArrayIsAnAssertion) {
-  GTEST_FLAG_SET(death_test_style, "threadsafe");
-  CArray<int, int> a;
-  a.Add(1);
-  EXPECT_DEATH(a.GetAt(1), "Assertion failed");
-  EXPECT_DEATH(a[-1] = 2, "Assertion failed");
-}
-
 TEST(CListTest, PositionsFindInsertRemove) {
   CStringList l;
   l.AddTail("b");
