@@ -133,12 +133,17 @@ void CDirectoryTreeCtrl::InitDirectoryTreeCtrl(const char* lpszStartPath)
 
     HTREEITEM hDefault = NULL;
     HTREEITEM hStart = NULL;
+    bool bStartHidden = false;   // the start path's drive is one the derived class refuses
     for (const char* pRoot = drives; *pRoot != '\0'; pRoot += strlen(pRoot) + 1) {
         const UINT nType = ::GetDriveTypeA(pRoot);
         if (nType == DRIVE_UNKNOWN) continue;
         char letter[3] = {static_cast<char>(toupper(static_cast<unsigned char>(pRoot[0]))), ':', '\0'};
-        // A derived class hides a drive as it hides a folder.
-        if (!CanDisplay(letter)) continue;
+        // A derived class hides a drive as it hides a folder; a start path on
+        // such a drive cannot be followed, and then nothing is selected.
+        if (!CanDisplay(letter)) {
+            if (bFollow && _strnicmp(letter, parts[0].GetString(), 2) == 0) bStartHidden = true;
+            continue;
+        }
 
         char volume[kVolumeBuffer + 1] = "";
         if (nType != DRIVE_REMOVABLE && nType != DRIVE_REMOTE) {
@@ -167,7 +172,7 @@ void CDirectoryTreeCtrl::InitDirectoryTreeCtrl(const char* lpszStartPath)
     }
 
     if (hStart == NULL) {
-        if (hDefault != NULL) SelectItem(hDefault);
+        if (hDefault != NULL && !bStartHidden) SelectItem(hDefault);
         return;
     }
 

@@ -40,13 +40,18 @@ const char* TypeName(unsigned type)
 
 // "%e" as the platform's formatter writes it: at least three exponent
 // digits. The six digits after the point grow until the text reads back as
-// the same value, so that no digit of the number is lost.
-CQoString Exponential(double value)
+// the same value in the value's own precision, so that no digit of the
+// number is lost and none is made up: a single holds about seven digits, and
+// widened to a double it would show binary noise (0.1f as 1.0000000149e-001).
+CQoString Exponential(double value, bool single)
 {
     char text[64];
     for (int digits = 6; digits <= 16; ++digits) {
         std::snprintf(text, sizeof text, "%.*e", digits, value);
-        if (!std::isfinite(value) || std::strtod(text, nullptr) == value)
+        if (!std::isfinite(value))
+            break;
+        const double back = std::strtod(text, nullptr);
+        if (single ? static_cast<float>(back) == static_cast<float>(value) : back == value)
             break;
     }
     CQoString result = text;
@@ -60,7 +65,7 @@ CQoString Exponential(double value)
     return result;
 }
 
-void Real(double value, CQoString& out)
+void Real(double value, bool single, CQoString& out)
 {
     if (std::isfinite(value) && value > -2147483649.0 && value < 2147483648.0) {
         int whole = static_cast<int>(value);   // toward zero
@@ -69,7 +74,7 @@ void Real(double value, CQoString& out)
             return;
         }
     }
-    out = Exponential(value);
+    out = Exponential(value, single);
 }
 
 } // namespace
@@ -102,10 +107,10 @@ void CQoInputFilterDao::ConvertOleVariant(const COleVariant& value, CQoString& o
         out.Format("%d", (int)value.lVal);
         return;
     case VT_R4:
-        Real(value.fltVal, out);
+        Real(value.fltVal, true, out);
         return;
     case VT_R8:
-        Real(value.dblVal, out);
+        Real(value.dblVal, false, out);
         return;
     case VT_CY: {
         COleCurrency currency(value.cyVal);

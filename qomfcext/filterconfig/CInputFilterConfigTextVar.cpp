@@ -167,9 +167,12 @@ void CInputFilterConfigTextVar::UpdateInputFilter(int bSave)
 bool CInputFilterConfigTextVar::SaveSettings()
 {
     CQoInputFilterTextVar* pFilter = TextFilter();
-    // A field that cannot be read (a skip that is no number) has been reported by
-    // the exchange, with the focus on it; half a set of settings is not applied.
-    if (::IsWindow(m_hWnd) && !UpdateData(TRUE)) return false;
+    // A skip that is no whole number is reported by the exchange, which stops
+    // there: the skip and the fields exchanged after it (delimiter, encloser,
+    // escape, character set, first line) keep the values they had, and the
+    // save goes on with them, so the filter is re-opened and the listeners
+    // hear of it as after any apply.
+    if (::IsWindow(m_hWnd)) UpdateData(TRUE);
 
     if (m_nSkip < 0) {
         m_nSkip = 0;

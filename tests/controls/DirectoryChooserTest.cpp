@@ -107,14 +107,16 @@ TEST_F(DirectoryTreeTest, OpensAlongTheStartPathOrFallsBack)
         m_tree.InitDirectoryTreeCtrl(c.start.c_str());
         EXPECT_EQ(Lower(c.selected), Lower(std::string(m_tree.GetSelectedPath()))) << c.start;
     }
-    // A drive the derived class hides is neither listed nor opened.
+    // A drive the derived class hides is neither listed nor opened, and a
+    // start path on it cannot be followed: nothing is selected, no other drive.
     bool listed = false;
     for (const std::string& text : Texts(NULL)) listed |= text.substr(0, 2) == "Z:";
     ASSERT_TRUE(listed);
     m_tree.m_hiddenDrive = "Z:";
     m_tree.InitDirectoryTreeCtrl("Z:\\tmp");
     for (const std::string& text : Texts(NULL)) EXPECT_NE("Z:", text.substr(0, 2));
-    EXPECT_EQ(Lower(fixed), Lower(std::string(m_tree.GetSelectedPath())));
+    EXPECT_EQ(nullptr, m_tree.GetSelectedItem());
+    EXPECT_EQ("\\", std::string(m_tree.GetSelectedPath()));
     m_tree.m_hiddenDrive.clear();
 
     m_tree.InitDirectoryTreeCtrl((m_base + "\\Alpha\\Gamma").c_str());

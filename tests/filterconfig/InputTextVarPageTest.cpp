@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <fstream>
 #include <string>
 #include <vector>
 
@@ -254,6 +255,22 @@ TEST_F(TextVarPageTest, AppliesWhatTheUserSetAndTellsTheListenersOnce)
     EXPECT_EQ("Meier", PageCell(0, 0));
     EXPECT_EQ("Ort", ColumnTitle(m_pPage->m_preview, 1));
     EXPECT_EQ(2u, m_notified.size());
+}
+
+TEST_F(TextVarPageTest, ASkipThatIsNoNumberStopsTheExchangeThereAndTheApplyGoesOn)
+{
+    m_filter.Init(m_strFile.c_str());  // ';' and '"': five records of one field
+    Open();
+    qotest::Dialog page = Page();
+    // The file gains a record: the apply re-opens the filter on it.
+    std::ofstream(m_strFile, std::ios::binary | std::ios::app) << "Neu\tBonn\t53111\r\n";
+    page.SelectText(IDC_TEXTVAR_DELIMITER, "[TAB]");  // exchanged after the skip: stays ';'
+    page.SetText(IDC_TEXTVAR_SKIP, "abc");
+    EXPECT_EQ("Geben Sie eine ganze Zahl ein.", qotest::MessageOf([&] { Press(IDC_TEXTVAR_APPLY); }));
+    EXPECT_EQ(';', m_filter.Delimiter());
+    EXPECT_EQ(0, m_filter.Skip());
+    EXPECT_EQ(6, m_pPage->m_preview.GetItemCount());
+    EXPECT_EQ(std::vector<int>{kPageId}, m_notified);
 }
 
 TEST_F(TextVarPageTest, RefusesBadSettingsWithAMessageAndLeavesTheFilterAsItWas)
