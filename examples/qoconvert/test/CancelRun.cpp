@@ -11,7 +11,7 @@
 
 #include <cstdio>
 
-#include "QoConvertRun.h"
+#include "../conversion/QoConvertRun.h"
 
 namespace {
 const UINT kDone = WM_APP + 0x99;

@@ -1,7 +1,7 @@
 #include "CQoXlsxReader.h"
 
 #include "CQoException.h"
-#include "../QoPathParts.h"
+#include "../core/QoPathParts.h"
 #include "QoXmlScanner.h"
 #include "QoZipArchive.h"
 

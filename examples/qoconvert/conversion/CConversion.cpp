@@ -17,7 +17,7 @@
 #include <CQoOutputFilterTextVar.h>
 #include <QoSqlName.h>
 
-#include "CInputRecords.h"
+#include "../columns/CInputRecords.h"
 
 #include <memory>
 #include <vector>

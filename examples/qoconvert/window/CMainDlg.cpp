@@ -15,7 +15,7 @@
 #include "CColumnsDlg.h"
 #include "COdbcInputPage.h"
 #include "QoConvertApp.h"
-#include "QoConvertRun.h"
+#include "../conversion/QoConvertRun.h"
 
 #include <commctrl.h>
 

@@ -20,8 +20,8 @@
 #include <algorithm>
 #include <memory>
 
-#include "CConversion.h"
-#include "CInputRecords.h"
+#include "../conversion/CConversion.h"
+#include "../columns/CInputRecords.h"
 #include "resource.h"
 
 class CInputFilterConfig;

@@ -44,7 +44,7 @@
 
 #include <string>
 
-#include "CColumnMapping.h"
+#include "../columns/CColumnMapping.h"
 
 class CQoInputFilter;
 class CQoOutputFilter;

@@ -18,7 +18,7 @@
 
 #include <memory>
 
-#include "CColumnMapping.h"
+#include "../columns/CColumnMapping.h"
 #include "resource.h"
 
 class CMultiColumnConfig;

@@ -8,9 +8,9 @@
 #include <CRepairRecordDlg.h>
 #include <QoBatchMessageBox.h>
 
-#include "CConversion.h"
+#include "../conversion/CConversion.h"
 #include "CMainDlg.h"
-#include "QoConvertRun.h"
+#include "../conversion/QoConvertRun.h"
 
 #include <csignal>
 #include <cstdlib>
