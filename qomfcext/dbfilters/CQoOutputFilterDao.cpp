@@ -6,6 +6,7 @@
 
 #include "CQoPasswortDlg.h"
 #include "QoDaoError.h"
+#include "QoSqlName.h"
 #include "resource.h"
 
 #include <climits>
@@ -25,12 +26,7 @@ CString NewTableName(const CString& table)
     std::string folded((const char*)table, (size_t)table.GetLength());
     if (!folded.empty())
         CharLowerBuffA(&folded[0], (DWORD)folded.size());
-    unsigned hash = 2166136261u;   // FNV-1a
-    for (unsigned char ch : folded)
-        hash = (hash ^ ch) * 16777619u;
-    CString name;
-    name.Format("qo_neu_%08x", hash);
-    return name;
+    return CString(QoRunTableName(CQoString(folded.c_str(), (int)folded.size())).GetString());
 }
 
 // "CON", "nul.mdb", "C:\\daten\\COM1.db": names Windows gives to devices in every folder.

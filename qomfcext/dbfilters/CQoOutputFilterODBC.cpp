@@ -28,14 +28,7 @@ CQoString Shown(const CQoString& name)
 // removes what a killed run left behind.
 CQoString NewTableName(const CQoString& target)
 {
-    unsigned int hash = 2166136261u;   // FNV-1a
-    for (int i = 0; i < target.GetLength(); ++i) {
-        hash ^= (unsigned char)target.GetString()[i];
-        hash *= 16777619u;
-    }
-    CQoString name;
-    name.Format("qo_neu_%08x", hash);
-    return target.Left(QoSqlNameLastPart(target)) + name;
+    return target.Left(QoSqlNameLastPart(target)) + QoRunTableName(target);
 }
 
 // The index of a column: the table's own name and the column's number, in

@@ -146,3 +146,15 @@ int QoSqlNameLastPart(const CQoString& name)
     }
     return last;
 }
+
+CQoString QoRunTableName(const CQoString& key)
+{
+    unsigned int hash = 2166136261u;   // FNV-1a
+    for (int i = 0; i < key.GetLength(); ++i) {
+        hash ^= static_cast<unsigned char>(key.GetString()[i]);
+        hash *= 16777619u;
+    }
+    CQoString name;
+    name.Format("qo_neu_%08x", hash);
+    return name;
+}

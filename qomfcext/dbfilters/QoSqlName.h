@@ -35,3 +35,9 @@ QOMFCEXT_API CQoString QoQuoteSqlName(const CQoString& name, const char* quote);
 // ("s.T" -> 2, "\"a.b\"" -> 0), so that a table beside it or an index of it
 // can be named in the same schema.
 int QoSqlNameLastPart(const CQoString& name);
+
+// Internal: the table a run fills before it takes its target's place,
+// "qo_neu_" and 8 hex digits of a hash of `key` (the target's name as the
+// database tells names apart), so that every run on one target uses the same
+// name and the next run finds and removes what a killed one left.
+CQoString QoRunTableName(const CQoString& key);
