@@ -11,6 +11,7 @@
 #include <psapi.h>
 #else
 #include <sys/resource.h>
+#include <unistd.h>
 #include <time.h>
 #endif
 
@@ -110,6 +111,53 @@ Memory ReadMemory()
 Memory const &MemoryAtStart()
 {
     return g_atStart;
+}
+
+namespace {
+unsigned CoreCount()
+{
+#if defined(_WIN32)
+    SYSTEM_INFO info;
+    GetSystemInfo(&info);
+    return info.dwNumberOfProcessors;
+#else
+    long n = sysconf(_SC_NPROCESSORS_ONLN);
+    return n > 0 ? static_cast<unsigned>(n) : 0u;
+#endif
+}
+}
+
+std::string MachineLoad()
+{
+    // The host's load average, also for a Windows program under Wine, whose
+    // drive Z: is the host's root: figures of a loaded machine are not
+    // figures of the code.
+    char const *path = "/proc/loadavg";
+#if defined(_WIN32)
+    if (!UnderWine())
+        return "not known on Windows";
+    path = "Z:\\proc\\loadavg";
+#endif
+    std::FILE *file = std::fopen(path, "r");
+    if (file == nullptr)
+        return "not known";
+    double one = 0, five = 0, fifteen = 0;
+    int n = std::fscanf(file, "%lf %lf %lf", &one, &five, &fifteen);
+    std::fclose(file);
+    if (n != 3)
+        return "not known";
+    char text[96];
+    std::snprintf(text, sizeof text, "%.2f %.2f %.2f (1, 5, 15 min; %u cores)", one, five, fifteen,
+                  CoreCount());
+    return text;
+}
+
+namespace {
+// Every benchmark says how loaded the machine was, before and after it ran.
+struct LoadReport {
+    LoadReport() { std::printf("machine load at start: %s\n", MachineLoad().c_str()); }
+    ~LoadReport() { std::printf("machine load at end: %s\n", MachineLoad().c_str()); }
+} const g_loadReport;
 }
 
 bool UnderWine()

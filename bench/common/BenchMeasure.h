@@ -53,6 +53,10 @@ struct Memory {
 Memory ReadMemory();
 // The figures as they were when the program started (before main).
 Memory const &MemoryAtStart();
+// The host's load average ("0.71 0.99 1.52 (1, 5, 15 min; 2 cores)"), read
+// from /proc/loadavg, under Wine too; every benchmark prints it when it starts
+// and when it ends.
+std::string MachineLoad();
 // True for a Windows program that runs under Wine.
 bool UnderWine();
 // Bytes in MiB (2^20).
