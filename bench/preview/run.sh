@@ -1,7 +1,8 @@
 #!/bin/sh
 # The delimited text page's preview on files of 1,000,000 and 10,000,000 rows
-# under Wine: opening until the first complete paint, and a jump to the last
-# row until it is painted, with the file size and the process's memory.
+# under Wine: opening until the first complete paint, a jump to the preview's
+# last row until it is painted, and AbsoluteRow to the file's own last row,
+# with the file size and the process's memory.
 #   bench/preview/run.sh [build folder] [rows ...]
 # The files are generated into <build folder>/bench-preview (not in git) and
 # kept for the next run.
