@@ -113,12 +113,13 @@ void CColoredInputFilterListCtrl::Update()
     }
 
     std::vector<long long> sums(static_cast<size_t>(n), 0);
+    const CPreviewTextMeter meter(*this);
     int sampled = 0;
     if (m_pFilter->FirstRow()) {
         do {
             for (int i = 0; i < n; ++i) {
                 m_pFilter->Value(i, value);
-                sums[static_cast<size_t>(i)] += GetStringWidth(value);
+                sums[static_cast<size_t>(i)] += meter.Width(value);
             }
             ++sampled;
         } while (sampled < kSampleRows && m_pFilter->NextRow());

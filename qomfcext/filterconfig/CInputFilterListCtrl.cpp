@@ -65,12 +65,13 @@ void CInputFilterListCtrl::Update()
     }
 
     std::vector<long long> sums(static_cast<size_t>(n), 0);
+    const CPreviewTextMeter meter(*this);
     int rows = 0;
     if (n > 0 && m_pFilter->FirstRow()) {
         for (;;) {
             for (int i = 0; i < n; ++i) {
                 m_pFilter->Value(i, value);
-                sums[static_cast<size_t>(i)] += GetStringWidth(value);
+                sums[static_cast<size_t>(i)] += meter.Width(value);
                 if (i == 0)
                     InsertItem(rows, value);
                 else
