@@ -149,18 +149,20 @@ void CDaoWorkspace::BeginTrans() {
   ++ws.nLevel;
 }
 
-void CDaoWorkspace::CommitTrans() {
-  WorkspaceState& ws = StateOf(this);
+namespace {
+// Ends the workspace's innermost level in every database that has it. A
+// database whose commit fails is rolled back by its connection; the others
+// still end their level (rolled back once one has failed), and the first
+// failure is raised.
+void EndWorkspaceLevel(WorkspaceState& ws, bool bCommit) {
   if (ws.nLevel == 0) ThrowNoTransaction();
   --ws.nLevel;
-  // A database whose commit failed is rolled back by its connection; the
-  // others still end their level, and the first failure is raised.
   CException* pFirst = NULL;
   for (CDaoDatabase* pDatabase : ws.databases) {
     Engine& engine = EngineOf(pDatabase);
     if (engine.nTransDepth <= ws.nLevel) continue;
     try {
-      EndLevel(engine, pFirst == NULL);
+      EndLevel(engine, bCommit && pFirst == NULL);
     } catch (CException* e) {
       if (pFirst == NULL) pFirst = e;
       else e->Delete();
@@ -168,21 +170,8 @@ void CDaoWorkspace::CommitTrans() {
   }
   if (pFirst != NULL) throw pFirst;
 }
+} // namespace
 
-void CDaoWorkspace::Rollback() {
-  WorkspaceState& ws = StateOf(this);
-  if (ws.nLevel == 0) ThrowNoTransaction();
-  --ws.nLevel;
-  CException* pFirst = NULL;
-  for (CDaoDatabase* pDatabase : ws.databases) {
-    Engine& engine = EngineOf(pDatabase);
-    if (engine.nTransDepth <= ws.nLevel) continue;
-    try {
-      EndLevel(engine, false);
-    } catch (CException* e) {
-      if (pFirst == NULL) pFirst = e;
-      else e->Delete();
-    }
-  }
-  if (pFirst != NULL) throw pFirst;
-}
+void CDaoWorkspace::CommitTrans() { EndWorkspaceLevel(StateOf(this), true); }
+
+void CDaoWorkspace::Rollback() { EndWorkspaceLevel(StateOf(this), false); }

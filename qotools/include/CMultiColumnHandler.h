@@ -115,6 +115,9 @@ public:
     bool GetInnerColName(int index, CQoString &name, bool nameOnly) const;
     // The function of the inner column at `index`, or -1 for an index out of range.
     long GetInnerFunction(int index) const;
+    // The column of the output source the inner column at `index` reads, or -1
+    // for an index out of range.
+    int GetInnerSourceColumn(int index) const;
 
     // --- outer columns -------------------------------------------------------------
     // composeOutput: adds an outer column at the end; false when the id is in use

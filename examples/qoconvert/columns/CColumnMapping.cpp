@@ -95,18 +95,6 @@ void CColumnMapping::ReadConfig(const CQoConfigFile& config)
                             "(MultiColumnType=1 fehlt).",
                             kComposition);
 
-    std::vector<std::pair<int, int>> sources;
-    if (hasComposition) {
-        int inner = 0;
-        config.GetValue(kComposition, "InnerColumns", inner, 0, qolimits::maxColumns);
-        for (int k = 0; k < inner; ++k) {
-            int id = -1, source = -1;
-            if (config.GetValue(kComposition, Key("Inner", k, "Id"), id)
-                && config.GetValue(kComposition, Key("Inner", k, "Source"), source) && source >= 0)
-                sources.push_back(std::make_pair(id, source));
-        }
-    }
-
     CColumnView::Selection selection;
     const bool hasSelection = config.HasSection(kSelection);
     if (hasSelection) {
@@ -128,7 +116,6 @@ void CColumnMapping::ReadConfig(const CQoConfigFile& config)
         m_handler.SetWriteOutputSource(m_pRecords);
     }
     m_bComposition = hasComposition;
-    m_sources = sources;
     m_selection = selection;
     m_bSelectionPending = hasSelection;
     m_bDefined = config.HasSection(kFunctions) || hasComposition || hasSelection;
@@ -209,18 +196,16 @@ std::vector<CQoString> CColumnMapping::MissingSources() const
     std::vector<CQoString> missing;
     if (!m_bComposition)
         return missing;
-    for (const std::pair<int, int>& source : m_sources) {
-        if (source.second < m_nInputColumns)
-            continue;
-        const int index = m_handler.FindInnerColumn(source.first);
+    for (int index = 0; index < m_handler.NumInnerColumns(); ++index) {
+        const int source = m_handler.GetInnerSourceColumn(index);
         CQoString outer, inner;
-        if (index < 0 || m_handler.GetOuterNameOfInnerColumn(index, outer) < 0)
+        if (source < m_nInputColumns || m_handler.GetOuterNameOfInnerColumn(index, outer) < 0)
             continue;
         m_handler.GetInnerColName(index, inner, true);
         CQoString text;
         text.Format("Die Ausgabespalte '%s' liest '%s' aus der Eingabespalte %d, die Eingabe hat aber nur %d "
                     "Spalten: der Teil bleibt leer.",
-                    outer.GetString(), inner.GetString(), source.second + 1, m_nInputColumns);
+                    outer.GetString(), inner.GetString(), source + 1, m_nInputColumns);
         missing.push_back(text);
     }
     return missing;

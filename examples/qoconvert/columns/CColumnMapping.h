@@ -103,7 +103,4 @@ private:
     bool m_bComposition;      // the handler holds a stored or edited composition
     bool m_bSelectionPending; // m_selection waits for the next Build
     CColumnView::Selection m_selection;
-    // The stored composition's inner columns that name their input column:
-    // (inner column id, input column).
-    std::vector<std::pair<int, int>> m_sources;
 };

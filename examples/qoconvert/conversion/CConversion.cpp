@@ -463,6 +463,15 @@ CQoString SqlName(const CQoString& name, const CString& quote, const char* what)
     return QoQuoteSqlName(name, quote);
 }
 
+// A file database the filter could not open, with the reason it gave.
+[[noreturn]] void RefuseClosedDatabase(const CQoString& file, const CQoString& why)
+{
+    CQoString text;
+    text.Format("Die Datenbank '%s' ist nicht ge\xF6" "ffnet: %s", file.GetString(),
+                why.IsEmpty() ? "die Passworteingabe wurde abgebrochen" : why.GetString());
+    CQoException::Throw(text, file);
+}
+
 // A table name of an Access-type database: brackets are Access's way of
 // quoting a name in SQL, not part of it.
 CQoString AccessName(const CQoString& name)
@@ -573,12 +582,8 @@ void CConversion::OpenInputFilter(CQoInputFilter& filter, const CQoString& folde
         CQoInputFilterDao& dao = static_cast<CQoInputFilterDao&>(filter);
         CQoString name = InFolder(folder, m_inputDatabase);
         dao.Init(name);
-        if (!dao.GetDatabase().IsOpen()) {
-            CQoString text;
-            text.Format("Die Datenbank '%s' ist nicht ge\xF6" "ffnet: %s", name.GetString(),
-                        dao.LastError().IsEmpty() ? "die Passworteingabe wurde abgebrochen" : dao.LastError().GetString());
-            CQoException::Throw(text, m_inputDatabase);
-        }
+        if (!dao.GetDatabase().IsOpen())
+            RefuseClosedDatabase(name, dao.LastError());
         break;
     }
     default:
@@ -738,12 +743,8 @@ CQoOutputFilter* CConversion::NewOutput(CQoOutputSource& source, CQoFile& file, 
         dao->UseDB(m_outputDatabase);
         // An open refused (a password missing or wrong, the prompt cancelled)
         // leaves the database closed with the reason.
-        if (!dao->LastError().IsEmpty()) {
-            CQoString text;
-            text.Format("Die Datenbank '%s' ist nicht ge\xF6" "ffnet: %s", m_outputDatabase.GetString(),
-                        dao->LastError().GetString());
-            CQoException::Throw(text, m_outputDatabase);
-        }
+        if (!dao->LastError().IsEmpty())
+            RefuseClosedDatabase(m_outputDatabase, dao->LastError());
         return output.release();
     }
     default:

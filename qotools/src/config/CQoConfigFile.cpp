@@ -72,6 +72,20 @@ int HexDigit(char c)
     return -1;
 }
 
+// The byte of "\xHH" whose 'x' stands at p[i]; moves i to its last digit.
+bool ReadHex(char const *p, std::size_t n, std::size_t &i, std::string &out)
+{
+    if (i + 2 >= n)
+        return false;
+    int hi = HexDigit(p[i + 1]);
+    int lo = HexDigit(p[i + 2]);
+    if (hi < 0 || lo < 0)
+        return false;
+    out += static_cast<char>(hi * 16 + lo);
+    i += 2;
+    return true;
+}
+
 // Undoes Escape. False for a backslash that starts no escape. `marked` tells
 // whether an escape that only the escaped form needs (\\, \s, \xHH) was seen.
 bool Unescape(char const *p, std::size_t n, std::string &out, bool *marked = nullptr)
@@ -92,14 +106,8 @@ bool Unescape(char const *p, std::size_t n, std::string &out, bool *marked = nul
         case 't': out += '\t'; break;
         case 's': out += ' '; strong = true; break;
         case 'x': {
-            if (i + 2 >= n)
+            if (!ReadHex(p, n, i, out))
                 return false;
-            int hi = HexDigit(p[i + 1]);
-            int lo = HexDigit(p[i + 2]);
-            if (hi < 0 || lo < 0)
-                return false;
-            out += static_cast<char>(hi * 16 + lo);
-            i += 2;
             strong = true;
             break;
         }
@@ -179,14 +187,8 @@ bool Unquote(char const *p, std::size_t n, std::string &out)
         case 'n': out += '\n'; break;
         case 't': out += '\t'; break;
         case 'x': {
-            if (i + 2 >= n)
+            if (!ReadHex(p, n, i, out))
                 return false;
-            int hi = HexDigit(p[i + 1]);
-            int lo = HexDigit(p[i + 2]);
-            if (hi < 0 || lo < 0)
-                return false;
-            out += static_cast<char>(hi * 16 + lo);
-            i += 2;
             break;
         }
         default: return false;

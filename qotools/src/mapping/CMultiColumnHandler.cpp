@@ -273,6 +273,11 @@ long CMultiColumnHandler::GetInnerFunction(int index) const
     return m_map->inner[index].function;
 }
 
+int CMultiColumnHandler::GetInnerSourceColumn(int index) const
+{
+    return m_map->SourceColumnOf(index);
+}
+
 // ---------------------------------------------------------------------------
 // outer columns
 
