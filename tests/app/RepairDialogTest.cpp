@@ -21,13 +21,6 @@ using qotest::DialogScript;
 const char kHead[] = "Name;Ort;PLZ\r\nMeier;Bonn;53111\r\n";
 const char kTail[] = "Schulz;Essen;45127\r\nWolf;Ulm;89073\r\n";
 
-std::string Text(UINT id)
-{
-    CString text;
-    text.LoadString(id);
-    return (const char*)text;
-}
-
 // One step of the spin control with a real click on its upper or lower arrow.
 void ClickSpin(Dialog& d, bool up)
 {
@@ -42,8 +35,7 @@ void ClickSpin(Dialog& d, bool up)
     qotest::PumpFor(40);
 }
 
-// Presses a button whose refusal opens a message box, answered by the next
-// queued script; returns when the box is gone.
+// Presses a button whose refusal opens a message box; returns when the box is gone.
 void PressRefused(Dialog& d, int id)
 {
     d.Press(id);
@@ -208,7 +200,9 @@ TEST_F(RepairTest, RefusalsAndSplitsOnTheRecordAlone)
         std::vector<DialogScript> scripts = {c.script};
         for (UINT id : c.messages)
             scripts.push_back([id](Dialog& box) {
-                EXPECT_EQ(Text(id), box.MessageText());
+                CString text;
+                text.LoadString(id);
+                EXPECT_EQ(std::string(text), box.MessageText());
                 box.Press(IDOK);
             });
         qotest::Answering(scripts, [&] { EXPECT_EQ(c.result, CRepairRecordDlgDoIt("kunden.csv", data, pos)); });

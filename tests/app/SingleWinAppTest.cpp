@@ -97,14 +97,6 @@ HWND WaitForWindow(const std::string& strLog, DWORD dwPid, const char* pszStep)
     return hWnd;
 }
 
-std::string Describe(HWND hWnd)
-{
-    char szClass[64] = "", szText[64] = "";
-    ::GetClassNameA(hWnd, szClass, sizeof(szClass));
-    ::GetWindowTextA(hWnd, szText, sizeof(szText));
-    return std::string(szClass) + " \"" + szText + "\"";
-}
-
 // True when hAbove lies above hBelow in the z-order of the top-level windows.
 bool IsAbove(HWND hAbove, HWND hBelow)
 {
@@ -187,7 +179,7 @@ TEST(SingleWinAppTest, SecondStartEndsAndBringsTheFirstInstanceOrItsDialogToTheF
         // window while its own window still holds the foreground, and that
         // can come after the first instance took it.
         EXPECT_TRUE(WaitUntil([&] { return ::GetForegroundWindow() == hExpected; }, 10000, false))
-            << "foreground: " << Describe(::GetForegroundWindow());
+            << "foreground: " << ::GetForegroundWindow();
         EXPECT_TRUE(IsAbove(hExpected, hOwn));
         EXPECT_TRUE(WaitUntil([&] { return CountLines(strLog, first.dwPid, "activated") == 1; }));
 

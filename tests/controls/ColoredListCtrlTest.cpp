@@ -1,6 +1,5 @@
-// The coloured list on a real window: a virtual list of a million rows whose
-// cells a subclass answers, checked by the pixels a user would see, and its
-// header driven with the real mouse.
+// The coloured list on a real window: a virtual list of a million rows, checked
+// by the pixels a user would see.
 #include <gtest/gtest.h>
 
 #include <afxcmn.h>

@@ -73,7 +73,6 @@ protected:
             if (m_tree.GetItemText(h) == text) return h;
         return NULL;
     }
-    // The texts under an item, or of the drives for NULL.
     std::vector<std::string> Texts(HTREEITEM hParent)
     {
         std::vector<std::string> texts;

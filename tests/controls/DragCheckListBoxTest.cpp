@@ -1,7 +1,4 @@
-// The drag check list box and the widening list box on real windows: items
-// dragged with real mouse input, the drop bar as the screen shows it, ticks by
-// click and space bar, the listeners told of every release and key, and the
-// horizontal scroll range following the widest text.
+// The drag check list box and the widening list box on real windows.
 #include <gtest/gtest.h>
 
 #include <CDragCheckListBox.h>
@@ -63,7 +60,6 @@ protected:
         const CRect rc = Item(i);
         return {rc.left + 60, lower ? rc.bottom - 3 : rc.top + 3};
     }
-    // "Text:data:check:enabled" of every item.
     std::vector<std::string> Items()
     {
         std::vector<std::string> items;
@@ -76,7 +72,6 @@ protected:
         return items;
     }
 
-    // Items from "Text:data:check[:aus]".
     void Fill(const std::vector<std::string>& items)
     {
         m_list.ResetContent();

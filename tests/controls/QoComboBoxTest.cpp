@@ -1,5 +1,4 @@
-// The greyable combo box on a real owner-drawn window: the flags its items
-// carry, the item height, and the selection field's colours sampled from captures.
+// The greyable combo box on a real owner-drawn window.
 #include <gtest/gtest.h>
 
 #include <vector>

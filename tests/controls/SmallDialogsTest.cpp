@@ -1,5 +1,4 @@
-// The small dialogs and statics on real windows: what the user sees in them,
-// what they hand back, and the log lines of the hint.
+// The small dialogs and statics on real windows.
 #include <gtest/gtest.h>
 
 #include <fstream>
@@ -47,9 +46,7 @@ TEST(InfoView, EveryKindOfLineEndIsOneBreak)
               [&] { EXPECT_EQ(IDOK, view.DoModal()); });
 }
 
-// ---------------------------------------------------------------------------
-// Hint: _theLog writes into a fresh file; Entries() are its lines without the time.
-
+// _theLog writes into a fresh file; Entries() are its lines without the time.
 class HintTest : public ::testing::Test {
 protected:
     void SetUp() override
@@ -150,9 +147,6 @@ TEST(InputDialog, ShowsTitlePromptAndValueAndReturnsWhatWasTyped)
     EXPECT_EQ(CString("Stra\xDF" "e"), dlg.m_strValue);
 }
 
-// ---------------------------------------------------------------------------
-// "Open with"
-
 TEST(FileOpenDlg, ProgramFieldsOnlyForAnotherProgramAndBrowseFillsThem)
 {
     const std::string file =
@@ -216,9 +210,6 @@ TEST(FileOpenDlg, OkStartsTheProgramOrReportsThatItCannot)
     dlg.SetProgram(HarmlessProgram().c_str());
     Answering({[](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
 }
-
-// ---------------------------------------------------------------------------
-// Statics on a frame
 
 namespace {
 

@@ -53,7 +53,6 @@ protected:
         m_pRoot->Delete();
         HostFrameTest::TearDown();
     }
-    // The items the view shows under an item, and their texts.
     std::vector<HTREEITEM> Items(HTREEITEM hParent)
     {
         std::vector<HTREEITEM> items;

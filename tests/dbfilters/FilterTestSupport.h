@@ -1,14 +1,17 @@
-// What the database filter tests read from a filter: the rows through the
-// text filter tests' helpers, and the message of the CQoException an action
-// raises.
+// What the database filter tests share: the rows through the text filter
+// tests' helpers, a folder under the host's /tmp (Z:\tmp under Wine), and
+// the message of the CQoException an action raises.
 #pragma once
 
+#include "../qotools/PythonPeer.h"
 #include "../qotools/TextFilterTestSupport.h"
 
 #include <CQoException.h>
 
 #include <functional>
 #include <string>
+
+using Folder = PeerFolder;
 
 // Empty when the action raises nothing.
 inline std::string ErrorOf(const std::function<void()>& action)

@@ -2,12 +2,9 @@
 // host reads and writes, the SQL the server receives, what an unfinished or
 // failed run leaves behind, and what happens when the source fails.
 #include "FilterTestSupport.h"
-#include "OdbcTestTargets.h"
 
-#include "../qotools/PythonPeer.h"
-
-#include <CQoException.h>
 #include <CQoInputFilterODBC.h>
+#include <CQoODBCDatabase.h>
 #include <CQoInterActive.h>
 #include <CQoLog.h>
 #include <CQoOutputFilterODBC.h>
@@ -15,15 +12,28 @@
 
 #include <DialogDriver.h>
 
+#include <cstdlib>
 #include <fstream>
 #include <functional>
 #include <regex>
-#include <sstream>
 #include <vector>
 
-using namespace odbctest;
-
 namespace {
+
+enum Kind { sqlite, postgres };
+
+// A new SQLite file per test, or the loopback PostgreSQL server of the test
+// run when QO_PG_CONNECT names it ("" otherwise).
+std::string Connect(Kind kind, const Folder& folder)
+{
+    if (kind == sqlite)
+        return "Driver=SQLite3;Database=" + folder.Path("test.db");
+    const char* pg = std::getenv("QO_PG_CONNECT");
+    return pg ? pg : "";
+}
+
+#define SKIP_WITHOUT(connect) \
+    if ((connect).empty()) GTEST_SKIP() << "no PostgreSQL server (QO_PG_CONNECT is not set)"
 
 // Values that must arrive exactly: quotes, semicolons, umlauts, a long text.
 const std::vector<Row> kRows = {
@@ -57,7 +67,6 @@ void Put(CQoOutputFilterODBC& out, const Row& row)
     EXPECT_TRUE(out.WriteRow());
 }
 
-// Writes kRows into table `table`.
 void WriteRows(const std::string& connect, const char* table, int indexedColumn = -1)
 {
     CQoOutputFilterODBC out;
@@ -95,23 +104,12 @@ std::vector<Row> Dump(Kind kind, const std::string& connect, const std::string& 
     return dump;
 }
 
-std::vector<std::string> LogLines(const std::string& path)
-{
-    std::vector<std::string> lines;
-    std::ifstream in(path, std::ios::binary);
-    for (std::string line; std::getline(in, line);)
-        if (!line.empty() && line != "\r")
-            lines.push_back(line);
-    return lines;
-}
-
 class OdbcFilters : public testing::TestWithParam<Kind> {
 protected:
     void SetUp() override
     {
         m_connect = Connect(GetParam(), m_folder);
-        if (m_connect.empty())
-            GTEST_SKIP() << "no PostgreSQL server (QO_PG_CONNECT is not set)";
+        SKIP_WITHOUT(m_connect);
         CQoInterActive::SetQuiet(false);
     }
     Folder m_folder;
@@ -142,7 +140,6 @@ TEST_P(OdbcFilters, WhatTheOutputWritesTheInputReadsBackExactly)
     in.SetTableName("kunden");
     in.SetTableType(CQoInputFilterDB::tableTable);
     in.Init("");
-    EXPECT_EQ("", std::string(in.LastError()));
     EXPECT_EQ(5, in.NumRows());
     EXPECT_EQ(kRows, AllRows(in));
 
@@ -183,12 +180,10 @@ TEST_P(OdbcFilters, NamesThatWouldBeMoreThanANameAreRefusedBeforeAnythingIsSent)
         {"[a]]b].`c``d`", nullptr},
         {"\xC4nderungen", nullptr},
         {"opfer; drop table opfer", plain},
-        {"if exists x; drop table opfer", plain},
         {"a integer); drop table opfer; --", plain},
         {"opfer -- Kommentar", plain},
         {"\"opfer\"; drop table opfer", plain},
         {"\"opfer", unpaired},
-        {"[opfer", unpaired},
         {"op\"fer", unpaired},
         {"\"a\nb\"", control},
         {"", "leer"},
@@ -243,13 +238,8 @@ TEST_P(OdbcFilters, NamesThatWouldBeMoreThanANameAreRefusedBeforeAnythingIsSent)
     WriteRows(m_connect, odd);
     EXPECT_EQ(kRows, Query(m_connect, std::string("select * from ") + odd.GetString()));
     EXPECT_EQ(kRows, Query(m_connect, "select * from opfer"));
-    EXPECT_EQ("Name", std::string(QoQuoteSqlName("Name", "")));
-    EXPECT_EQ("[a]]b]", std::string(QoQuoteSqlName("a]b", "[")));
 }
 
-// A run replaces the old table only when it is complete: whatever stops it
-// before, the old table (rows, columns, types, indexes) is exactly as before
-// and no other table is left.
 TEST_P(OdbcFilters, AnUnfinishedOrFailedRunLeavesTheOldTableExactlyAsItWas)
 {
     const bool pg = GetParam() == postgres;
@@ -264,14 +254,12 @@ TEST_P(OdbcFilters, AnUnfinishedOrFailedRunLeavesTheOldTableExactlyAsItWas)
     std::string longName(70, 'x');
     struct Case {
         const char* what;
-        std::function<void()> run;
-        const char* error;   // what the report holds; nullptr: no report
+        std::function<void(CQoOutputFilterODBC&)> run;   // on an output prepared for "bestand"
+        const char* error;                               // what the report holds; nullptr: no report
         bool postgresOnly;
     } cases[] = {
         {"the host discards after some rows",
-         [&] {
-             CQoOutputFilterODBC out;
-             Prepare(out, m_connect, "bestand", 1);
+         [&](CQoOutputFilterODBC& out) {
              out.Init();
              Put(out, kRows[0]);
              Put(out, kRows[1]);
@@ -280,35 +268,27 @@ TEST_P(OdbcFilters, AnUnfinishedOrFailedRunLeavesTheOldTableExactlyAsItWas)
          },
          nullptr, false},
         {"the host stops with an exception",
-         [&] {
-             CQoOutputFilterODBC out;
-             Prepare(out, m_connect, "bestand", 1);
+         [&](CQoOutputFilterODBC& out) {
              out.Init();
              Put(out, kRows[0]);
              CQoException::Throw("Abbruch", nullptr);
          },
          "Abbruch", false},
         {"two columns differ only in case",
-         [&] {
-             CQoOutputFilterODBC out;
-             Prepare(out, m_connect, "bestand", 1);
+         [&](CQoOutputFilterODBC& out) {
              out.ColumnName(1, "NAME");
              out.Init();
          },
          "name", false},
         {"two names are one after the server's cut",
-         [&] {
-             CQoOutputFilterODBC out;
-             Prepare(out, m_connect, "bestand", 1);
+         [&](CQoOutputFilterODBC& out) {
              out.ColumnName(0, (longName + "a").c_str());
              out.ColumnName(1, (longName + "b").c_str());
              out.Init();
          },
          "xxxxxxxx", true},
         {"the server refuses a row",
-         [&] {
-             CQoOutputFilterODBC out;
-             Prepare(out, m_connect, "bestand", 1);
+         [&](CQoOutputFilterODBC& out) {
              out.SetLength(0, 5);
              out.Init();
              Put(out, {"kurz", "1"});
@@ -316,12 +296,27 @@ TEST_P(OdbcFilters, AnUnfinishedOrFailedRunLeavesTheOldTableExactlyAsItWas)
              out.ReleaseDB();
          },
          "character varying(5)", true},
+        {"PostgreSQL keeps no NUL in text: the value is refused, never cut",
+         [&](CQoOutputFilterODBC& out) {
+             out.Init();
+             Put(out, kRows[0]);
+             out.InitRow();
+             out.Value(0, CQoString("ab\0cd", 5));
+             out.Value(1, "2");
+             out.WriteRow();
+             out.ReleaseDB();
+         },
+         "Datensatz 2, Spalte name", true},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.what);
         if (c.postgresOnly && !pg)
             continue;
-        std::string error = ErrorOf(c.run);
+        std::string error = ErrorOf([&] {
+            CQoOutputFilterODBC out;
+            Prepare(out, m_connect, "bestand", 1);
+            c.run(out);
+        });
         if (c.error == nullptr)
             EXPECT_EQ("", error);
         else
@@ -393,9 +388,7 @@ TEST_P(OdbcFilters, ErrorsAreShownInsteadOfRaisedWhenTheHostAsks)
 }
 
 INSTANTIATE_TEST_SUITE_P(Sources, OdbcFilters, testing::Values(sqlite, postgres),
-                         [](const testing::TestParamInfo<Kind>& info) { return std::string(KindName(info.param)); });
-
-// --- what the server receives, and failures --------------------------------------------
+                         [](const testing::TestParamInfo<Kind>& info) { return info.param == sqlite ? "SQLite" : "PostgreSQL"; });
 
 TEST(OdbcFiltersPostgres, TheServerReceivesTheStatementsOfTheTableInOrder)
 {
@@ -408,31 +401,17 @@ TEST(OdbcFiltersPostgres, TheServerReceivesTheStatementsOfTheTableInOrder)
     std::string log = std::string("Z:") + logPath;
 
     CQoOutputFilterODBC out;
-    out.SetTableName("t_beispiel");
-    out.NumCols(3);
-    out.ColumnName(0, "a");
-    out.SetLength(0, 40);
-    out.ColumnName(1, "b");
-    out.SetType(1, CQoOutputFilterDB::dbtypeInteger);
-    out.ColumnName(2, "k");
-    out.SetLength(2, 5);
-    out.SetIndexed(2, true);
-    out.UseDB(connect.c_str());
+    Prepare(out, connect, "t_beispiel", 1);
     ASSERT_TRUE(out.Init());
     out.ReleaseDB();
 
-    // The server writes its log a moment later.
     std::string text;
-    for (int i = 0; i < 50 && text.find("create index t_beispiel3") == std::string::npos; ++i) {
+    for (int i = 0; i < 50 && text.find("create index t_beispiel2") == std::string::npos; ++i) {
         Sleep(100);
-        std::ifstream in(log, std::ios::binary);
-        std::ostringstream all;
-        all << in.rdbuf();
-        text = all.str();
+        text = ReadFileBytes(log);
     }
     std::smatch created;
-    ASSERT_TRUE(std::regex_search(text, created, std::regex("create table (qo_neu_[0-9a-f]{8}) \\(a varchar\\(40\\), "
-                                                            "b integer, k varchar\\(5\\)\\)")))
+    ASSERT_TRUE(std::regex_search(text, created, std::regex("create table (qo_neu_[0-9a-f]{8}) \\(name varchar\\(400\\), num integer\\)")))
         << "statement log:\n" << text.substr(text.size() > 3000 ? text.size() - 3000 : 0);
     const std::string temp = created[1];
     std::size_t at = (std::size_t)created.position(0);
@@ -440,7 +419,7 @@ TEST(OdbcFiltersPostgres, TheServerReceivesTheStatementsOfTheTableInOrder)
     std::size_t select = text.find("select * from " + temp, at);
     std::size_t drop = text.find("drop table if exists t_beispiel", at);
     std::size_t rename = text.find("alter table " + temp + " rename to t_beispiel", at);
-    std::size_t index = text.find("create index t_beispiel3 on t_beispiel(k)", at);
+    std::size_t index = text.find("create index t_beispiel2 on t_beispiel(num)", at);
     EXPECT_NE(std::string::npos, leftover);
     EXPECT_LT(select, drop);
     EXPECT_LT(drop, rename);
@@ -461,9 +440,12 @@ TEST(OdbcFiltersPostgres, ALostConnectionStopsTheWriteAndKeepsTheOldTable)
     std::string error;
     try {
         for (long i = 0; i < 200000; ++i) {
-            if (i == 60000)   // the server ends every other session: as if it stopped
-                Sql(connect, "select pg_terminate_backend(pid) from pg_stat_activity "
-                             "where datname = current_database() and pid <> pg_backend_pid()");
+            if (i == 60000) {   // the server ends every other session: as if it stopped
+                CQoODBCDatabase db(connect.c_str());
+                db.Open(false);
+                db.ExecuteSql("select pg_terminate_backend(pid) from pg_stat_activity "
+                              "where datname = current_database() and pid <> pg_backend_pid()");
+            }
             Put(out, {"x", std::to_string(i)});
             ++accepted;
         }
@@ -478,8 +460,6 @@ TEST(OdbcFiltersPostgres, ALostConnectionStopsTheWriteAndKeepsTheOldTable)
     EXPECT_EQ(kRows, Query(connect, "select * from abbruch"));
 }
 
-// The failure of a table write reaches the log once, on one line, when the
-// filter ends with it unreported.
 TEST(OdbcFiltersPostgres, AFailureFoundAtTheEndIsLoggedOnceOnOneLine)
 {
     Folder folder;
@@ -496,7 +476,11 @@ TEST(OdbcFiltersPostgres, AFailureFoundAtTheEndIsLoggedOnceOnOneLine)
         Put(out, {"abcdef", "2"});   // queued; refused when the filter ends
     }
     _theLog.Close();
-    std::vector<std::string> lines = LogLines(log);
+    std::vector<std::string> lines;
+    std::ifstream in(log, std::ios::binary);
+    for (std::string line; std::getline(in, line);)
+        if (!line.empty() && line != "\r")
+            lines.push_back(line);
     ASSERT_EQ(1u, lines.size()) << (lines.empty() ? "" : lines[0] + " | " + lines.back());
     EXPECT_NE(std::string::npos, lines[0].find("ERR: ")) << lines[0];
     EXPECT_NE(std::string::npos, lines[0].find("character varying(3)")) << lines[0];
@@ -505,9 +489,7 @@ TEST(OdbcFiltersPostgres, AFailureFoundAtTheEndIsLoggedOnceOnOneLine)
 
 TEST(OdbcFiltersSqlite, ANulInsideAValueIsStoredWhole)
 {
-    PeerFolder folder;
-    if (!folder.Usable())
-        GTEST_SKIP() << "no Z:\\tmp in this Wine prefix";
+    Folder folder;
     std::string connect = "Driver=SQLite3;Database=" + folder.Path("werte.db");
     CQoOutputFilterODBC out;
     Prepare(out, connect, "t");
@@ -524,31 +506,6 @@ TEST(OdbcFiltersSqlite, ANulInsideAValueIsStoredWhole)
                                          " 'select hex(name) from t'])\n"
                                          "open(os.path.join(folder, 'hex.txt'), 'wb').write(out)\n"));
     EXPECT_EQ("61620063C3A4\n", ReadFileBytes(folder.Path("hex.txt")));
-}
-
-// PostgreSQL keeps no NUL in text: the value is refused, never cut.
-TEST(OdbcFiltersPostgres, ANulInsideAValueIsRefusedNotCut)
-{
-    Folder folder;
-    std::string connect = Connect(postgres, folder);
-    SKIP_WITHOUT(connect);
-    WriteRows(connect, "mit_nul");
-    std::string error = ErrorOf([&] {
-        CQoOutputFilterODBC out;
-        Prepare(out, connect, "mit_nul");
-        out.Init();
-        Put(out, kRows[0]);
-        CQoString value;
-        value.Assign("ab\0cd", 5);
-        out.InitRow();
-        out.Value(0, value);
-        out.Value(1, "2");
-        out.WriteRow();
-        out.ReleaseDB();
-    });
-    EXPECT_NE(std::string::npos, error.find("Datensatz 2")) << error;
-    EXPECT_NE(std::string::npos, error.find("name")) << error;
-    EXPECT_EQ(kRows, Query(connect, "select * from mit_nul"));
 }
 
 TEST(OdbcFiltersSqlite, FilesThatAreNoDatabaseGiveClearErrorsAndBatchModeReadsNothing)

@@ -1,8 +1,4 @@
-// The dBase and file-database input pages on real windows over real files: a dBase
-// file written byte by byte, Access-type databases made by the engine, the .mdb
-// fixture and an Excel workbook written by the host's Python. Tables are picked
-// with real clicks, the host's listener accepts or refuses, and the messages for
-// files that cannot be read are answered.
+// The dBase and file-database input pages on real windows over real files.
 #include <gtest/gtest.h>
 
 #include <afxcmn.h>
@@ -109,7 +105,6 @@ protected:
         ++m_nCalls;
         return m_nAnswer;
     }
-    // The page that the factory picks for the filter, shown in the frame.
     void Show(CQoInputFilter* pFilter, CRuntimeClass* pKind)
     {
         m_pPage = CInputFilterConfig::GetAppropriateConfig(pFilter, 7);
@@ -126,9 +121,6 @@ protected:
     int m_nCalls = 0;
     int m_nAnswer = 1;
 };
-
-// ---------------------------------------------------------------------------
-// dBase
 
 class DbasePageTest : public DbInputPageTest {
 protected:
@@ -169,14 +161,10 @@ TEST_F(DbasePageTest, AFileCutShortIsReportedAndThePreviewKeepsWhatItShowed)
     EXPECT_EQ("199", std::string((LPCSTR)Preview().GetItemText(199, 0)));
 }
 
-// ---------------------------------------------------------------------------
-// File databases
-
 class DaoPageTest : public DbInputPageTest {
 protected:
     CInputFilterConfigDao& Page() { return *static_cast<CInputFilterConfigDao*>(m_pPage); }
     CListCtrl& Tables() { return Page().m_tables; }
-    // "name:image:data" of every item, in the list's order, and the selected item's name.
     std::string Items()
     {
         std::string out;

@@ -1,6 +1,5 @@
-// The file-database and dBase output pages on real windows: real output filters
-// over an output source that reads a real delimited file. What reaches the filters
-// is checked; what the filters make of it in a file has tests of its own.
+// The file-database and dBase output pages on real windows: what reaches the
+// real output filters (what they write has tests of its own).
 #include <gtest/gtest.h>
 
 #include <afxcmn.h>
@@ -28,7 +27,6 @@ protected:
     bool Enabled(int id) const { return ::IsWindowEnabled(Item(id)) != FALSE; }
     qotest::Dialog Page() const { return qotest::Dialog(m_pPage->m_hWnd); }
 
-    // The text the list paints in each cell, "a|b|c" per row, rows joined by ",".
     std::string Cells(int listId, int columns)
     {
         CColoredListCtrl* list = dynamic_cast<CColoredListCtrl*>(CWnd::FromHandlePermanent(Item(listId)));
@@ -53,17 +51,12 @@ protected:
         qotest::Click(list, rc.left + 10, rc.CenterPoint().y);
         PumpApp(100);
     }
-    void Apply(int id) { ClickButton(id); }
 };
-
-// ---------------------------------------------------------------------------
-// File database
 
 class DaoOutputPageTest : public DbOutputPagesTest {
 protected:
     void Show() { DbOutputPagesTest::Show(new COutputFilterConfigDao(9, m_pFrame), &m_filter); }
     std::string Cells() { return DbOutputPagesTest::Cells(IDC_OUTDAO_LIST, 4); }
-    // "name:type/length[i],..." of the filter.
     std::string FilterColumns()
     {
         std::string out = std::string(m_filter.GetTableName().GetString()) + ":";
@@ -90,7 +83,7 @@ TEST_F(DaoOutputPageTest, TheUserSetsTypeLengthAndIndexAndTheFilterGetsThem)
     EXPECT_EQ("255", Page().Text(IDC_OUTDAO_FIELDLEN));
     qotest::TypeOver(Item(IDC_OUTDAO_FIELDLEN), "40");
     Page().Check(IDC_OUTDAO_INDEXED);
-    Apply(IDC_OUTDAO_APPLY);
+    ClickButton(IDC_OUTDAO_APPLY);
     EXPECT_EQ("Tabelle:Name=2/40i,Ort=2/255,PLZ=2/255", FilterColumns());
 
     // Numeric: no length to type, none shown; Enter applies with the table name typed.
@@ -107,7 +100,7 @@ TEST_F(DaoOutputPageTest, TheUserSetsTypeLengthAndIndexAndTheFilterGetsThem)
     Input("Name;Wohnort;PLZ\r\nM\xFCller;K\xF6ln;50667\r\n");
     m_pPage->RefreshDisplay();
     EXPECT_EQ("Name|Text|40|ja,Wohnort|Text|255|nein,PLZ|numerisch||nein", Cells());
-    Apply(IDC_OUTDAO_APPLY);
+    ClickButton(IDC_OUTDAO_APPLY);
     EXPECT_EQ("Kunden:Name=2/40i,Wohnort=2/255,PLZ=1/255", FilterColumns());
 }
 
@@ -144,7 +137,7 @@ TEST_F(DaoOutputPageTest, BadSettingsAreRefusedAndNothingReachesTheFilter)
         if (c.row >= 0) ClickRow(IDC_OUTDAO_LIST, c.row);
         Page().SetText(IDC_OUTDAO_TABLE, c.table);
         if (c.fieldLen) Page().SetText(IDC_OUTDAO_FIELDLEN, c.fieldLen);
-        EXPECT_EQ(c.message, qotest::MessageOf([&] { Apply(IDC_OUTDAO_APPLY); }));
+        EXPECT_EQ(c.message, qotest::MessageOf([&] { ClickButton(IDC_OUTDAO_APPLY); }));
         EXPECT_EQ(before, FilterColumns()) << "nothing reached the filter";
     }
     EXPECT_EQ("Name|Text|30|nein,Ort|||nein,PLZ|Text|20|nein", Cells()) << "only PLZ was accepted";
@@ -153,18 +146,14 @@ TEST_F(DaoOutputPageTest, BadSettingsAreRefusedAndNothingReachesTheFilter)
     ClickRow(IDC_OUTDAO_LIST, 1);
     Page().Select(IDC_OUTDAO_TYPE, 0);
     Page().SetText(IDC_OUTDAO_TABLE, "Kunden");
-    Apply(IDC_OUTDAO_APPLY);
+    ClickButton(IDC_OUTDAO_APPLY);
     EXPECT_EQ("Kunden:Name=2/30,Ort=2/30,PLZ=2/20", FilterColumns());
 }
-
-// ---------------------------------------------------------------------------
-// dBase
 
 class DbaseOutputPageTest : public DbOutputPagesTest {
 protected:
     void Show() { DbOutputPagesTest::Show(new COutputFilterConfigDbase(10, m_pFrame), &m_filter); }
     std::string Cells() { return DbOutputPagesTest::Cells(IDC_OUTDBF_LIST, 3); }
-    // "name:type/length,..." of the filter's field descriptions.
     std::string Fields()
     {
         std::string out;
@@ -190,7 +179,7 @@ TEST_F(DbaseOutputPageTest, TheUserSetsTypeAndLengthAndTheFilterGetsThem)
     ClickRow(IDC_OUTDBF_LIST, 2);
     Page().Select(IDC_OUTDBF_TYPE, 1);
     EXPECT_FALSE(Enabled(IDC_OUTDBF_FIELDLEN));
-    Apply(IDC_OUTDBF_APPLY);
+    ClickButton(IDC_OUTDBF_APPLY);
     // Numeric fields are 8 digits wide whatever length the page holds.
     EXPECT_EQ("Name:C/20,Ort:C/255,PLZ:N/8", Fields());
     EXPECT_EQ("Name|Text|20,Ort|Text|255,PLZ|numerisch|", Cells());
@@ -202,12 +191,12 @@ TEST_F(DbaseOutputPageTest, TheUserSetsTypeAndLengthAndTheFilterGetsThem)
     for (const char* typed : {"0", "256"}) {
         SCOPED_TRACE(typed);
         Page().SetText(IDC_OUTDBF_FIELDLEN, typed);
-        EXPECT_EQ(range, qotest::MessageOf([&] { Apply(IDC_OUTDBF_APPLY); }));
+        EXPECT_EQ(range, qotest::MessageOf([&] { ClickButton(IDC_OUTDBF_APPLY); }));
         EXPECT_EQ("Name:C/20,Ort:C/255,PLZ:N/8", Fields()) << "nothing reached the filter";
         EXPECT_EQ(Item(IDC_OUTDBF_FIELDLEN), ::GetFocus());
     }
     Page().SetText(IDC_OUTDBF_FIELDLEN, "1");
-    Apply(IDC_OUTDBF_APPLY);
+    ClickButton(IDC_OUTDBF_APPLY);
     EXPECT_EQ("Name:C/20,Ort:C/1,PLZ:N/8", Fields());
 
     // A new page over the filter shows its fields; renamed columns start as text of 255.

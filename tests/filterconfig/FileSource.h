@@ -1,6 +1,4 @@
-// The host of an output page, as an application of the family is: its output
-// source is the rows of a delimited input file, so that the output page tests
-// write what a real file holds.
+// The host of an output page: its output source is a real delimited input file.
 #pragma once
 
 #include <COutputFilterConfig.h>

@@ -1,5 +1,4 @@
-// The delimited text page and the input previews on real windows over files the
-// tests write, driven as a user drives them.
+// The delimited text page and the input previews on real windows.
 #include <gtest/gtest.h>
 
 #include <memory>
@@ -42,9 +41,6 @@ std::string Rows(int rows, int cols)
     }
     return s;
 }
-
-// ---------------------------------------------------------------------------
-// The previews
 
 class PreviewTest : public qotest::HostFrameTest {
 protected:
@@ -141,9 +137,6 @@ TEST(InputFilterConfigTest, PicksThePageByTheFiltersType)
     }
 }
 
-// ---------------------------------------------------------------------------
-// The delimited text page
-
 const int kPageId = 77;
 
 class TextVarPageTest : public qotest::HostFrameTest, public CModifiedListener {
@@ -186,7 +179,6 @@ protected:
         Page().Press(id);
         qotest::PumpApp(100);
     }
-    // The filter's settings in one line, to see that nothing changed.
     std::string State()
     {
         return std::string{m_filter.Delimiter(), '/', m_filter.Encloser(), '/'} + std::to_string(m_filter.Skip()) +

@@ -1,5 +1,4 @@
-// The fixed-length and delimited text output pages on real windows: real output
-// filters over an output source that reads a real delimited file.
+// The fixed-length and delimited text output pages on real windows.
 #include <gtest/gtest.h>
 
 #include <afxcmn.h>
@@ -24,15 +23,11 @@ using qotest::PumpApp;
 
 using OutputTextPagesTest = qotest::OutputPageTest;
 
-// ---------------------------------------------------------------------------
-// Fixed-length output
-
 class FixedPageTest : public OutputTextPagesTest {
 protected:
     COutputFilterConfigTextFix* Page() { return static_cast<COutputFilterConfigTextFix*>(m_pPage); }
     void Show() { OutputTextPagesTest::Show(new COutputFilterConfigTextFix(7, m_pFrame), &m_filter); }
 
-    // "offset+length,..." of the page's columns.
     std::string Columns()
     {
         std::string out;
@@ -41,7 +36,6 @@ protected:
             out += (i ? "," : "") + std::to_string(col.nOffset) + "+" + std::to_string(col.nLength);
         return out;
     }
-    // "name=length,..." of the filter.
     std::string FilterColumns()
     {
         std::string out;
@@ -169,9 +163,6 @@ TEST_F(FixedPageTest, CellsShowTheirColoursAndRowsThePageNoLongerHasStayEmpty)
     EXPECT_EQ(row2.Width() * row2.Height(), qotest::CountPixels(img, row2, ListView_GetBkColor(List())))
         << "row 2 is empty";
 }
-
-// ---------------------------------------------------------------------------
-// Delimited output
 
 class DelimitedPageTest : public OutputTextPagesTest {
 protected:

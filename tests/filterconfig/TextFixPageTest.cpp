@@ -1,7 +1,4 @@
-// The fixed-length text page on real windows over files the tests write: column
-// marks set, deleted and moved with the mouse on the text-format control and
-// checked by what reaches the filter on apply and by the lines on the screen;
-// record length, spin and character set; a file that went away.
+// The fixed-length text page on real windows over files the tests write.
 #include <gtest/gtest.h>
 
 #include <string>

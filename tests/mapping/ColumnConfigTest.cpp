@@ -1,7 +1,5 @@
-// The column configuration page on a real window over a delimited file: fields
-// and values chosen in the lists, the preview's popup menu and column headers
-// used with the real mouse, and what the page shows read from the controls and
-// from captured pixels.
+// The column configuration page on a real window over a delimited file, used
+// with the real mouse.
 #include <gtest/gtest.h>
 
 #include <CQoInputFilterTextVar.h>
@@ -260,16 +258,14 @@ TEST_F(ColumnConfigTest, RightClickOnAColumnOffersItsValues)
     EXPECT_EQ(2, m_page.Fields().GetCurSel());
     EXPECT_EQ(kIdR, m_page.Value(2));
     EXPECT_EQ(std::vector<int>{kNotifierId}, m_listener.m_ids);
-}
 
-TEST_F(ColumnConfigTest, NoMenuRightOfTheLastColumn)
-{
-    qotest::MenuDriver menus;
-    menus.SetReportFailures(false);
-    m_page.Preview().SetColumnWidth(3, 30);  // room to the right of the last column
+    // Right of the last column there is no menu.
+    qotest::MenuDriver none;
+    none.SetReportFailures(false);
+    m_page.Preview().SetColumnWidth(3, 30);
     const CRect last = CaptionCell(3, 2);
     RightClick(m_page.Preview().m_hWnd, CPoint(last.right + 15, last.top + 2));
-    EXPECT_EQ(0, menus.Seen());
+    EXPECT_EQ(0, none.Seen());
 }
 
 }  // namespace

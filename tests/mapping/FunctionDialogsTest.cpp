@@ -1,6 +1,4 @@
-// The function dialogs on real windows: combinations composed by choosing
-// functions and answering the separator question, the function manager
-// dialog's lists and buttons, names typed into the input dialog and refusals.
+// The combination and function manager dialogs on real windows.
 #include <gtest/gtest.h>
 
 #include <sstream>

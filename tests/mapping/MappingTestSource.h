@@ -1,5 +1,4 @@
-// A host's output source for the mapping tests: a table of inner columns held
-// in memory, which counts how often it is asked for what.
+// A host's output source for the mapping tests: a table held in memory.
 #pragma once
 
 #include <COutputFilterSource.h>
@@ -29,17 +28,12 @@ public:
     {
         ++valueCalls;
         lastRow = row;
-        lastFlag = -1;
         if (row < 0 || row >= static_cast<long>(m_rows.size()))
             ADD_FAILURE() << "the host was asked for row " << row << " of " << m_rows.size();
         else
             value = m_rows[row].at(column).c_str();
     }
-    void GetSourceName(int column, CString& name, int flag) override
-    {
-        lastFlag = flag;
-        name = m_names.at(column).c_str();
-    }
+    void GetSourceName(int column, CString& name, int) override { name = m_names.at(column).c_str(); }
     int NumSourceColumns() override { return static_cast<int>(m_names.size()); }
     long NumSourceRows() override { return static_cast<long>(m_rows.size()); }
 
@@ -83,7 +77,6 @@ public:
 
     int valueCalls = 0;
     long lastRow = -1;
-    int lastFlag = -1;
 
 private:
     std::vector<std::string> m_names;

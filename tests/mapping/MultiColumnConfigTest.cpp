@@ -1,9 +1,5 @@
-// The combination field page on real windows over a delimited file: in read mode
-// the file's columns are split by their functions' combinations, in write mode
-// output columns are made, named, given functions (lists and the preview's popup
-// menu), reordered by dragging a header with the real mouse and replaced by all
-// functions; the split and composed values are read through the page's filter and
-// source, the dialogs it opens answered as a user would.
+// The combination field page on real windows over a delimited file: columns
+// split by their functions in read mode, composed in write mode.
 #include <gtest/gtest.h>
 
 #include <CQoInputFilterTextVar.h>

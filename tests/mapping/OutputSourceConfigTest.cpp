@@ -1,7 +1,4 @@
-// The output source page on a real window over a host's source: ticks by real
-// clicks and the space bar, an item dragged to the top, each written into the
-// source at once and told to the host only when it changed the output; the list
-// and source out of step; Enter and Escape.
+// The output source page on a real window over a host's source.
 #include <gtest/gtest.h>
 
 #include <COutputFilterSourceConfig.h>
@@ -79,7 +76,6 @@ protected:
         }
         return texts;
     }
-    // "name:inner column" of every entry, "-" before an unselected one.
     std::string Entries()
     {
         std::string out;
@@ -172,8 +168,7 @@ TEST_F(OutputSourceConfigTest, ListAndSourceOutOfStep)
 
 TEST_F(OutputSourceConfigTest, AnItemNamingAColumnTheHostNoLongerHasIsNotWrittenBack)
 {
-    // The host drops its last two columns and rebuilds its entries; the list still shows four.
-    m_source.columnLimit = 2;
+    m_source.columnLimit = 2;  // the list still shows four
     m_source.InitArray();
     ClickBox(0);
     EXPECT_EQ("-Name:0 Vorname:1", Entries());

@@ -1,13 +1,6 @@
-// Independent peers for the file-format tests: the host's Python 3 with the
-// Debian packages python3-dbf (writes dBase files), python3-dbfread (reads
-// them) and the csv module.
-//
-// A test writes a Python script and its data into a PeerFolder and runs it
-// with RunPython; the script leaves its findings in files of the folder. On
-// Linux the folder is a temporary folder and Python runs directly. Under Wine
-// the folder is made below Z:\tmp (Wine's view of the host's /tmp) and
-// Python is started through Wine's `start /wait /unix`; when that is not
-// possible the peer check is skipped (and says so).
+// Independent peers: the host's Python 3 (python3-dbf, dbfread, openpyxl, csv) runs a
+// script in a PeerFolder and leaves its findings there. Under Wine the folder is below
+// Z:\tmp and Python starts through `start /wait /unix`; where it cannot, the check skips.
 #pragma once
 
 #include <gtest/gtest.h>
@@ -52,7 +45,6 @@ public:
     PeerFolder &operator=(PeerFolder const &) = delete;
 
     bool Usable() const { return !m_path.empty(); }
-    // Path as this program opens it, and as the host's Python opens it.
     std::string Path(char const *name) const { return (m_path / name).string(); }
     std::string UnixPath(char const *name) const { return m_unix + "/" + name; }
 
@@ -69,16 +61,11 @@ inline std::string ReadFileBytes(std::string const &path)
     return all.str();
 }
 
-// Writes `script` as <name>.py into the folder and runs it with the folder
-// (host path) as its only argument. Answers false when Python could not be
-// run or the script failed (its traceback is printed); waits at most two
-// minutes.
+// Runs `script` with `folder` bound to the folder; false (traceback printed) on failure.
 inline bool RunPython(PeerFolder const &folder, char const *name, std::string const &script)
 {
     std::string file = std::string(name) + ".py";
     {
-        // The script body runs inside try: a failure leaves its traceback in
-        // "failed", success leaves "done".
         std::string body;
         std::istringstream lines(script);
         for (std::string line; std::getline(lines, line);)
@@ -93,12 +80,10 @@ inline bool RunPython(PeerFolder const &folder, char const *name, std::string co
     }
     std::remove(folder.Path("done").c_str());
     std::remove(folder.Path("failed").c_str());
-#ifdef _WIN32
-    std::string command = "start /wait /unix /usr/bin/python3 " + folder.UnixPath(file.c_str()) + " " +
-                          folder.UnixPath("").substr(0, folder.UnixPath("").size() - 1) + " >NUL 2>&1";
-#else
     std::string command = "/usr/bin/python3 " + folder.UnixPath(file.c_str()) + " " +
                           folder.UnixPath("").substr(0, folder.UnixPath("").size() - 1);
+#ifdef _WIN32
+    command = "start /wait /unix " + command + " >NUL 2>&1";
 #endif
     std::system(command.c_str());
     // Wine's start does not wait for a host program: wait for its answer.

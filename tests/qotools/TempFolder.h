@@ -1,8 +1,9 @@
 // A folder of its own for each test, removed afterwards.
 #pragma once
 
-#include <cstdio>
 #include <filesystem>
+#include <fstream>
+#include <iterator>
 #include <random>
 #include <string>
 #include <system_error>
@@ -34,22 +35,11 @@ private:
 // Whole files as bytes, written and read without any library code in between.
 inline std::string ReadBytes(std::string const &path)
 {
-    std::string data;
-    if (std::FILE *fp = std::fopen(path.c_str(), "rb")) {
-        char chunk[4096];
-        std::size_t n;
-        while ((n = std::fread(chunk, 1, sizeof chunk, fp)) > 0)
-            data.append(chunk, n);
-        std::fclose(fp);
-    }
-    return data;
+    std::ifstream in(path, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
 }
 
 inline void WriteBytes(std::string const &path, std::string const &data)
 {
-    std::FILE *fp = std::fopen(path.c_str(), "wb");
-    if (fp) {
-        std::fwrite(data.data(), 1, data.size(), fp);
-        std::fclose(fp);
-    }
+    std::ofstream(path, std::ios::binary) << data;
 }

@@ -176,7 +176,6 @@ TEST_F(DaoRecordsetTest, EditAndDeleteChangeTheCurrentRecord) {
   rs.Edit();
   rs.SetFieldValue("Text", "zwei");
   rs.Update();
-  EXPECT_EQ(CString("zwei"), TextOf(rs.GetFieldValue("Text")));
   rs.MoveNext();
   rs.Delete();
   EXPECT_EQ(3167, DaoError([&] { rs.GetFieldValue(0); }).lCode);

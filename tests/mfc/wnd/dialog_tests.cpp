@@ -14,11 +14,8 @@ namespace {
 
 const char kExtDll[] = "mfc_wnd_testext.dll";
 
-// The extension DLL stays loaded for the dialog tests; the chain test loads and
-// unloads it on its own first.
-class ExtensionChainTest : public ::testing::Test {};
-
-TEST_F(ExtensionChainTest, ResourcesOfALoadedExtensionDllAreFoundAndGoneAfterUnload) {
+// Runs before DialogTest keeps the extension DLL loaded.
+TEST(ExtensionChainTest, ResourcesOfALoadedExtensionDllAreFoundAndGoneAfterUnload) {
   ASSERT_EQ(NULL, ::GetModuleHandleA(kExtDll)) << "run this test before the DLL is loaded for good";
   CString str;
   EXPECT_FALSE(str.LoadString(IDS_EXT_ONLY));

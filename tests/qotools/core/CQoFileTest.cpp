@@ -39,12 +39,9 @@ int Code(void (*f)(CQoFile &), CQoFile &file)
 
 } // namespace
 
-// --- character sets --------------------------------------------------------
-
+// Windows-1252 from 0xA0 up survives code page 850 there and back.
 TEST(CQoFileCharSet, AsciiWritesDos850AndReadsBackWindows1252)
 {
-    // Every character of Windows-1252 from 0xA0 up exists in code page 850
-    // and survives the way there and back; the umlauts land on their DOS bytes.
     TempFolder tmp;
     std::string path = tmp.Path("dos.txt");
     std::string latin;
@@ -114,8 +111,6 @@ TEST(CQoFileCharSet, CanBeChosenAfterOpening)
     EXPECT_EQ(kAnsiUmlauts, std::string(buffer, 7));
 }
 
-// --- lines -----------------------------------------------------------------
-
 TEST(CQoFileLines, SplitsAtCrLfLfAndCrAndKeepsTheLastLine)
 {
     TempFolder tmp;
@@ -163,8 +158,6 @@ TEST(CQoFileLines, TextModeTranslatesLineEndsAndBinaryModeDoesNot)
     n = binary.Read(buffer, sizeof buffer);
     EXPECT_EQ("a\r\nb\r\nc\r\nd\r\n", std::string(buffer, n));
 }
-
-// --- opening, positions, errors ---------------------------------------------
 
 TEST(CQoFileOpen, ModesCreateTruncateAppendAndOverwrite)
 {
@@ -252,20 +245,11 @@ TEST(CQoFileOpen, ErrorsNameTheFileOrAreQuietOnRequest)
     char buffer[4];
     EXPECT_EQ(0u, closed.Read(buffer, 4, false));
     EXPECT_EQ(CQoException::notOpen, Code([](CQoFile &f) { f.Write("x", 1); }, closed));
-
     WriteBytes(path, "data");
     CQoFile reader(path.c_str(), CQoFile::read);
-    try {
-        reader.Write("x", 1);
-        FAIL();
-    } catch (CQoException const &e) {
-        EXPECT_EQ(CQoException::writeError, e.Code());
-        EXPECT_NE(std::string::npos, std::string(e.Message()).find("err.txt"));
-    }
+    EXPECT_EQ(CQoException::writeError, Code([](CQoFile &f) { f.Write("x", 1); }, reader));
     EXPECT_EQ("data", ReadBytes(path));
 }
-
-// --- replacing files ---------------------------------------------------------
 
 #ifdef _WIN32
 #include <windows.h> // last: its macros clash with the names above
@@ -295,8 +279,6 @@ TEST(CQoFileReplace, AReadOnlyTargetIsRefusedAndKeptAsItWas)
     EXPECT_EQ("neu", ReadBytes(target));
 }
 
-// An output beside a target whose path is longer than the old 260-character
-// limit is written and put in place as an input of that length is read.
 TEST(CQoFileReplace, PathsBeyond260Characters)
 {
     TempFolder tmp;

@@ -96,8 +96,6 @@ Row HexFields(std::string const &line)
 
 } // namespace
 
-// --- files written by python3-dbf, read back by dbfread -------------------------------------------------
-
 TEST(DbaseInputPeer, EveryValueAndRowPositionAgreesWithDbfread)
 {
     PeerFolder folder;
@@ -149,12 +147,9 @@ with open(os.path.join(folder, 'expected.txt'), 'w') as out:
         names.push_back(name.Str());
     }
     EXPECT_EQ(HexFields(ReadPeerLines(folder.Path("names.txt")).at(0)), names);
-    EXPECT_EQ("GR\xF6SSE", names.at(2));
 
     EXPECT_FALSE(dbf.AbsoluteRow(long(expected.size())));
 }
-
-// --- hand-made files ----------------------------------------------------------
 
 TEST(DbaseInputFormat, TheCodePageByteOrElseTheFilterDecides)
 {
@@ -210,8 +205,6 @@ TEST(DbaseInputFormat, EmptyTablesAndDeletedRecordsEverywhere)
     EXPECT_TRUE(dbf.IsDeleted());
     EXPECT_EQ("r12", CurrentRow(dbf)[0]);
 }
-
-// --- damaged files ----------------------------------------------------------------
 
 TEST(DbaseInputDamaged, HeadersThatAreNotDbaseRaiseClearErrors)
 {
@@ -330,8 +323,6 @@ TEST(DbaseInputDamaged, FileCutWhileReading)
     }
     EXPECT_TRUE(raised);
 }
-
-// --- settings ------------------------------------------------------------------------
 
 TEST(DbaseInputConfig, SettingsRoundTripThroughTheConfigurationFile)
 {

@@ -57,8 +57,6 @@ protected:
 
 } // namespace
 
-// --- splitting input columns ---------------------------------------------------
-
 TEST(MultiColumnSplitting, CutsEachValueAtItsSeparators)
 {
     struct Part {
@@ -151,8 +149,6 @@ TEST_F(MultiColumnSplit, FilterNamesItsColumnsAfterInnerOrOuterColumns)
     EXPECT_EQ("Person", Name(file, 0));
 }
 
-// --- rules of the mapping ---------------------------------------------------------
-
 TEST(MultiColumnRules, RefusesWhatCannotBeMapped)
 {
     MemoryInputFilter file = AddressFile();
@@ -196,8 +192,6 @@ TEST(MultiColumnRules, RemovingColumnsRemovesTheirAssignments)
     EXPECT_FALSE(h.DeleteColumn(false, 1));
 }
 
-// --- composing output columns ---------------------------------------------------------
-
 namespace {
 
 // The functions' values: Name, Vorname, Titel, PLZ, Ort.
@@ -237,7 +231,7 @@ protected:
 
 } // namespace
 
-TEST_F(MultiColumnCompose, SeparatorsStandOnlyBeforeValuesUnlessAlways)
+TEST_F(MultiColumnCompose, SeparatorsStandOnlyBeforeValuesUnlessAlwaysAndNamesAndLengths)
 {
     FillCompose(h);
     SourcePtr out(h.CreateMultiColumnOutputSource());
@@ -248,12 +242,6 @@ TEST_F(MultiColumnCompose, SeparatorsStandOnlyBeforeValuesUnlessAlways)
     EXPECT_EQ((Rows{{"Meier, Hans Dr.", "D-53111 Bonn"}, {"Schulz", " K\xF6ln"}, {", Otto", "D-95028 "}}),
               AllRows(rows));
     EXPECT_EQ("", Val(*out, 3, 0));
-}
-
-TEST_F(MultiColumnCompose, NamesAndLengthsOfComposedColumns)
-{
-    FillCompose(h);
-    SourcePtr out(h.CreateMultiColumnOutputSource());
     EXPECT_EQ("D-PLZ Ort", Name(*out, 1)); // no name of its own: its parts
     EXPECT_EQ(30 + 20 + 2 + 10 + 1, out->GetDataLength(0));
     EXPECT_EQ(2 + 5 + 1 + 25, out->GetDataLength(1));
@@ -297,8 +285,6 @@ TEST_F(MultiColumnCompose, SourceMadeFirstFollowsTheMappingAsAPageBuildsIt)
     EXPECT_EQ(0, out->GetNumRows());
     EXPECT_EQ("", Val(*out, 0, 0));
 }
-
-// --- settings ----------------------------------------------------------------------------
 
 TEST_F(MultiColumnCompose, MappingRoundTripsThroughAConfigurationFile)
 {

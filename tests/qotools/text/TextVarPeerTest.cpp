@@ -1,6 +1,4 @@
 // The delimited reader against Python's csv module reading the same files.
-// The peer is the host's Python, started natively or through Wine's start
-// /unix (see PythonPeer.h).
 #include "CQoInputFilterTextVar.h"
 
 #include "PythonPeer.h"

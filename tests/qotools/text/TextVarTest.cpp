@@ -246,10 +246,8 @@ TEST(TextVarSettings, ConfigurationRoundTripAndBadValues)
     a.SetFirstRowHasNames(true);
     CQoConfigFile cfg;
     a.WriteConfig(cfg, "Eingabe");
-    CQoConfigFile reread;
-    reread.FromText(cfg.ToText().GetString(), static_cast<std::size_t>(cfg.ToText().GetLength()));
     CQoInputFilterTextVar b;
-    b.ReadConfig(reread, "Eingabe");
+    b.ReadConfig(cfg, "Eingabe");
     EXPECT_EQ('\t', b.Delimiter());
     EXPECT_EQ('\'', b.Encloser());
     EXPECT_EQ('\\', b.Escape());

@@ -14,6 +14,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <map>
+#include <sstream>
 #include <string>
 #include <utility>
 #include <vector>
@@ -22,8 +23,6 @@ namespace {
 
 using Cell = CQoXlsxReader::Cell;
 
-// Two sheets; the second starts at C3 and has a gap row, so its range does
-// not start at A1.
 char const writeWorkbooks[] = R"(
 import datetime, xlsxwriter
 rows = [
@@ -58,8 +57,6 @@ for epoch in (1900, 1904):
                 ws2.write(r + (1 if r > 2 else 0), c, v)
     wb.close()
 
-# Texts as Excel escapes them (_xHHHH_), in shared and in inline strings; the
-# writer's own input is the expected value.
 escapes = ['_x0041_ w\u00f6rtlich', 'a\x01b', 'Zeile\r\nZwei', 'Tab\tEnde', '_x005F_', '\u20ac_x20AC_']
 for name, options in (('escapes_shared', {}), ('escapes_inline', {'constant_memory': True})):
     wb = xlsxwriter.Workbook(os.path.join(folder, name + '.xlsx'), options)
@@ -106,16 +103,6 @@ std::string FromHex(std::string const &hex)
     return bytes;
 }
 
-std::vector<std::string> Split(std::string const &line)
-{
-    std::vector<std::string> parts;
-    std::size_t start = 0;
-    for (std::size_t tab; (tab = line.find('\t', start)) != std::string::npos; start = tab + 1)
-        parts.push_back(line.substr(start, tab - start));
-    parts.push_back(line.substr(start));
-    return parts;
-}
-
 std::string Number(int type, double value)
 {
     char text[40];
@@ -132,7 +119,11 @@ std::vector<PeerSheet> ReadPeer(std::string const &path)
 {
     std::vector<PeerSheet> sheets;
     for (std::string const &line : ReadPeerLines(path)) {
-        std::vector<std::string> p = Split(line);
+        std::vector<std::string> p;
+        std::istringstream fields(line);
+        for (std::string part; std::getline(fields, part, '\t');)
+            p.push_back(part);
+        p.resize(4);
         if (p[0] == "sheet") {
             sheets.push_back(PeerSheet{FromHex(p[1]), {}});
             continue;
@@ -326,8 +317,6 @@ TEST(XlsxHandMade, EveryCellKindAndLayoutReads)
     EXPECT_FALSE(reader.NextRow(row));
 }
 
-// Damaged and foreign files: each raises CQoException with a German text
-// that says what is wrong and names the file.
 char const writeFaults[] = R"(
 import io, zipfile, xlwt, openpyxl
 wb = openpyxl.Workbook()
@@ -397,8 +386,7 @@ TEST(XlsxFaults, DamagedAndForeignFilesRaiseAClearErrorOddButSoundOnesRead)
     PeerFolder folder;
     if (!folder.Usable() || !RunPython(folder, "faults", writeFaults))
         PEER_UNAVAILABLE();
-    // A password-protected workbook: an OLE compound file whose directory
-    // names the stream EncryptedPackage.
+    // Password-protected: an OLE file naming the stream EncryptedPackage.
     std::string ole("\xD0\xCF\x11\xE0\xA1\xB1\x1A\xE1", 8);
     ole.resize(1024, '\0');
     for (char c : std::string("EncryptedPackage"))
@@ -440,13 +428,11 @@ TEST(XlsxFaults, DamagedAndForeignFilesRaiseAClearErrorOddButSoundOnesRead)
             EXPECT_NE(std::string::npos, std::string(e.Message()).find(c.says)) << e.Message();
             EXPECT_NE(std::string::npos, std::string(e.Message()).find(path)) << e.Message();
         }
-        if (c.atOpen) {
+        if (c.atOpen)
             EXPECT_FALSE(reader.IsOpen());
-        }
     }
 
-    // Sizes come from the central directory: stored members and a local header
-    // whose CRC and sizes are 0 read as the original.
+    // Sizes come from the central directory: stored and zeroed local headers read alike.
     auto firstColumn = [&](char const *file) {
         CQoXlsxReader reader;
         reader.Open(folder.Path(file).c_str());
