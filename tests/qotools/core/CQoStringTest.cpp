@@ -15,6 +15,18 @@ TEST(CQoString, ComparesBytesUnsignedAndKeepsBytesAfterANul)
     bytes.Assign("a\0b", 3);
     bytes.Append("\0c", 2);
     EXPECT_EQ(std::string("a\0b\0c", 5), bytes.Str());
+
+    // One value reused for field after field: every length up and down
+    // (short values are written in place, long ones through the library).
+    std::string const source = "0123456789abcdefghijklmnopqrstuvwxyz";
+    for (std::size_t from = 0; from <= 20; ++from)
+        for (std::size_t to = 0; to <= 20; ++to) {
+            CQoString value;
+            value.Assign(source.data() + 1, from);
+            value.Assign(source.data() + to % 7, to);
+            ASSERT_EQ(source.substr(to % 7, to), value.Str()) << from << " -> " << to;
+            ASSERT_EQ('\0', value.GetString()[to]);
+        }
 }
 
 TEST(CQoString, FormatsTextOfAnyLengthAndItsOwnText)
