@@ -1,5 +1,7 @@
 #include "CQoFile.h"
 
+#include "QoBytes.h"
+
 #include "CQoException.h"
 #include "QoPathParts.h"
 
@@ -566,7 +568,7 @@ void CQoFile::Write(void const *data, std::size_t count)
         while (count > 0) {
             std::size_t room = m_bufferSize - m_end;
             std::size_t n = count < room ? count : room;
-            std::memcpy(m_buffer.get() + m_end, src, n);
+            qobytes::Copy(m_buffer.get() + m_end, src, n);
             m_end += n;
             src += n;
             count -= n;

@@ -1,10 +1,10 @@
 #include "CQoString.h"
 
 #include "CQoException.h"
+#include "QoBytes.h"
 
 #include <array>
 #include <cstdarg>
-#include <cstdint>
 #include <cstdio>
 #include <cstring>
 #include <utility>
@@ -102,31 +102,6 @@ CQoString &CQoString::operator+=(char ch)
 }
 
 #if defined(_WIN32)
-// Copies 1 to 16 bytes with fixed-size moves, which the compiler turns into
-// plain loads and stores. The C runtime under Wine copies the last bytes of a
-// block with string instructions, several nanoseconds for a field value of a
-// few bytes; the C library natively is faster than these branches, so only
-// the Windows build takes this path.
-static inline void CopyShort(char *to, char const *from, std::size_t length)
-{
-    if (length >= 8) {
-        std::uint64_t head, tail;
-        std::memcpy(&head, from, 8);
-        std::memcpy(&tail, from + length - 8, 8);
-        std::memcpy(to, &head, 8);
-        std::memcpy(to + length - 8, &tail, 8);
-    } else if (length >= 4) {
-        std::uint32_t head, tail;
-        std::memcpy(&head, from, 4);
-        std::memcpy(&tail, from + length - 4, 4);
-        std::memcpy(to, &head, 4);
-        std::memcpy(to + length - 4, &tail, 4);
-    } else if (length > 0) {
-        to[0] = from[0];
-        to[length / 2] = from[length / 2];
-        to[length - 1] = from[length - 1];
-    }
-}
 constexpr std::size_t kShortValue = 15; // what every std::string holds without allocating
 #endif
 
@@ -143,7 +118,7 @@ void CQoString::Assign(char const *data, std::size_t length)
             // kShortValue bytes), then the length follows through inline
             // members: erase shortens, push_back lengthens (and writes the
             // end mark after each byte, so it takes the bytes from `data`).
-            CopyShort(&m_str[0], data, length);
+            qobytes::Copy(&m_str[0], data, length);
             if (length <= m_str.size())
                 m_str.erase(length);
             else

@@ -1,5 +1,7 @@
 #include "CQoOutputFilterDbase.h"
 
+#include "../core/QoBytes.h"
+
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 #include "DbaseFormat.h"
@@ -263,7 +265,7 @@ void CQoOutputFilterDbase::FormatValue(int col, std::string const &value, char *
             n = length;
             ++m_llTruncated;
         }
-        std::memcpy(out, value.data(), n);
+        qobytes::Copy(out, value.data(), n);
         return;
     }
     case 'N':

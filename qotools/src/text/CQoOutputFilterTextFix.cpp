@@ -1,5 +1,7 @@
 #include "CQoOutputFilterTextFix.h"
 
+#include "../core/QoBytes.h"
+
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 #include "CQoFile.h"
@@ -106,7 +108,7 @@ void CQoOutputFilterTextFix::BuildRecord(std::string &record)
             n = length;
             ++m_llTruncated;
         }
-        std::memcpy(out, value.data(), n);
+        qobytes::Copy(out, value.data(), n);
         if (m_bCrLf)
             for (std::size_t k = 0; k < n; ++k)
                 if (out[k] == '\r' || out[k] == '\n')

@@ -1,5 +1,7 @@
 #include "CQoOutputFilterTextVar.h"
 
+#include "../core/QoBytes.h"
+
 #include "CQoConfigFile.h"
 #include "CQoException.h"
 #include "CQoFile.h"
@@ -65,7 +67,7 @@ void CQoOutputFilterTextVar::AppendField(std::string &out, std::string const &va
                 break;
             }
         if (plain) {
-            out += value;
+            qobytes::Append(out, value.data(), value.size());
             return;
         }
     }

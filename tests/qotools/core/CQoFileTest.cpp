@@ -159,6 +159,27 @@ TEST(CQoFileLines, TextModeTranslatesLineEndsAndBinaryModeDoesNot)
     EXPECT_EQ("a\r\nb\r\nc\r\nd\r\n", std::string(buffer, n));
 }
 
+TEST(CQoFileOpen, WritesEveryBlockLengthThroughItsBuffer)
+{
+    // Blocks of 0 to 300 bytes in turn, across the buffer's edges: short
+    // blocks are copied by other code than long ones.
+    TempFolder tmp;
+    std::string path = tmp.Path("blocks.bin");
+    std::string expected;
+    {
+        CQoFile file(1);
+        ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
+        for (std::size_t n = 0; n <= 300; ++n) {
+            std::string block;
+            for (std::size_t i = 0; i < n; ++i)
+                block += static_cast<char>('A' + (n + i) % 53);
+            file.Write(block.data(), block.size());
+            expected += block;
+        }
+    }
+    EXPECT_EQ(expected, ReadBytes(path));
+}
+
 TEST(CQoFileOpen, ModesCreateTruncateAppendAndOverwrite)
 {
     TempFolder tmp;
