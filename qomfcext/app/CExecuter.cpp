@@ -176,7 +176,7 @@ void CExecuter::RunModule()
     std::vector<std::vector<char>> texts(static_cast<std::size_t>(argc));
     std::vector<char*> argv(static_cast<std::size_t>(argc) + 1, nullptr);
     for (int i = 0; i < argc; ++i) {
-        const std::string& strArg = m_arrArgs[i].Str();
+        std::string_view strArg = m_arrArgs[i].Str();
         texts[i].assign(strArg.begin(), strArg.end());
         texts[i].push_back('\0');
         argv[i] = texts[i].data();

@@ -79,8 +79,8 @@ public:
 private:
     void Finish();
     void BuildRecord(std::string &record);
-    void FormatValue(int col, std::string const &value, char *out);
-    [[noreturn]] void BadValue(int col, std::string const &value, char const *why) const;
+    void FormatValue(int col, std::string_view value, char *out);
+    [[noreturn]] void BadValue(int col, std::string_view value, char const *why) const;
 
     std::vector<CDbaseField> m_fields;
     std::vector<CDbaseField> m_fileFields; // as written (names made valid)

@@ -16,6 +16,7 @@
 
 #include <cstddef>
 #include <string>
+#include <string_view>
 
 #if defined(__GNUC__)
 #  define QO_PRINTF_FORMAT(fmt, args) __attribute__((format(printf, fmt, args)))
@@ -29,14 +30,15 @@ public:
     CQoString(char const *text);
     CQoString(char const *text, int length);
     CQoString(char ch, int count = 1);
-    CQoString(std::string text);
-    CQoString(CQoString const &) = default;
-    CQoString(CQoString &&) noexcept = default;
-    ~CQoString() = default;
+    CQoString(std::string const &text);
+    explicit CQoString(std::string_view text);
+    CQoString(CQoString const &other);
+    CQoString(CQoString &&other) noexcept;
+    ~CQoString();
 
     // --- assignment and concatenation ------------------------------------
-    CQoString &operator=(CQoString const &) = default;
-    CQoString &operator=(CQoString &&) noexcept = default;
+    CQoString &operator=(CQoString const &other);
+    CQoString &operator=(CQoString &&other) noexcept;
     CQoString &operator=(char const *text);
     CQoString &operator=(char ch);
 
@@ -50,13 +52,14 @@ public:
     void Append(char const *data, std::size_t length);
 
     // --- access ----------------------------------------------------------
-    operator char const *() const { return m_str.c_str(); }
-    char const *GetString() const { return m_str.c_str(); }
-    std::string const &Str() const { return m_str; }
+    operator char const *() const { return m_data; }
+    char const *GetString() const { return m_data; }
+    // The bytes without the end mark; valid until the string changes.
+    std::string_view Str() const { return std::string_view(m_data, m_length); }
 
-    int GetLength() const { return static_cast<int>(m_str.size()); }
-    bool IsEmpty() const { return m_str.empty(); }
-    void Empty() { m_str.clear(); }
+    int GetLength() const { return static_cast<int>(m_length); }
+    bool IsEmpty() const { return m_length == 0; }
+    void Empty() { SetLength(0); }
 
     char GetAt(int index) const;
     void SetAt(int index, char ch);
@@ -112,7 +115,23 @@ public:
     static char ToLower(char ch);
 
 private:
-    std::string m_str;
+    // Makes room for `capacity` bytes (and the end mark), keeping the text.
+    void Reserve(std::size_t capacity);
+    void SetLength(std::size_t length)
+    {
+        m_length = length;
+        m_data[length] = '\0';
+    }
+    void Release();
+    void EraseFront(std::size_t count);
+
+    // Up to kInline bytes live in the object itself, so that a field value
+    // of a typical record needs no allocation; longer text is on the heap.
+    static constexpr std::size_t kInline = 15;
+    char *m_data = m_inline;
+    std::size_t m_length = 0;
+    std::size_t m_capacity = kInline; // bytes that fit before the end mark
+    char m_inline[kInline + 1] = {};
 };
 
 QOTOOLS_API CQoString operator+(CQoString const &a, CQoString const &b);

@@ -92,7 +92,7 @@ inline std::vector<std::string> Row(CQoInputFilter &f)
     CQoString value;
     for (int c = 0; c < f.NumCols(); ++c) {
         f.Value(c, value);
-        row.push_back(value.Str());
+        row.emplace_back(value.Str());
     }
     return row;
 }

@@ -73,7 +73,7 @@ std::string Key(std::vector<Cell> const &row)
 {
     std::string key;
     for (Cell const &c : row)
-        key += std::to_string(c.type) + ":" + std::to_string(c.number) + ":" + c.text.Str() + "|";
+        key += std::to_string(c.type) + ":" + std::to_string(c.number) + ":" + std::string(c.text.Str()) + "|";
     return key;
 }
 

@@ -17,7 +17,7 @@ inline Row CurrentRow(CQoInputFilter &filter)
     CQoString value;
     for (int c = 0; c < filter.NumCols(); ++c) {
         filter.Value(c, value);
-        row.push_back(value.Str());
+        row.emplace_back(value.Str());
     }
     return row;
 }
@@ -43,7 +43,7 @@ struct RepairScript {
 
     static int Hook(CQoString const &, CQoString &data, int &pos)
     {
-        calls.push_back({data.Str(), pos});
+        calls.push_back({std::string(data.Str()), pos});
         std::size_t i = calls.size() - 1;
         int answer = i < answers.size() ? answers[i] : CQoInterActive::repairStop;
         if (answer == CQoInterActive::repairTakeOver && i < records.size())

@@ -36,7 +36,7 @@ void AppendHex(unsigned char c, std::string &out)
 // The escaped form of names (and of every value of the earlier writer):
 // \\ \r \n \t, \s for a blank at either end, \xHH for other control bytes
 // and, in names, for the characters that give a line its meaning.
-void Escape(std::string const &text, bool name, std::string &out)
+void Escape(std::string_view text, bool name, std::string &out)
 {
     std::size_t const n = text.size();
     for (std::size_t i = 0; i < n; ++i) {
@@ -122,7 +122,7 @@ bool Unescape(char const *p, std::size_t n, std::string &out, bool *marked = nul
 // A value that would be changed by the trip through a line (blanks and tabs
 // at its ends are trimmed, a line end ends it, a leading quote would read as
 // the quoted form) or that holds other control bytes is written quoted.
-bool NeedsQuotes(std::string const &text)
+bool NeedsQuotes(std::string_view text)
 {
     if (text.empty())
         return false;
@@ -136,7 +136,7 @@ bool NeedsQuotes(std::string const &text)
     return false;
 }
 
-void Quote(std::string const &text, std::string &out)
+void Quote(std::string_view text, std::string &out)
 {
     out += '"';
     for (char ch : text) {
@@ -157,7 +157,7 @@ void Quote(std::string const &text, std::string &out)
     out += '"';
 }
 
-void WriteValue(std::string const &text, std::string &out)
+void WriteValue(std::string_view text, std::string &out)
 {
     if (NeedsQuotes(text))
         Quote(text, out);

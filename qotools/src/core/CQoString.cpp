@@ -53,91 +53,189 @@ char const *Safe(char const *text) { return text ? text : ""; }
 } // namespace
 
 // ---------------------------------------------------------------------------
+// storage
+
+void CQoString::Reserve(std::size_t capacity)
+{
+    if (capacity <= m_capacity)
+        return;
+    // Grows by half at least, so that appending byte by byte stays linear.
+    std::size_t grown = m_capacity + m_capacity / 2;
+    if (capacity < grown)
+        capacity = grown;
+    char *data = new char[capacity + 1];
+    std::memcpy(data, m_data, m_length + 1);
+    Release();
+    m_data = data;
+    m_capacity = capacity;
+}
+
+void CQoString::Release()
+{
+    if (m_data != m_inline)
+        delete[] m_data;
+    m_data = m_inline;
+    m_capacity = kInline;
+}
+
+CQoString::~CQoString()
+{
+    Release();
+}
+
+void CQoString::EraseFront(std::size_t count)
+{
+    if (count == 0)
+        return;
+    if (count > m_length)
+        count = m_length;
+    std::memmove(m_data, m_data + count, m_length - count);
+    SetLength(m_length - count);
+}
+
+// ---------------------------------------------------------------------------
 // construction and assignment
 
-CQoString::CQoString(char const *text) : m_str(Safe(text)) {}
+CQoString::CQoString(char const *text)
+{
+    if (text)
+        Assign(text, std::strlen(text));
+}
 
 CQoString::CQoString(char const *text, int length)
 {
     if (text && length > 0)
-        m_str.assign(text, static_cast<std::size_t>(length));
+        Assign(text, static_cast<std::size_t>(length));
 }
 
 CQoString::CQoString(char ch, int count)
 {
-    if (count > 0)
-        m_str.assign(static_cast<std::size_t>(count), ch);
+    if (count > 0) {
+        Reserve(static_cast<std::size_t>(count));
+        std::memset(m_data, ch, static_cast<std::size_t>(count));
+        SetLength(static_cast<std::size_t>(count));
+    }
 }
 
-CQoString::CQoString(std::string text) : m_str(std::move(text)) {}
+CQoString::CQoString(std::string const &text)
+{
+    Assign(text.data(), text.size());
+}
+
+CQoString::CQoString(std::string_view text)
+{
+    Assign(text.data(), text.size());
+}
+
+CQoString::CQoString(CQoString const &other)
+{
+    Assign(other.m_data, other.m_length);
+}
+
+CQoString::CQoString(CQoString &&other) noexcept
+{
+    *this = std::move(other);
+}
+
+CQoString &CQoString::operator=(CQoString const &other)
+{
+    Assign(other.m_data, other.m_length);
+    return *this;
+}
+
+CQoString &CQoString::operator=(CQoString &&other) noexcept
+{
+    if (this == &other)
+        return *this;
+    if (other.m_data == other.m_inline) {
+        // Short text is copied; the other keeps it.
+        std::memcpy(m_data, other.m_inline, other.m_length + 1);
+        m_length = other.m_length;
+        return *this;
+    }
+    Release();
+    m_data = other.m_data;
+    m_length = other.m_length;
+    m_capacity = other.m_capacity;
+    other.m_data = other.m_inline;
+    other.m_capacity = kInline;
+    other.SetLength(0);
+    return *this;
+}
 
 CQoString &CQoString::operator=(char const *text)
 {
-    m_str = Safe(text); // also safe when text points into m_str
+    Assign(Safe(text), std::strlen(Safe(text))); // also safe when text points into this string
     return *this;
 }
 
 CQoString &CQoString::operator=(char ch)
 {
-    m_str.assign(1, ch);
+    m_data[0] = ch;
+    SetLength(1);
     return *this;
 }
 
 CQoString &CQoString::operator+=(CQoString const &text)
 {
-    m_str += text.m_str;
+    Append(text.m_data, text.m_length);
     return *this;
 }
 
 CQoString &CQoString::operator+=(char const *text)
 {
-    m_str += Safe(text);
+    Append(Safe(text), std::strlen(Safe(text)));
     return *this;
 }
 
 CQoString &CQoString::operator+=(char ch)
 {
-    m_str += ch;
+    Reserve(m_length + 1);
+    m_data[m_length] = ch;
+    SetLength(m_length + 1);
     return *this;
 }
 
-#if defined(_WIN32)
-constexpr std::size_t kShortValue = 15; // what every std::string holds without allocating
-#endif
-
 void CQoString::Assign(char const *data, std::size_t length)
 {
-    char const *mine = m_str.data();
     if (!data) {
-        m_str.clear();
-    } else if (data + length <= mine || data > mine + m_str.capacity()) {
-        // Apart from our own text: the usual case of a field value.
-#if defined(_WIN32)
-        if (length <= kShortValue) {
-            // Written into the string's own storage (it always has room for
-            // kShortValue bytes), then the length follows through inline
-            // members: erase shortens, push_back lengthens (and writes the
-            // end mark after each byte, so it takes the bytes from `data`).
-            qobytes::Copy(&m_str[0], data, length);
-            if (length <= m_str.size())
-                m_str.erase(length);
-            else
-                while (m_str.size() < length)
-                    m_str.push_back(data[m_str.size()]);
-            return;
-        }
-#endif
-        m_str.clear();
-        m_str.append(data, length);
-    } else {
-        m_str.assign(data, length);
+        SetLength(0);
+        return;
     }
+    if (length <= m_capacity) {
+        // Field values mostly: a copy and the end mark. The source may be
+        // this string's own text.
+        if (data + length <= m_data || data > m_data + m_length)
+            qobytes::Copy(m_data, data, length);
+        else
+            std::memmove(m_data, data, length);
+        SetLength(length);
+        return;
+    }
+    // A new block first: `data` may point into the old one.
+    char *block = new char[length + 1];
+    std::memcpy(block, data, length);
+    Release();
+    m_data = block;
+    m_capacity = length;
+    SetLength(length);
 }
 
 void CQoString::Append(char const *data, std::size_t length)
 {
-    if (data)
-        m_str.append(data, length);
+    if (!data || length == 0)
+        return;
+    if (m_length + length > m_capacity) {
+        if (data >= m_data && data <= m_data + m_length) {
+            // Our own text: appended from a copy, the block may move.
+            std::string const copy(data, length);
+            Append(copy.data(), copy.size());
+            return;
+        }
+        Reserve(m_length + length);
+    }
+    qobytes::Copy(m_data + m_length, data, length);
+    SetLength(m_length + length);
 }
 
 CQoString operator+(CQoString const &a, CQoString const &b)
@@ -182,14 +280,14 @@ char CQoString::GetAt(int index) const
 {
     if (index < 0 || index >= GetLength())
         CQoException::Throw(CQoException::indexError, "CQoString::GetAt");
-    return m_str[static_cast<std::size_t>(index)];
+    return m_data[index];
 }
 
 void CQoString::SetAt(int index, char ch)
 {
     if (index < 0 || index >= GetLength())
         CQoException::Throw(CQoException::indexError, "CQoString::SetAt");
-    m_str[static_cast<std::size_t>(index)] = ch;
+    m_data[index] = ch;
 }
 
 // ---------------------------------------------------------------------------
@@ -197,20 +295,20 @@ void CQoString::SetAt(int index, char ch)
 
 int CQoString::Compare(CQoString const &text) const
 {
-    int r = m_str.compare(text.m_str); // char_traits<char> compares as unsigned bytes
+    int r = Str().compare(text.Str()); // char_traits<char> compares as unsigned bytes
     return r < 0 ? -1 : (r > 0 ? 1 : 0);
 }
 
 int CQoString::Compare(char const *text) const
 {
-    int r = std::strcmp(m_str.c_str(), Safe(text));
+    int r = std::strcmp(m_data, Safe(text));
     return r < 0 ? -1 : (r > 0 ? 1 : 0);
 }
 
 int CQoString::CompareNoCase(char const *text) const
 {
     CaseTables const &t = Tables();
-    auto const *a = reinterpret_cast<unsigned char const *>(m_str.c_str());
+    auto const *a = reinterpret_cast<unsigned char const *>(m_data);
     auto const *b = reinterpret_cast<unsigned char const *>(Safe(text));
     for (;; ++a, ++b) {
         int ca = t.lower[*a];
@@ -228,7 +326,7 @@ int CQoString::CompareNoCase(char const *text) const
 void CQoString::Format(char const *format, ...)
 {
     if (!format) {
-        m_str.clear();
+        SetLength(0);
         return;
     }
     char small[256];
@@ -244,15 +342,14 @@ void CQoString::Format(char const *format, ...)
     }
     if (static_cast<std::size_t>(needed) < sizeof small) {
         va_end(again);
-        m_str.assign(small, static_cast<std::size_t>(needed));
+        Assign(small, static_cast<std::size_t>(needed));
         return;
     }
     // Build into a separate buffer: an argument may be this string's own text.
     std::string result(static_cast<std::size_t>(needed) + 1, '\0');
     std::vsnprintf(&result[0], result.size(), format, again);
     va_end(again);
-    result.resize(static_cast<std::size_t>(needed));
-    m_str.swap(result);
+    Assign(result.data(), static_cast<std::size_t>(needed));
 }
 
 // ---------------------------------------------------------------------------
@@ -264,7 +361,7 @@ CQoString CQoString::Left(int count) const
         return CQoString();
     if (count >= GetLength())
         return *this;
-    return CQoString(m_str.substr(0, static_cast<std::size_t>(count)));
+    return CQoString(Str().substr(0, static_cast<std::size_t>(count)));
 }
 
 CQoString CQoString::Mid(int first) const
@@ -281,7 +378,7 @@ CQoString CQoString::Mid(int first, int count) const
         return CQoString();
     if (count > length - first)
         count = length - first;
-    return CQoString(m_str.substr(static_cast<std::size_t>(first), static_cast<std::size_t>(count)));
+    return CQoString(Str().substr(static_cast<std::size_t>(first), static_cast<std::size_t>(count)));
 }
 
 CQoString CQoString::Right(int count) const
@@ -291,7 +388,7 @@ CQoString CQoString::Right(int count) const
         return CQoString();
     if (count >= length)
         return *this;
-    return CQoString(m_str.substr(static_cast<std::size_t>(length - count)));
+    return CQoString(Str().substr(static_cast<std::size_t>(length - count)));
 }
 
 int CQoString::Find(char ch, int start) const
@@ -300,7 +397,7 @@ int CQoString::Find(char ch, int start) const
         start = 0;
     if (start >= GetLength())
         return -1;
-    std::size_t pos = m_str.find(ch, static_cast<std::size_t>(start));
+    std::size_t pos = Str().find(ch, static_cast<std::size_t>(start));
     return pos == std::string::npos ? -1 : static_cast<int>(pos);
 }
 
@@ -310,13 +407,13 @@ int CQoString::Find(char const *text, int start) const
         start = 0;
     if (start > GetLength())
         return -1;
-    std::size_t pos = m_str.find(Safe(text), static_cast<std::size_t>(start));
+    std::size_t pos = Str().find(Safe(text), static_cast<std::size_t>(start));
     return pos == std::string::npos ? -1 : static_cast<int>(pos);
 }
 
 int CQoString::ReverseFind(char ch) const
 {
-    std::size_t pos = m_str.rfind(ch);
+    std::size_t pos = Str().rfind(ch);
     return pos == std::string::npos ? -1 : static_cast<int>(pos);
 }
 
@@ -331,17 +428,17 @@ int CQoString::Replace(char const *oldText, char const *newText)
     int count = 0;
     std::size_t pos = 0;
     for (;;) {
-        std::size_t hit = m_str.find(from, pos);
+        std::size_t hit = Str().find(from, pos);
         if (hit == std::string::npos)
             break;
-        result.append(m_str, pos, hit - pos);
+        result.append(m_data + pos, hit - pos);
         result += to;
         pos = hit + from.size();
         ++count;
     }
     if (count > 0) {
-        result.append(m_str, pos, std::string::npos);
-        m_str.swap(result);
+        result.append(m_data + pos, m_length - pos);
+        Assign(result.data(), result.size());
     }
     return count;
 }
@@ -349,9 +446,9 @@ int CQoString::Replace(char const *oldText, char const *newText)
 int CQoString::Replace(char oldChar, char newChar)
 {
     int count = 0;
-    for (char &c : m_str)
-        if (c == oldChar) {
-            c = newChar;
+    for (std::size_t i = 0; i < m_length; ++i)
+        if (m_data[i] == oldChar) {
+            m_data[i] = newChar;
             ++count;
         }
     return count;
@@ -362,10 +459,10 @@ int CQoString::Replace(char oldChar, char newChar)
 
 CQoString &CQoString::TrimNewline()
 {
-    std::size_t n = m_str.size();
-    while (n > 0 && (m_str[n - 1] == '\r' || m_str[n - 1] == '\n'))
+    std::size_t n = m_length;
+    while (n > 0 && (m_data[n - 1] == '\r' || m_data[n - 1] == '\n'))
         --n;
-    m_str.resize(n);
+    SetLength(n);
     return *this;
 }
 
@@ -378,32 +475,32 @@ CQoString &CQoString::Trim()
 CQoString &CQoString::TrimLeft()
 {
     std::size_t n = 0;
-    while (n < m_str.size() && IsBlank(m_str[n]))
+    while (n < m_length && IsBlank(m_data[n]))
         ++n;
-    m_str.erase(0, n);
+    EraseFront(n);
     return *this;
 }
 
 CQoString &CQoString::TrimRight()
 {
-    std::size_t n = m_str.size();
-    while (n > 0 && IsBlank(m_str[n - 1]))
+    std::size_t n = m_length;
+    while (n > 0 && IsBlank(m_data[n - 1]))
         --n;
-    m_str.resize(n);
+    SetLength(n);
     return *this;
 }
 
 CQoString &CQoString::TrimLeft(char const *chars)
 {
-    std::size_t n = m_str.find_first_not_of(Safe(chars));
-    m_str.erase(0, n == std::string::npos ? m_str.size() : n);
+    std::size_t n = Str().find_first_not_of(Safe(chars));
+    EraseFront(n == std::string::npos ? m_length : n);
     return *this;
 }
 
 CQoString &CQoString::TrimRight(char const *chars)
 {
-    std::size_t n = m_str.find_last_not_of(Safe(chars));
-    m_str.resize(n == std::string::npos ? 0 : n + 1);
+    std::size_t n = Str().find_last_not_of(Safe(chars));
+    SetLength(n == std::string::npos ? 0 : n + 1);
     return *this;
 }
 
@@ -423,24 +520,24 @@ char CQoString::ToLower(char ch)
 CQoString &CQoString::MakeUpper()
 {
     CaseTables const &t = Tables();
-    for (char &c : m_str)
-        c = static_cast<char>(t.upper[static_cast<unsigned char>(c)]);
+    for (std::size_t i = 0; i < m_length; ++i)
+        m_data[i] = static_cast<char>(t.upper[static_cast<unsigned char>(m_data[i])]);
     return *this;
 }
 
 CQoString &CQoString::MakeLower()
 {
     CaseTables const &t = Tables();
-    for (char &c : m_str)
-        c = static_cast<char>(t.lower[static_cast<unsigned char>(c)]);
+    for (std::size_t i = 0; i < m_length; ++i)
+        m_data[i] = static_cast<char>(t.lower[static_cast<unsigned char>(m_data[i])]);
     return *this;
 }
 
 CQoString &CQoString::NoUmlaute()
 {
     std::string result;
-    result.reserve(m_str.size() + 8);
-    for (char c : m_str) {
+    result.reserve(m_length + 8);
+    for (char c : Str()) {
         switch (static_cast<unsigned char>(c)) {
         case 0xE4: result += "ae"; break; // ä
         case 0xF6: result += "oe"; break; // ö
@@ -452,6 +549,6 @@ CQoString &CQoString::NoUmlaute()
         default: result += c; break;
         }
     }
-    m_str.swap(result);
+    Assign(result.data(), result.size());
     return *this;
 }

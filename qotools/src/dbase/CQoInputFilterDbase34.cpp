@@ -141,7 +141,7 @@ void CQoInputFilterDbase34::Init(CQoString const &name)
     for (int i = 0; i < count; ++i) {
         // Field names are text of the file's code page as much as the values.
         CDbaseField &field = m_header.fields[std::size_t(i)];
-        std::string name = field.Name().Str();
+        std::string name(field.Name().Str());
         CQoFile::ConvertToAnsi(m_nRecordCharSet, &name[0], name.size());
         field.Name(name.c_str());
         m_colNames[std::size_t(i)] = field.Name();

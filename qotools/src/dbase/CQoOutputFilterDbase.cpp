@@ -70,7 +70,7 @@ bool ValidDate(int y, int m, int d)
 
 // The digits text[from .. from+count) as a number; a date part has at most
 // four, more than nine would not fit.
-bool ParseInt(std::string const &text, std::size_t from, std::size_t count, int &value)
+bool ParseInt(std::string_view text, std::size_t from, std::size_t count, int &value)
 {
     if (from + count > text.size() || count == 0 || count > 9)
         return false;
@@ -245,15 +245,15 @@ void CQoOutputFilterDbase::ReleaseFile()
 // ---------------------------------------------------------------------------
 // records
 
-[[noreturn]] void CQoOutputFilterDbase::BadValue(int col, std::string const &value, char const *why) const
+[[noreturn]] void CQoOutputFilterDbase::BadValue(int col, std::string_view value, char const *why) const
 {
     CQoString text;
-    text.Format("Satz %ld, Feld %s: der Wert '%s' %s", m_lRows + 1, m_fields[std::size_t(col)].Name().GetString(),
-                value.c_str(), why);
+    text.Format("Satz %ld, Feld %s: der Wert '%.*s' %s", m_lRows + 1, m_fields[std::size_t(col)].Name().GetString(),
+                static_cast<int>(value.size()), value.data(), why);
     CQoException::Throw(text, m_pFile ? m_pFile->FileName() : nullptr);
 }
 
-void CQoOutputFilterDbase::FormatValue(int col, std::string const &value, char *out)
+void CQoOutputFilterDbase::FormatValue(int col, std::string_view value, char *out)
 {
     CDbaseField const &field = m_fileFields[std::size_t(col)];
     std::size_t length = std::size_t(field.Length());

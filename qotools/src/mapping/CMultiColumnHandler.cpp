@@ -127,7 +127,7 @@ bool MultiColumnMapping::AddAssignment(int outerId, int innerId, CQoString const
     return true;
 }
 
-void MultiColumnMapping::Split(std::string const &text, std::vector<Assignment const *> const &parts,
+void MultiColumnMapping::Split(std::string_view text, std::vector<Assignment const *> const &parts,
                                std::vector<std::string> &values)
 {
     std::size_t const count = parts.size();
@@ -135,12 +135,12 @@ void MultiColumnMapping::Split(std::string const &text, std::vector<Assignment c
     if (count == 0)
         return;
     std::size_t pos = 0;
-    std::string const &lead = parts[0]->separator.Str();
+    std::string_view const lead = parts[0]->separator.Str();
     if (!lead.empty() && text.compare(0, lead.size(), lead) == 0)
         pos = lead.size();
     std::size_t current = 0;
     for (std::size_t m = 1; m < count; ++m) {
-        std::string const &separator = parts[m]->separator.Str();
+        std::string_view const separator = parts[m]->separator.Str();
         if (separator.empty())
             continue; // nothing marks where such a part starts: it stays empty
         std::size_t const at = text.find(separator, pos);
@@ -153,7 +153,7 @@ void MultiColumnMapping::Split(std::string const &text, std::vector<Assignment c
     values[current].assign(text, pos, std::string::npos);
 }
 
-void MultiColumnMapping::AppendPart(std::string &out, Assignment const &part, std::string const &value)
+void MultiColumnMapping::AppendPart(std::string &out, Assignment const &part, std::string_view value)
 {
     if (!value.empty() || part.always)
         out += part.separator.Str();

@@ -61,10 +61,10 @@ struct MultiColumnMapping {
     bool ReadConfig(CQoConfigFile const &cfg, char const *section);
 
     // Cuts `text` into the parts' values (see CMultiColumnHandler.h).
-    static void Split(std::string const &text, std::vector<Assignment const *> const &parts,
+    static void Split(std::string_view text, std::vector<Assignment const *> const &parts,
                       std::vector<std::string> &values);
     // Appends a part's value with its separator to `out`.
-    static void AppendPart(std::string &out, Assignment const &part, std::string const &value);
+    static void AppendPart(std::string &out, Assignment const &part, std::string_view value);
 
     int type;
     bool alwaysUseOuterNames = false;

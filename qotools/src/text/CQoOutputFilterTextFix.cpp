@@ -102,7 +102,7 @@ void CQoOutputFilterTextFix::BuildRecord(std::string &record)
     char *out = &record[0];
     for (std::size_t c = 0; c < m_lengths.size(); ++c) {
         std::size_t length = m_lengths[c] > 0 ? std::size_t(m_lengths[c]) : 0;
-        std::string const &value = m_values[c].Str();
+        std::string_view const value = m_values[c].Str();
         std::size_t n = value.size();
         if (n > length) {
             n = length;

@@ -17,7 +17,7 @@ std::vector<std::string> Names(std::vector<CQoString> const &list)
 {
     std::vector<std::string> names;
     for (CQoString const &s : list)
-        names.push_back(s.Str());
+        names.emplace_back(s.Str());
     return names;
 }
 

@@ -23,7 +23,7 @@ std::vector<std::string> ReadLines(std::string const &path, int mode, int blocks
     EXPECT_TRUE(file.Open(path.c_str(), mode));
     CQoString line;
     while (file.ReadString(line))
-        lines.push_back(line.Str());
+        lines.emplace_back(line.Str());
     return lines;
 }
 

@@ -29,6 +29,33 @@ TEST(CQoString, ComparesBytesUnsignedAndKeepsBytesAfterANul)
         }
 }
 
+TEST(CQoString, OwnTextAsSourceAndMovesOfShortAndLongText)
+{
+    // Short text lives in the object, long text on the heap: both survive
+    // being their own source, copies and moves.
+    for (std::string const &text : {std::string("kurz"), std::string(40, 'L') + "ang"}) {
+        CQoString s(text.c_str());
+        s.Assign(s.GetString() + 1, text.size() - 1);
+        EXPECT_EQ(text.substr(1), s.Str());
+        s.Append(s.GetString(), static_cast<std::size_t>(s.GetLength())); // doubles, may move
+        EXPECT_EQ(text.substr(1) + text.substr(1), s.Str());
+        s += s;
+        EXPECT_EQ(4 * (text.size() - 1), s.Str().size());
+
+        CQoString original(text.c_str());
+        CQoString copy(original);
+        CQoString moved(std::move(original));
+        EXPECT_EQ(text, moved.Str());
+        EXPECT_EQ(text, copy.Str());
+        copy = std::move(moved);
+        EXPECT_EQ(text, copy.Str());
+        CQoString &same = copy;
+        copy = same;
+        EXPECT_EQ(text, copy.Str());
+        EXPECT_EQ('\0', copy.GetString()[text.size()]);
+    }
+}
+
 TEST(CQoString, FormatsTextOfAnyLengthAndItsOwnText)
 {
     std::string longText(100000, 'L');

@@ -28,7 +28,7 @@ TEST(Tokenizer, SplitsAtAnyCharacterOfTheSet)
         SCOPED_TRACE(c.text ? c.text : "(null)");
         V tokens;
         for (CQoString const &token : CQoStringTokenizer::Split(c.text, c.separators, c.keepEmpty))
-            tokens.push_back(token.Str());
+            tokens.emplace_back(token.Str());
         EXPECT_EQ(c.tokens, tokens);
     }
 }

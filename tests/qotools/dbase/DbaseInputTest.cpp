@@ -144,7 +144,7 @@ with open(os.path.join(folder, 'expected.txt'), 'w') as out:
     CQoString name;
     for (int c = 0; c < dbf.NumCols(); ++c) {
         dbf.ColName(c, name);
-        names.push_back(name.Str());
+        names.emplace_back(name.Str());
     }
     EXPECT_EQ(HexFields(ReadPeerLines(folder.Path("names.txt")).at(0)), names);
 

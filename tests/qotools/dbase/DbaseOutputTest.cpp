@@ -45,7 +45,7 @@ std::string Formatted(CDbaseField const &field, char const *value)
     out.Value(0, value);
     CQoString record;
     out.WriteRow(&record);
-    return record.Str().substr(1);
+    return std::string(record.Str().substr(1));
 }
 
 std::string FormatError(CDbaseField const &field, char const *value)

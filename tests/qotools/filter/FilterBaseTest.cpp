@@ -51,8 +51,10 @@ public:
     bool WriteRow(CQoString * = nullptr) override
     {
         std::string line;
-        for (CQoString const &v : m_values)
-            line += v.Str() + ";";
+        for (CQoString const &v : m_values) {
+            line += v.Str();
+            line += ';';
+        }
         line += "\n";
         WriteToFile(line.data(), line.size());
         return true;

@@ -20,10 +20,10 @@ typedef std::unique_ptr<CQoInputFilter, FilterDeleter> FilterPtr;
 typedef std::unique_ptr<CQoOutputSource, SourceDeleter> SourcePtr;
 
 // What a filter, a source or the handler answers; "unset" where it leaves the text alone.
-std::string Val(CQoInputFilter &f, int col) { CQoString v("unset"); f.Value(col, v); return v.Str(); }
-std::string Val(CQoOutputSource &s, long row, int col) { CQoString v("unset"); s.GetValue(row, col, v); return v.Str(); }
-std::string Name(CQoInputFilter &f, int col) { CQoString v("unset"); f.ColName(col, v); return v.Str(); }
-std::string Name(CQoOutputSource &s, int col) { CQoString v("unset"); s.GetColumnName(col, v); return v.Str(); }
+std::string Val(CQoInputFilter &f, int col) { CQoString v("unset"); f.Value(col, v); return std::string(v.Str()); }
+std::string Val(CQoOutputSource &s, long row, int col) { CQoString v("unset"); s.GetValue(row, col, v); return std::string(v.Str()); }
+std::string Name(CQoInputFilter &f, int col) { CQoString v("unset"); f.ColName(col, v); return std::string(v.Str()); }
+std::string Name(CQoOutputSource &s, int col) { CQoString v("unset"); s.GetColumnName(col, v); return std::string(v.Str()); }
 
 // An address file: column 0 "Name, Vorname Titel", column 1 the town.
 MemoryInputFilter AddressFile()

@@ -23,7 +23,7 @@ std::string Line(CQoOutputFilterTextVar &out, std::vector<std::string> const &va
         out.Value(int(c), values[c].c_str());
     CQoString text;
     EXPECT_TRUE(out.WriteRow(&text));
-    return text.Str();
+    return std::string(text.Str());
 }
 
 // Values that test the quoting: delimiters, enclosers, escapes, line
@@ -123,6 +123,20 @@ TEST(TextOutputVar, PreviewTextIsExactlyTheLine)
     // A single empty column is not an empty line.
     EXPECT_EQ("\"\"\r\n", Line(out, {""}));
     EXPECT_EQ(0, out.wroteBytes()) << "the preview writes nothing anywhere";
+
+    // A stop byte anywhere in a longer value: values are scanned eight bytes
+    // at a time and their tails byte by byte.
+    for (std::size_t length = 1; length <= 20; ++length)
+        for (std::size_t at = 0; at < length; ++at)
+            for (char stop : {';', '"', '\n'}) {
+                std::string value(length, 'v');
+                value[at] = stop;
+                std::string enclosed = value;
+                if (stop == '"')
+                    enclosed.insert(at, 1, '"');
+                ASSERT_EQ("\"" + enclosed + "\"\r\n", Line(out, {value})) << length << " " << at;
+            }
+    EXPECT_EQ(std::string(20, 'v') + "\r\n", Line(out, {std::string(20, 'v')}));
 
     out.Delimiter('\t');
     out.Encloser(0);

@@ -192,7 +192,7 @@ TEST_F(XlsxPeer, EveryCellReadsAsOpenpyxlReadsIt)
                 for (std::size_t c = 0; c < row.size(); ++c) {
                     Cell const &cell = row[c];
                     if (cell.type == Cell::typeText || cell.type == Cell::typeError)
-                        got[{r, left + int(c)}] = {cell.type, cell.text.Str()};
+                        got[{r, left + int(c)}] = {cell.type, std::string(cell.text.Str())};
                     else if (cell.type != Cell::typeEmpty)
                         got[{r, left + int(c)}] = {cell.type, Number(cell.type, cell.number)};
                 }
@@ -215,7 +215,7 @@ TEST_F(XlsxPeer, EscapedCharactersReadAsWritten)
         std::vector<std::string> got;
         std::vector<Cell> row;
         while (reader.NextRow(row))
-            got.push_back(row.at(0).text.Str());
+            got.emplace_back(row.at(0).text.Str());
         EXPECT_EQ(expected, got);
     }
 }
@@ -440,7 +440,7 @@ TEST(XlsxFaults, DamagedAndForeignFilesRaiseAClearErrorOddButSoundOnesRead)
         std::vector<std::string> texts;
         std::vector<Cell> row;
         while (reader.NextRow(row))
-            texts.push_back(row[0].text.Str() + "|" + row[2].text.Str());
+            texts.push_back(std::string(row[0].text.Str()) + "|" + std::string(row[2].text.Str()));
         return texts;
     };
     std::vector<std::string> good = firstColumn("good.xlsx");
