@@ -1,5 +1,6 @@
 // The report list and its header: one common-control message per operation.
 #include "afxpriv.h"
+#include "win_private.h"
 #include "afxcmn.h"
 
 IMPLEMENT_DYNAMIC(CHeaderCtrl, CWnd)
@@ -174,14 +175,19 @@ BOOL CListCtrl::OnChildNotify(UINT message, WPARAM wParam, LPARAM lParam, LRESUL
 CImageList::~CImageList() { DeleteImageList(); }
 BOOL CImageList::Create(int cx, int cy, UINT nFlags, int nInitial, int nGrow) {
   DeleteImageList();
-  m_hImageList = ImageList_Create(cx, cy, nFlags, nInitial, nGrow);
+  const qownd::CommonControls& comctl = qownd::ComCtl();
+  m_hImageList = comctl.ImageListCreate != nullptr ? comctl.ImageListCreate(cx, cy, nFlags, nInitial, nGrow) : NULL;
   return m_hImageList != NULL;
 }
-int CImageList::Add(HICON hIcon) { return m_hImageList != NULL ? ImageList_AddIcon(m_hImageList, hIcon) : -1; }
-int CImageList::GetImageCount() const { return m_hImageList != NULL ? ImageList_GetImageCount(m_hImageList) : 0; }
+int CImageList::Add(HICON hIcon) {
+  return m_hImageList != NULL ? qownd::ComCtl().ImageListReplaceIcon(m_hImageList, -1, hIcon) : -1;
+}
+int CImageList::GetImageCount() const {
+  return m_hImageList != NULL ? qownd::ComCtl().ImageListGetImageCount(m_hImageList) : 0;
+}
 BOOL CImageList::DeleteImageList() {
   if (m_hImageList == NULL) return FALSE;
-  ImageList_Destroy(m_hImageList);
+  qownd::ComCtl().ImageListDestroy(m_hImageList);
   m_hImageList = NULL;
   return TRUE;
 }

@@ -1,5 +1,6 @@
 // CFileDialog: the system's dialogs for opening and saving a file.
 #include "afxpriv.h"
+#include "win_private.h"
 #include "afxdlgs.h"
 
 #include <cstring>
@@ -55,7 +56,9 @@ INT_PTR CFileDialog::DoModal() {
 
   HWND hWndFocus = ::GetFocus();
   m_ofn.hwndOwner = PreModal();
-  BOOL bResult = m_bOpenFileDialog ? ::GetOpenFileNameA(&m_ofn) : ::GetSaveFileNameA(&m_ofn);
+  const qownd::CommonDialogs& comdlg = qownd::ComDlg();
+  auto show = m_bOpenFileDialog ? comdlg.GetOpenFileName : comdlg.GetSaveFileName;
+  BOOL bResult = show != nullptr && show(&m_ofn);
   PostModal();
   if (hWndFocus != NULL && ::IsWindow(hWndFocus)) ::SetFocus(hWndFocus);
   return bResult ? IDOK : IDCANCEL;

@@ -162,8 +162,11 @@ BOOL AFXAPI AfxWinInit(HINSTANCE hInstance, HINSTANCE hPrevInstance, LPTSTR lpCm
   pModuleState->m_hCurrentInstanceHandle = hInstance;
   if (pModuleState->m_hCurrentResourceHandle == NULL) pModuleState->m_hCurrentResourceHandle = hInstance;
 
-  INITCOMMONCONTROLSEX icc = {sizeof(icc), ICC_WIN95_CLASSES | ICC_STANDARD_CLASSES | ICC_DATE_CLASSES};
-  ::InitCommonControlsEx(&icc);
+  // The main thread's message queue exists from the start, as the threads'
+  // queues do (win_thread.cpp): a worker may post to it before the first
+  // window or message loop.
+  MSG msg;
+  ::PeekMessageA(&msg, NULL, WM_USER, WM_USER, PM_NOREMOVE);
 
   CWinApp* pApp = AfxGetApp();
   if (pApp != NULL) {

@@ -1,6 +1,7 @@
 // CDialog: modal dialogs run as modeless dialogs in our own modal loop (so that
 // PreTranslateMessage and message maps see every message), and modeless dialogs.
 #include "afxpriv.h"
+#include "win_private.h"
 
 #include <exception>
 
@@ -79,6 +80,7 @@ BOOL CDialog::CreateDlgIndirect(LPCDLGTEMPLATE lpDialogTemplate, CWnd* pParentWn
   ASSERT(lpDialogTemplate != NULL);
   if (hInst == NULL) hInst = AfxGetResourceHandle();
   m_nModalResult = -1;
+  qownd::ComCtl();  // the control classes, before the first dialog
   AfxHookWindowCreate(this);
   HWND hWnd = ::CreateDialogIndirectParamA(hInst, lpDialogTemplate, pParentWnd->GetSafeHwnd(), &AfxDlgProc, 0);
   if (!AfxUnhookWindowCreate()) {

@@ -2,6 +2,7 @@
 // procedure of every CWnd and the dispatch of messages through message maps,
 // including the reflection of notifications to the controls that sent them.
 #include "afxpriv.h"
+#include "win_private.h"
 
 #include <exception>
 
@@ -272,6 +273,7 @@ BOOL CWnd::CreateEx(DWORD dwExStyle, LPCTSTR lpszClassName, LPCTSTR lpszWindowNa
     PostNcDestroy();
     return FALSE;
   }
+  qownd::ComCtl();  // the control classes, before the first window
   AfxHookWindowCreate(this);
   HWND hWnd = ::CreateWindowExA(cs.dwExStyle, cs.lpszClass, cs.lpszName, cs.style, cs.x, cs.y, cs.cx, cs.cy,
                                 cs.hwndParent, cs.hMenu, cs.hInstance, cs.lpCreateParams);
