@@ -187,6 +187,7 @@ private:
     std::vector<Field> m_fields;          // room for the fields; the first m_nFields are in use
     std::size_t m_nFields = 0;
     char const *m_recordBase = nullptr;   // parsed data (inside the reader)
+    bool m_recordInReader = false;        // m_recordBase is the reader's window
     std::string m_scratch;
     std::size_t m_scratchStart = 0;
     CQoString m_correction;               // text of a taken-over record

@@ -49,6 +49,11 @@ public:
     // Byte-exact assignment and appending, also of text with embedded NULs
     // (file readers use these to avoid a strlen per line).
     void Assign(char const *data, std::size_t length);
+    // Assign for a reader that keeps kReadAhead readable bytes after every
+    // value of its buffer (never this string's own text): a short value is
+    // then copied in one fixed-size move, without a branch on its length.
+    static constexpr std::size_t kReadAhead = 16;
+    void AssignReadAhead(char const *data, std::size_t length);
     void Append(char const *data, std::size_t length);
 
     // --- access ----------------------------------------------------------

@@ -221,6 +221,17 @@ void CQoString::Assign(char const *data, std::size_t length)
     SetLength(length);
 }
 
+void CQoString::AssignReadAhead(char const *data, std::size_t length)
+{
+    static_assert(kReadAhead == kInline + 1, "a short value and its end mark fill the inline text");
+    if (data && length <= kInline && m_capacity >= kInline) {
+        std::memcpy(m_data, data, kReadAhead);
+        SetLength(length);
+        return;
+    }
+    Assign(data, length);
+}
+
 void CQoString::Append(char const *data, std::size_t length)
 {
     if (!data || length == 0)

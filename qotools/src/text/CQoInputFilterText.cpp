@@ -58,6 +58,7 @@ void CQoInputFilterText::ResetRows()
     m_nFields = 0;
     m_scratch.clear();
     m_recordBase = nullptr;
+    m_recordInReader = false;
     m_index.clear();
     m_indexComplete = false;
     m_repairs.clear();
@@ -108,6 +109,7 @@ int CQoInputFilterText::ParseHere(std::size_t &used)
             avail = kMaxRecord + 2;
         char const *begin = m_reader->Data();
         m_recordBase = begin;
+        m_recordInReader = true;
         ClearFields();
         int result = ParseRecord(begin, begin + avail, m_reader->AtEof() && !capped, used);
         if (result != parseMore)
@@ -123,6 +125,7 @@ int CQoInputFilterText::ParseText(CQoString const &text, std::size_t &used)
     m_correction = text;
     char const *begin = m_correction.GetString();
     m_recordBase = begin;
+    m_recordInReader = false;
     ClearFields();
     int result = ParseRecord(begin, begin + m_correction.GetLength(), true, used);
     return result == parseMore ? parseUnterminated : result;
@@ -443,7 +446,12 @@ void CQoInputFilterText::Value(int col, CQoString &value)
     char const *data;
     std::size_t length;
     FieldAt(col, data, length);
-    value.Assign(data, length);
+    // A field of the reader's window may be read ahead; a repaired text or
+    // an unescaped value is copied exactly.
+    if (m_recordInReader && !m_fields[static_cast<std::size_t>(col)].scratch)
+        value.AssignReadAhead(data, length);
+    else
+        value.Assign(data, length);
 }
 
 bool CQoInputFilterText::EmptyRow()

@@ -88,7 +88,9 @@ std::size_t QoTextReader::Refill(std::size_t count)
             std::size_t capacity = m_capacity ? m_capacity : kFirstBlock;
             while (capacity < keep + want)
                 capacity *= 2;
-            std::unique_ptr<char[]> window(new char[capacity]);
+            // The bytes after the window's data stay readable for the
+            // values' read-ahead copy (CQoString::AssignReadAhead).
+            std::unique_ptr<char[]> window(new char[capacity + CQoString::kReadAhead]());
             if (keep)
                 std::memcpy(window.get(), m_window.get() + m_pos, keep);
             m_window = std::move(window);

@@ -44,6 +44,13 @@ TEST(TextVarReading, EnclosedFieldsHoldDelimitersQuotesAndLineBreaks)
                                 {"", "", ""},
                                 {"Schulz", "Bonn", "letzte ohne Zeilenende"}}),
               AllRows(*f));
+
+    // Short values at the end of the reader's first block and at the end of
+    // the file (values are copied with a fixed-size move that reads past them).
+    std::string const filler(4081, 'f');
+    WriteBytes(path, "a;b\r\n" + filler + ";f\r\nxy;z\r\nend;e");
+    VarPtr g(OpenVar(path, ';', true));
+    EXPECT_EQ((std::vector<Row>{{filler, "f"}, {"xy", "z"}, {"end", "e"}}), AllRows(*g));
 }
 
 TEST(TextVarReading, CrLfAndCrEndLinesAlikeAndMixed)
