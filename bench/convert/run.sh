@@ -18,6 +18,8 @@ here=$(cd "$(dirname "$0")" && pwd)
 repo=$(cd "$here/../.." && pwd)
 rows=${1:-1000000}
 build=$(cd "${2:-$repo/build/win}" && pwd)
+# What this benchmark runs, brought up to date in that build.
+cmake --build "$build" --target bench_convert qoconvert >/dev/null
 work=$(mktemp -d /tmp/qo_bench_convert.XXXXXX)
 trap 'rm -rf "$work"' EXIT
 

@@ -11,6 +11,8 @@ here=$(cd "$(dirname "$0")" && pwd)
 repo=$(cd "$here/../.." && pwd)
 build=$(cd "${1:-$repo/build/win}" && pwd)
 [ $# -gt 0 ] && shift
+# The benchmark brought up to date in that build.
+cmake --build "$build" --target bench_preview >/dev/null
 data="$build/bench-preview"
 mkdir -p "$data"
 exec "$repo/tools/session" "$repo/tools/winrun" "$build/bin/bench_preview.exe" "Z:$data" "$@"
