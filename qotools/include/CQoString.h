@@ -133,6 +133,7 @@ private:
     // Up to kInline bytes live in the object itself, so that a field value
     // of a typical record needs no allocation; longer text is on the heap.
     static constexpr std::size_t kInline = 15;
+    static constexpr std::size_t kMaxLength = 0x7FFFFFFE; // GetLength is an int
     char *m_data = m_inline;
     std::size_t m_length = 0;
     std::size_t m_capacity = kInline; // bytes that fit before the end mark

@@ -59,10 +59,13 @@ void CQoString::Reserve(std::size_t capacity)
 {
     if (capacity <= m_capacity)
         return;
+    // Lengths are int to the callers (GetLength): no text grows beyond that.
+    if (capacity > kMaxLength)
+        CQoException::Throw(CQoException::outOfMemory, "CQoString");
     // Grows by half at least, so that appending byte by byte stays linear.
     std::size_t grown = m_capacity + m_capacity / 2;
     if (capacity < grown)
-        capacity = grown;
+        capacity = grown < kMaxLength ? grown : kMaxLength;
     char *data = new char[capacity + 1];
     std::memcpy(data, m_data, m_length + 1);
     Release();
@@ -213,6 +216,8 @@ void CQoString::Assign(char const *data, std::size_t length)
         return;
     }
     // A new block first: `data` may point into the old one.
+    if (length > kMaxLength)
+        CQoException::Throw(CQoException::outOfMemory, "CQoString");
     char *block = new char[length + 1];
     std::memcpy(block, data, length);
     Release();
@@ -236,6 +241,8 @@ void CQoString::Append(char const *data, std::size_t length)
 {
     if (!data || length == 0)
         return;
+    if (length > kMaxLength - m_length)
+        CQoException::Throw(CQoException::outOfMemory, "CQoString");
     if (m_length + length > m_capacity) {
         if (data >= m_data && data <= m_data + m_length) {
             // Our own text: appended from a copy, the block may move.

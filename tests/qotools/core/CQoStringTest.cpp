@@ -54,6 +54,11 @@ TEST(CQoString, OwnTextAsSourceAndMovesOfShortAndLongText)
         EXPECT_EQ(text, copy.Str());
         EXPECT_EQ('\0', copy.GetString()[text.size()]);
     }
+    // A length beyond an int is refused before anything is sized by it.
+    CQoString s("kurz");
+    EXPECT_THROW(s.Append("x", std::size_t(-1)), CQoException);
+    EXPECT_THROW(s.Assign("x", std::size_t(1) << 31), CQoException);
+    EXPECT_EQ("kurz", s.Str());
 }
 
 TEST(CQoString, FormatsTextOfAnyLengthAndItsOwnText)
