@@ -20,7 +20,6 @@
 
 #include "CQoOutputFilter.h"
 
-#include <array>
 #include <string>
 #include <vector>
 
@@ -60,9 +59,6 @@ private:
     void AppendField(std::string &out, std::string_view value) const;
     void AppendLine(std::string &out, std::vector<CQoString> const &values) const;
     void Emit(std::string const &line, CQoString *text);
-    // The bytes that end a value's plain copy (delimiter, encloser, escape,
-    // line breaks), made again when the settings changed since.
-    std::array<bool, 256> const &StopBytes() const;
     // True when the value holds no stop byte: it is written as it is.
     bool IsPlain(char const *data, std::size_t size) const;
 
@@ -72,7 +68,4 @@ private:
     bool m_bForceEncloser = false;
     bool m_bWriteHeader = false;
     std::string m_line;
-    mutable std::array<bool, 256> m_stopBytes{};
-    mutable char m_stopsFor[3] = {0, 0, 0}; // delimiter, encloser, escape of m_stopBytes
-    mutable bool m_stopsMade = false;
 };

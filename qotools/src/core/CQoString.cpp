@@ -168,7 +168,8 @@ CQoString &CQoString::operator=(CQoString &&other) noexcept
 
 CQoString &CQoString::operator=(char const *text)
 {
-    Assign(Safe(text), std::strlen(Safe(text))); // also safe when text points into this string
+    text = Safe(text);
+    Assign(text, std::strlen(text)); // also safe when text points into this string
     return *this;
 }
 
@@ -187,7 +188,8 @@ CQoString &CQoString::operator+=(CQoString const &text)
 
 CQoString &CQoString::operator+=(char const *text)
 {
-    Append(Safe(text), std::strlen(Safe(text)));
+    text = Safe(text);
+    Append(text, std::strlen(text));
     return *this;
 }
 

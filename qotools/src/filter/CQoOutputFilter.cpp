@@ -55,7 +55,7 @@ void CQoOutputFilter::GetColumnName(int col, CQoString &name)
 void CQoOutputFilter::Value(int col, CQoString const &value)
 {
     CheckColumn(col);
-    m_values[col].Assign(value.GetString(), static_cast<std::size_t>(value.GetLength()));
+    m_values[col] = value;
 }
 
 void CQoOutputFilter::InitRow()

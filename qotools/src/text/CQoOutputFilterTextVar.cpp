@@ -56,25 +56,6 @@ bool CQoOutputFilterTextVar::Init()
     return true;
 }
 
-std::array<bool, 256> const &CQoOutputFilterTextVar::StopBytes() const
-{
-    char const d = m_chDelimiter, q = m_chEncloser, e = m_chEscape;
-    if (!m_stopsMade || m_stopsFor[0] != d || m_stopsFor[1] != q || m_stopsFor[2] != e) {
-        m_stopBytes.fill(false);
-        m_stopBytes[static_cast<unsigned char>(d)] = true;
-        m_stopBytes['\r'] = m_stopBytes['\n'] = true;
-        if (q != 0)
-            m_stopBytes[static_cast<unsigned char>(q)] = true;
-        if (e != 0)
-            m_stopBytes[static_cast<unsigned char>(e)] = true;
-        m_stopsFor[0] = d;
-        m_stopsFor[1] = q;
-        m_stopsFor[2] = e;
-        m_stopsMade = true;
-    }
-    return m_stopBytes;
-}
-
 namespace {
 // A word with a high bit set in each byte of `word` that equals the byte
 // repeated in `pattern` (and nowhere else when none does).
@@ -88,7 +69,7 @@ inline std::uint64_t Repeated(char c) { return 0x0101010101010101ull * static_ca
 
 bool CQoOutputFilterTextVar::IsPlain(char const *data, std::size_t size) const
 {
-    // Eight bytes at a time against the five stop bytes, the rest through the table.
+    // Eight bytes at a time against the five stop bytes, the rest one by one.
     char const d = m_chDelimiter, q = m_chEncloser, e = m_chEscape;
     std::uint64_t const pd = Repeated(d), pq = Repeated(q), pe = Repeated(e);
     std::uint64_t const cr = Repeated('\r'), lf = Repeated('\n');
@@ -104,10 +85,11 @@ bool CQoOutputFilterTextVar::IsPlain(char const *data, std::size_t size) const
         if (hit)
             return false;
     }
-    std::array<bool, 256> const &stops = StopBytes();
-    for (; i < size; ++i)
-        if (stops[static_cast<unsigned char>(data[i])])
+    for (; i < size; ++i) {
+        char const c = data[i];
+        if (c == d || c == '\r' || c == '\n' || (q != 0 && c == q) || (e != 0 && c == e))
             return false;
+    }
     return true;
 }
 
