@@ -29,25 +29,6 @@ std::string Lower(std::string s)
     return s;
 }
 
-// "C:" of the first fixed drive, as the tree lists them.
-std::string FirstFixedDrive()
-{
-    char drives[512] = "";
-    ::GetLogicalDriveStringsA(sizeof(drives), drives);
-    for (const char* p = drives; *p; p += strlen(p) + 1)
-        if (::GetDriveTypeA(p) == DRIVE_FIXED) return std::string(p, 2);
-    return "";
-}
-
-// A drive letter that the machine does not have.
-std::string MissingDrive()
-{
-    const DWORD mask = ::GetLogicalDrives();
-    for (int i = 'Q' - 'A'; i < 26; ++i)
-        if ((mask & (1u << i)) == 0) return std::string(1, static_cast<char>('A' + i)) + ":";
-    return "";
-}
-
 class DirectoryTreeTest : public qotest::HostFrameTest {
 protected:
     DirectoryTreeTest() : HostFrameTest("Verzeichnisse", 360, 460) {}
@@ -90,8 +71,14 @@ protected:
 
 TEST_F(DirectoryTreeTest, OpensAlongTheStartPathOrFallsBack)
 {
-    const std::string fixed = FirstFixedDrive() + "\\";
-    const std::string missing = MissingDrive();
+    // The first fixed drive as the tree lists it, and a drive letter the machine does not have.
+    std::string fixed, missing;
+    char drives[512] = "";
+    ::GetLogicalDriveStringsA(sizeof(drives), drives);
+    for (const char* p = drives; *p && fixed.empty(); p += strlen(p) + 1)
+        if (::GetDriveTypeA(p) == DRIVE_FIXED) fixed = std::string(p, 2) + "\\";
+    for (int i = 'Q' - 'A'; i < 26 && missing.empty(); ++i)
+        if ((::GetLogicalDrives() & (1u << i)) == 0) missing = std::string(1, char('A' + i)) + ":";
     ASSERT_FALSE(missing.empty());
     struct Case {
         std::string start, selected;

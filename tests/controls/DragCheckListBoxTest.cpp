@@ -27,16 +27,15 @@ public:
 // "Text:data:check[:aus]" of each item; Gamma is disabled.
 const std::vector<std::string> kStart = {"Alpha:10:1", "Beta:11:0", "Gamma:12:1:aus", "Delta:13:0"};
 
-const DWORD kListStyle = WS_CHILD | WS_VISIBLE | WS_BORDER | WS_VSCROLL | WS_HSCROLL | LBS_NOTIFY |
-                         LBS_OWNERDRAWFIXED | LBS_HASSTRINGS | LBS_NOINTEGRALHEIGHT;
-
 class DragCheckListBoxTest : public qotest::HostFrameTest {
 protected:
     DragCheckListBoxTest() : HostFrameTest("Spalten", 360, 300) {}
     void SetUp() override
     {
         HostFrameTest::SetUp();
-        ASSERT_TRUE(m_list.Create(kListStyle, CRect(10, 10, 230, 210), m_pFrame, 100));
+        ASSERT_TRUE(m_list.Create(WS_CHILD | WS_VISIBLE | WS_BORDER | WS_VSCROLL | WS_HSCROLL | LBS_NOTIFY |
+                                      LBS_OWNERDRAWFIXED | LBS_HASSTRINGS | LBS_NOINTEGRALHEIGHT,
+                                  CRect(10, 10, 230, 210), m_pFrame, 100));
         m_list.SetFont(CFont::FromHandle((HFONT)::GetStockObject(DEFAULT_GUI_FONT)));
         m_list.AddModifiedListener(&m_listener);
         Fill(kStart);
@@ -180,10 +179,8 @@ TEST_F(DragCheckListBoxTest, TicksByClickAndSpaceBarReachTheListenersAsDoOtherKe
     for (const auto& s : steps) {
         SCOPED_TRACE(s.item >= 0 ? "click " + std::to_string(s.item) : "key " + std::to_string(s.key));
         const int before = m_listener.calls;
-        if (s.item < 0)
-            qotest::PressKey(s.key);
-        else
-            qotest::Click(m_list.m_hWnd, Item(s.item).left + 8, Item(s.item).CenterPoint().y);
+        s.item < 0 ? qotest::PressKey(s.key)
+                   : qotest::Click(m_list.m_hWnd, Item(s.item).left + 8, Item(s.item).CenterPoint().y);
         qotest::PumpFor(30);
         std::vector<int> checks;
         for (int i = 0; i < m_list.GetCount(); ++i) checks.push_back(m_list.GetCheck(i));

@@ -147,7 +147,7 @@ TEST(InputDialog, ShowsTitlePromptAndValueAndReturnsWhatWasTyped)
     EXPECT_EQ(CString("Stra\xDF" "e"), dlg.m_strValue);
 }
 
-TEST(FileOpenDlg, ProgramFieldsOnlyForAnotherProgramAndBrowseFillsThem)
+TEST(FileOpenDlg, ProgramFieldsOnlyForAnotherProgramAndOkStartsItOrReportsThatItCannot)
 {
     const std::string file =
         "C:\\Daten\\Ausgabe\\2024\\Quartal 3\\Kunden mit langen Namen\\Filiale Nord\\kunden_gesamt.txt";
@@ -179,14 +179,11 @@ TEST(FileOpenDlg, ProgramFieldsOnlyForAnotherProgramAndBrowseFillsThem)
                }},
               [&] { EXPECT_EQ(IDCANCEL, dlg.DoModal()); });
     EXPECT_EQ((std::vector<bool>{false, false, true}), enabled);
-}
 
-TEST(FileOpenDlg, OkStartsTheProgramOrReportsThatItCannot)
-{
-    // A program that cannot start: the message, and the dialog stays open.
-    const std::string file = qotest::TempPath("qo_oeffnen_mit.txt");
+    // OK with a program that cannot start: the message, and the dialog stays open.
+    const std::string missing = qotest::TempPath("qo_oeffnen_mit.txt");
     CQoFileOpenDlg broken;
-    broken.SetFile(file.c_str());
+    broken.SetFile(missing.c_str());
     broken.SetRadio(2);
     broken.SetProgram("C:\\gibt es nicht\\programm.exe");
     std::string message;
@@ -201,14 +198,14 @@ TEST(FileOpenDlg, OkStartsTheProgramOrReportsThatItCannot)
                    box.Press(IDOK);
                }},
               [&] { EXPECT_EQ(IDCANCEL, broken.DoModal()); });
-    EXPECT_EQ("Die Datei '" + file + "' konnte nicht ge\xF6" "ffnet werden.", message);
+    EXPECT_EQ("Die Datei '" + missing + "' konnte nicht ge\xF6" "ffnet werden.", message);
 
     // A program that starts: the dialog closes with OK.
-    CQoFileOpenDlg dlg;
-    dlg.SetFile("C:\\daten mit blank\\kunden.txt");
-    dlg.SetRadio(2);
-    dlg.SetProgram(HarmlessProgram().c_str());
-    Answering({[](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, dlg.DoModal()); });
+    CQoFileOpenDlg working;
+    working.SetFile("C:\\daten mit blank\\kunden.txt");
+    working.SetRadio(2);
+    working.SetProgram(program.c_str());
+    Answering({[](qotest::Dialog& d) { d.Press(IDOK); }}, [&] { EXPECT_EQ(IDOK, working.DoModal()); });
 }
 
 namespace {

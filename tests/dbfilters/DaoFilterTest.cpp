@@ -238,7 +238,7 @@ TEST(DaoFilters, ThePasswordIsAskedForUntilItFitsOrTheUserCancelsButNeverInABatc
     QoBatchMessageBoxSetMode(false);
     _theLog.Close();
     EXPECT_EQ(0, driver.Unanswered()) << "no dialog in a batch run";
-    std::string text = ReadFileBytes(folder.Path("lauf.log"));
+    std::string text = ReadBytes(folder.Path("lauf.log"));
     size_t first = text.find(path);
     ASSERT_NE(std::string::npos, first) << text;
     EXPECT_NE(std::string::npos, text.find(path, first + 1)) << "one line for each filter: " << text;
@@ -254,7 +254,7 @@ TEST(DaoFilters, AFileOfAnotherKindIsRefusedAndKept)
     out.NumCols(1);
     EXPECT_FALSE(ErrorOf([&] { out.UseDB(text.c_str()); }).empty());
     EXPECT_FALSE(out.Init());
-    EXPECT_EQ("Nr;Name\r\n1;M\xFCller\r\n", ReadFileBytes(text));
+    EXPECT_EQ("Nr;Name\r\n1;M\xFCller\r\n", ReadBytes(text));
 }
 
 TEST(DaoFilters, AccessFilesAreReadAsTheyAre)

@@ -408,7 +408,7 @@ TEST(OdbcFiltersPostgres, TheServerReceivesTheStatementsOfTheTableInOrder)
     std::string text;
     for (int i = 0; i < 50 && text.find("create index t_beispiel2") == std::string::npos; ++i) {
         Sleep(100);
-        text = ReadFileBytes(log);
+        text = ReadBytes(log);
     }
     std::smatch created;
     ASSERT_TRUE(std::regex_search(text, created, std::regex("create table (qo_neu_[0-9a-f]{8}) \\(name varchar\\(400\\), num integer\\)")))
@@ -505,7 +505,7 @@ TEST(OdbcFiltersSqlite, ANulInsideAValueIsStoredWhole)
                                          "out = subprocess.check_output(['sqlite3', os.path.join(folder, 'werte.db'),"
                                          " 'select hex(name) from t'])\n"
                                          "open(os.path.join(folder, 'hex.txt'), 'wb').write(out)\n"));
-    EXPECT_EQ("61620063C3A4\n", ReadFileBytes(folder.Path("hex.txt")));
+    EXPECT_EQ("61620063C3A4\n", ReadBytes(folder.Path("hex.txt")));
 }
 
 TEST(OdbcFiltersSqlite, FilesThatAreNoDatabaseGiveClearErrorsAndBatchModeReadsNothing)

@@ -93,10 +93,8 @@ protected:
     DbInputPageTest() : HostFrameTest("Eingabe", 720, 520) {}
     void TearDown() override
     {
-        if (m_pPage != NULL) {
-            m_pPage->DestroyWindow();
-            delete m_pPage;
-        }
+        if (m_pPage != NULL) m_pPage->DestroyWindow();
+        delete m_pPage;
         HostFrameTest::TearDown();
     }
     int ModifiedListenerSetModified(int, int nNotifierId) override

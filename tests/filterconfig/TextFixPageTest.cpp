@@ -49,10 +49,8 @@ protected:
     }
     void TearDown() override
     {
-        if (m_pPage != NULL) {
-            m_pPage->DestroyWindow();
-            delete m_pPage;
-        }
+        if (m_pPage != NULL) m_pPage->DestroyWindow();
+        delete m_pPage;
         HostFrameTest::TearDown();
         ::DeleteFileA(m_strFile.c_str());
     }
@@ -101,7 +99,7 @@ protected:
     std::vector<int> m_calls;
 };
 
-TEST_F(TextFixPageTest, ClickSetsDoubleClickDeletesDragMovesAMark)
+TEST_F(TextFixPageTest, ClickSetsDoubleClickDeletesDragMovesAMarkAndAVanishedFileIsNamed)
 {
     Open(&m_filter);
     Measure();
@@ -127,6 +125,16 @@ TEST_F(TextFixPageTest, ClickSetsDoubleClickDeletesDragMovesAMark)
     EXPECT_EQ(std::vector<int>({X(0), X(7), X(20)}), MarkLines());
     EXPECT_EQ(std::vector<int>(4, kPageId), m_calls);
     qotest::CaptureWindow(m_pPage->m_hWnd, qotest::CapturePath("input-textfix-4009.png").c_str());
+
+    // The file vanished: named, the filter's columns kept, the user's new mark still shown.
+    m_filter.CloseFile();
+    ASSERT_TRUE(::DeleteFileA(m_strFile.c_str()));
+    qotest::Click(m_hView, X(5), Y());
+    qotest::PumpApp(150);
+    EXPECT_EQ("Die Datei '" + m_strFile + "' konnte nicht ge\xF6" "ffnet werden.", qotest::MessageOf([&] { Apply(); }));
+    EXPECT_EQ(std::vector<int>({7, 13}), Widths(m_filter));
+    EXPECT_EQ(4u, m_calls.size());
+    EXPECT_EQ(std::vector<int>({X(0), X(5), X(7), X(20)}), MarkLines());
 }
 
 TEST_F(TextFixPageTest, RecordLengthSpinAndCharacterSetReachTheFilter)
@@ -153,21 +161,6 @@ TEST_F(TextFixPageTest, RecordLengthSpinAndCharacterSetReachTheFilter)
     qotest::TypeOver(m_pPage->GetDlgItem(IDC_TEXTFIX_RECORD_LEN)->m_hWnd, "99999999");
     EXPECT_EQ("Die Satzl\xE4nge darf h\xF6" "chstens 16777216 betragen.", qotest::MessageOf([&] { Apply(); }));
     EXPECT_EQ(26, m_filter.RecordLen());
-}
-
-TEST_F(TextFixPageTest, AVanishedFileIsNamedAndTheLastStateKept)
-{
-    Open(&m_filter);
-    Measure();
-    m_filter.CloseFile();
-    ASSERT_TRUE(::DeleteFileA(m_strFile.c_str()));
-    qotest::Click(m_hView, X(5), Y());
-    qotest::PumpApp(150);
-    EXPECT_EQ("Die Datei '" + m_strFile + "' konnte nicht ge\xF6" "ffnet werden.", qotest::MessageOf([&] { Apply(); }));
-    EXPECT_EQ(std::vector<int>({10, 10}), Widths(m_filter));
-    EXPECT_TRUE(m_calls.empty());
-    // The user's new mark is still shown.
-    EXPECT_EQ(std::vector<int>({X(0), X(5), X(10), X(20)}), MarkLines());
 }
 
 TEST_F(TextFixPageTest, LinesModeCutsUpToTheLongestLineAndKeepsTheRecordLengthOff)

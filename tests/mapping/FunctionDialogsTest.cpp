@@ -29,14 +29,11 @@ CFunction Combination(long id, const char* name, std::vector<CPart> parts)
 CFunctionManager Sample()
 {
     CFunctionManager m;
-    const char* predefined[] = {"(keine)", "Name", "Vorname", "PLZ", "Ort"};
-    for (long id = 0; id < 5; ++id) {
-        CFunction f(id, predefined[id]);
-        m.AddFunction(f);
-    }
-    for (CFunction f : {CFunction(30000, "Feld aus Datei"), CFunction(10000, "Kunde"), CFunction(10001, "Filiale"),
-                               Combination(20000, "Vorname Name", {CPart(2, "", false), CPart(1, " ", false)}),
-                               Combination(20001, "Filiale-PLZ", {CPart(10001, "", false), CPart(3, "-", true)})})
+    for (CFunction f : {CFunction(0, "(keine)"), CFunction(1, "Name"), CFunction(2, "Vorname"), CFunction(3, "PLZ"),
+                        CFunction(4, "Ort"), CFunction(30000, "Feld aus Datei"), CFunction(10000, "Kunde"),
+                        CFunction(10001, "Filiale"),
+                        Combination(20000, "Vorname Name", {CPart(2, "", false), CPart(1, " ", false)}),
+                        Combination(20001, "Filiale-PLZ", {CPart(10001, "", false), CPart(3, "-", true)})})
         m.AddFunction(f);
     m.SetNextPredefinedId(5);
     m.SetNextUserdefinedId(10002);

@@ -36,7 +36,7 @@ std::vector<std::string> Walk(CQoInputFilter& f)
 
 } // namespace
 
-TEST(InputFilterOutSource, RowsAreTheSourceRowsFromRowZero)
+TEST(InputFilterOutSource, RowsAreTheSourceRowsFromRowZeroAndColumnsItsOutputColumns)
 {
     TableSource s = ThreeRows();
     CQoInputFilterOutSource f;
@@ -48,6 +48,17 @@ TEST(InputFilterOutSource, RowsAreTheSourceRowsFromRowZero)
     EXPECT_FALSE(f.NextRow());
     EXPECT_EQ(2L, s.lastRow);
     EXPECT_FALSE(f.AbsoluteRow(3));
+
+    // The columns follow the selection, the order and the conversions.
+    s.ToFront("Ort");
+    s.SetNoUmlaute(true);
+    s.SetUseCapitals(true);
+    CQoString name;
+    f.ColName(0, name);
+    EXPECT_STREQ("Ort", name);
+    EXPECT_EQ((std::vector<std::string>{"KOELN|MUELLER", "|WEISS", "|"}), Walk(f));
+    s.SetSelected("Ort", false);
+    EXPECT_EQ(1, f.NumCols());
 
     // No rows: no first row, and the host is never asked for a row; rows that
     // arrive after a failed FirstRow are read from the first one.
@@ -66,23 +77,6 @@ TEST(InputFilterOutSource, RowsAreTheSourceRowsFromRowZero)
     EXPECT_EQ(0L, f.NumRows());
     EXPECT_FALSE(f.FirstRow() || f.NextRow());
     EXPECT_EQ("vorher", Field(f, 0));
-}
-
-TEST(InputFilterOutSource, ColumnsFollowTheSelectionAndConversions)
-{
-    TableSource s = ThreeRows();
-    CQoInputFilterOutSource f;
-    f.SetOutputSource(&s);
-    s.ToFront("Ort");
-    s.SetNoUmlaute(true);
-    s.SetUseCapitals(true);
-    CQoString name;
-    f.ColName(0, name);
-    EXPECT_STREQ("Ort", name);
-    EXPECT_EQ((std::vector<std::string>{"KOELN|MUELLER", "|WEISS", "|"}), Walk(f));
-
-    s.SetSelected("Ort", false);
-    EXPECT_EQ(1, f.NumCols());
 }
 
 TEST(InputFilterOutSource, CopiesShareTheSourceAndNobodyDeletesIt)

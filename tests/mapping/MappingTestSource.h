@@ -10,19 +10,12 @@
 
 namespace mappingtest {
 
-class TableSource : public COutputFilterSource
-{
+class TableSource : public COutputFilterSource {
 public:
     // names: the inner columns; rows: one vector of values per row.
     TableSource(std::vector<std::string> names, std::vector<std::vector<std::string>> rows)
-        : m_names(std::move(names)), m_rows(std::move(rows))
-    {
-    }
-    ~TableSource() override
-    {
-        if (m_pDestroyed)
-            *m_pDestroyed = true;
-    }
+        : m_names(std::move(names)), m_rows(std::move(rows)) {}
+    ~TableSource() override { if (m_pDestroyed) *m_pDestroyed = true; }
 
     void GetSourceValue(long row, int column, CString& value) override
     {
@@ -42,8 +35,7 @@ public:
     void AddColumn(const char* name, const char* value)
     {
         m_names.push_back(name);
-        for (std::vector<std::string>& row : m_rows)
-            row.push_back(value);
+        for (std::vector<std::string>& row : m_rows) row.push_back(value);
     }
     void AddRow(std::vector<std::string> row) { m_rows.push_back(std::move(row)); }
     void WatchDestruction(bool* flag) { m_pDestroyed = flag; }
@@ -55,9 +47,7 @@ public:
         for (int i = 0; i < GetEntryCount(); ++i) {
             CEntry e;
             GetEntry(i, e);
-            if (!out.empty())
-                out += ",";
-            out += (e.GetSelected() ? "" : "-") + std::string(e.GetName());
+            out += (out.empty() ? "" : ",") + std::string(e.GetSelected() ? "" : "-") + e.GetName().GetString();
         }
         return out;
     }
@@ -68,9 +58,7 @@ public:
         for (int c = 0; c < GetNumColumns(); ++c) {
             CQoString name;
             GetColumnName(c, name);
-            if (c)
-                out += ",";
-            out += name.GetString();
+            out += (c ? "," : "") + std::string(name.GetString());
         }
         return out;
     }

@@ -99,10 +99,6 @@ protected:
 TEST_F(OutputSourceConfigTest, TicksAndADragGoIntoTheSourceAtOnceAndOnlyChangesAreTold)
 {
     EXPECT_EQ((std::vector<std::string>{"Name", "Vorname", "PLZ", "Ort"}), ListTexts());
-    auto drag = [this](int from, int to) {
-        ::Sleep(600);  // no double click with the click before
-        qotest::Drag(m_list, {80, Item(from).top + 4}, {80, Item(to).top + 3});
-    };
     const struct {
         const char* what;
         std::function<void()> act;
@@ -112,7 +108,7 @@ TEST_F(OutputSourceConfigTest, TicksAndADragGoIntoTheSourceAtOnceAndOnlyChangesA
         {"untick Vorname", [&] { ClickBox(1); }, "Name:0 -Vorname:1 PLZ:2 Ort:3", 1, 3},
         {"click on the text of Name", [&] { ::Sleep(600), qotest::Click(m_list, 80, Item(0).top + 4); }, "Name:0 -Vorname:1 PLZ:2 Ort:3", 1, 3},
         {"space on Name", [] { qotest::PressKey(VK_SPACE); }, "-Name:0 -Vorname:1 PLZ:2 Ort:3", 2, 2},
-        {"drag PLZ to the top", [&] { drag(2, 0); }, "PLZ:2 -Name:0 -Vorname:1 Ort:3", 3, 2},
+        {"drag PLZ to the top", [&] { ::Sleep(600), qotest::Drag(m_list, {80, Item(2).top + 4}, {80, Item(0).top + 3}); }, "PLZ:2 -Name:0 -Vorname:1 Ort:3", 3, 2},
         {"tick Vorname", [&] { ClickBox(2); }, "PLZ:2 -Name:0 Vorname:1 Ort:3", 4, 3},
     };
     for (const auto& s : steps) {

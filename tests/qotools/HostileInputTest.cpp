@@ -33,7 +33,7 @@ std::string ErrorOf(std::function<void()> const &action)
 
 } // namespace
 
-TEST(HostileSettings, OutOfBoundNumbersRaiseNamingTheSetting)
+TEST(HostileSettings, OutOfBoundNumbersRaiseAHugeRecordOnATinyFileReads)
 {
     struct Case {
         char const *what;
@@ -101,10 +101,8 @@ TEST(HostileSettings, OutOfBoundNumbersRaiseNamingTheSetting)
     EXPECT_NE(std::string::npos, ErrorOf([&] { out.SetLength(1, 100); }).find("column1_len"));
     EXPECT_NE(std::string::npos, ErrorOf([&] { out.NumCols(5); }).find("columns"));
     EXPECT_EQ(3, out.NumCols());
-}
 
-TEST(HostileSettings, HugeRecordLengthOnATinyFileReadsWithoutAHugeBuffer)
-{
+    // A huge record length on a tiny file reads without a huge buffer.
     TempFolder tmp;
     std::string path = tmp.Path("klein.txt");
     WriteBytes(path, "abcdefghijklmnopqrstuvwx"); // 24 bytes
@@ -183,21 +181,20 @@ TEST(HostileFiles, ByteOrderMarkAndEndMarkAreNotData)
     }
 
     WriteBytes(path, bom + "NameOrt \r\nAnnaBonn\r\n\x1A");
+    auto layout = [](auto &f) {
+        f.SetNumCols(2);
+        f.ColLen(0, 4);
+        f.ColLen(1, 4);
+        f.SetFirstRowHasNames(true);
+    };
     CQoInputFilterTextVF vf;
-    vf.SetNumCols(2);
-    vf.ColLen(0, 4);
-    vf.ColLen(1, 4);
-    vf.SetFirstRowHasNames(true);
+    layout(vf);
     vf.Init(path.c_str());
     EXPECT_EQ((std::vector<Row>{{"Anna", "Bonn"}}), AllRows(vf));
-
     WriteBytes(path, bom + "NameOrt Anna\xE4" "Bon\x1A");
     CQoInputFilterTextFix fix;
     fix.RecordLen(8);
-    fix.SetNumCols(2);
-    fix.ColLen(0, 4);
-    fix.ColLen(1, 4);
-    fix.SetFirstRowHasNames(true);
+    layout(fix);
     fix.Init(path.c_str());
     EXPECT_EQ((std::vector<Row>{{"Anna", "\xE4" "Bon"}}), AllRows(fix));
 }

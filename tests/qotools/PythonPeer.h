@@ -3,6 +3,8 @@
 // Z:\tmp and Python starts through `start /wait /unix`; where it cannot, the check skips.
 #pragma once
 
+#include "TempFolder.h"
+
 #include <gtest/gtest.h>
 
 #include <chrono>
@@ -53,14 +55,6 @@ private:
     std::string m_unix;
 };
 
-inline std::string ReadFileBytes(std::string const &path)
-{
-    std::ifstream in(path, std::ios::binary);
-    std::ostringstream all;
-    all << in.rdbuf();
-    return all.str();
-}
-
 // Runs `script` with `folder` bound to the folder; false (traceback printed) on failure.
 inline bool RunPython(PeerFolder const &folder, char const *name, std::string const &script)
 {
@@ -94,7 +88,7 @@ inline bool RunPython(PeerFolder const &folder, char const *name, std::string co
             break;
         std::this_thread::sleep_for(std::chrono::milliseconds(100));
     }
-    std::printf("peer script %s did not finish: %s\n", name, ReadFileBytes(folder.Path("failed")).c_str());
+    std::printf("peer script %s did not finish: %s\n", name, ReadBytes(folder.Path("failed")).c_str());
     return false;
 }
 
@@ -110,9 +104,8 @@ inline bool RunPython(PeerFolder const &folder, char const *name, std::string co
 inline std::vector<std::string> ReadPeerLines(std::string const &path)
 {
     std::vector<std::string> lines;
-    std::string data = ReadFileBytes(path), line;
-    std::istringstream in(data);
-    while (std::getline(in, line))
+    std::istringstream in(ReadBytes(path));
+    for (std::string line; std::getline(in, line);)
         lines.push_back(line);
     return lines;
 }

@@ -26,7 +26,7 @@ struct Counted {
 };
 int Counted::alive = 0;
 
-TEST(CArrayTest, InsertBeyondTheEndRemoveAndSetAtGrow) {
+TEST(CArrayTest, InsertBeyondTheEndRemoveSetAtGrowAndArgumentsFromTheArray) {
   CArray<CString, CString&> a;
   CString s1("eins"), s3("drei"), x("x");
   a.Add(s1);
@@ -36,11 +36,10 @@ TEST(CArrayTest, InsertBeyondTheEndRemoveAndSetAtGrow) {
   EXPECT_EQ("eins|x|x|", Join(a));
   a.SetAtGrow(4, s3);
   EXPECT_EQ("eins|x|x||drei|", Join(a));
-}
 
-TEST(CArrayTest, ElementsThatReferToTheArrayItself) {
-  CArray<CString, CString&> a;
+  // Arguments that refer to the array itself.
   CString first("a");
+  a.RemoveAll();
   a.Add(first);
   for (int i = 0; i < 100; ++i) a.Add(a[0]); // growing must not invalidate the argument
   a.Append(a);

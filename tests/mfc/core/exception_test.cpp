@@ -51,7 +51,7 @@ TEST(ExceptionDelete, HeapExceptionsAreFreedStackOnesAreNot) {
   }
 }
 
-TEST(ExceptionMacros, CatchDeletesUnlessRethrown) {
+TEST(ExceptionMacros, CatchDeletesUnlessRethrownAlsoAcrossTheDll) {
   CCountedException::destroyed = 0;
   bool bCaught = false;
   TRY {
@@ -82,9 +82,8 @@ TEST(ExceptionMacros, CatchDeletesUnlessRethrown) {
   ASSERT_NE(nullptr, pOuter);
   EXPECT_EQ(CFileException::diskFull, static_cast<CFileException*>(pOuter)->m_cause);
   pOuter->Delete();
-}
 
-TEST(ExceptionAcrossDll, ThrownInTheDllCaughtHere) {
+  // Thrown in the DLL, caught here.
   try {
     TestDllThrowFileException("C:\\fehlt.txt");
     ADD_FAILURE() << "nothing thrown";
@@ -95,14 +94,12 @@ TEST(ExceptionAcrossDll, ThrownInTheDllCaughtHere) {
   }
 }
 
-TEST(ExceptionMessages, GermanTextsAndTruncation) {
+TEST(ExceptionMessages, GermanTextsTruncationAndOsErrorCauses) {
   CFileException e(CFileException::fileNotFound, ERROR_FILE_NOT_FOUND, "C:\\daten\\kunden.txt");
   EXPECT_EQ("Die Datei C:\\daten\\kunden.txt wurde nicht gefunden.", Message(e));
   EXPECT_EQ("Die Datei", Message(e, 10)); // 9 characters and the NUL
   EXPECT_EQ("<none:>", Message(CUserException(FALSE)));
-}
-
-TEST(ExceptionMessages, OsErrorsMapToCauses) {
+  // OS errors map to causes.
   EXPECT_EQ(CFileException::badPath, CFileException::OsErrorToException(ERROR_INVALID_NAME));
   EXPECT_NO_THROW(CFileException::ThrowOsError(NO_ERROR, "x"));
   try {

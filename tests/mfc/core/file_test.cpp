@@ -36,6 +36,19 @@ protected:
   std::filesystem::path m_dir;
 };
 
+// The cause of the CFileException that a call raised, or -1.
+template <typename F>
+int CauseOf(F&& f) {
+  try {
+    f();
+  } catch (CFileException* e) {
+    int nCause = e->m_cause;
+    e->Delete();
+    return nCause;
+  }
+  return -1;
+}
+
 TEST_F(FileTest, WriteReadSeekLength) {
   std::string data;
   for (int i = 0; i < 100000; ++i) data += (char)(i * 7);
@@ -55,7 +68,7 @@ TEST_F(FileTest, WriteReadSeekLength) {
   EXPECT_EQ(data.substr(0, 50), ReadAll("daten.bin"));
 }
 
-TEST_F(FileTest, MissingFileGivesCauseCodes) {
+TEST_F(FileTest, MissingFilesSharingAndAccessGiveCauseCodes) {
   CFile f;
   CFileException e;
   CString strMissing = Path("fehlt.txt");
@@ -64,14 +77,11 @@ TEST_F(FileTest, MissingFileGivesCauseCodes) {
   EXPECT_TRUE(e.m_strFileName == strMissing);
   EXPECT_FALSE(f.Open(Path("gibtsnicht\\x.txt"), CFile::modeCreate | CFile::modeWrite, &e));
   EXPECT_EQ(CFileException::badPath, e.m_cause);
-}
 
-TEST_F(FileTest, SharingAndAccess) {
   WriteAll("s.txt", "x");
   CFile first;
   ASSERT_TRUE(first.Open(Path("s.txt"), CFile::modeRead | CFile::shareDenyWrite));
   CFile second;
-  CFileException e;
   EXPECT_FALSE(second.Open(Path("s.txt"), CFile::modeWrite | CFile::shareDenyNone, &e));
   EXPECT_EQ(CFileException::sharingViolation, e.m_cause);
   EXPECT_TRUE(second.Open(Path("s.txt"), CFile::modeRead | CFile::shareDenyNone));
@@ -80,13 +90,7 @@ TEST_F(FileTest, SharingAndAccess) {
 
   CFile writeOnly(Path("s.txt"), CFile::modeWrite);
   char c;
-  try {
-    writeOnly.Read(&c, 1);
-    ADD_FAILURE() << "nothing thrown";
-  } catch (CFileException* pe) {
-    EXPECT_EQ(CFileException::accessDenied, pe->m_cause);
-    pe->Delete();
-  }
+  EXPECT_EQ(CFileException::accessDenied, CauseOf([&] { writeOnly.Read(&c, 1); }));
 }
 
 TEST_F(FileTest, NamesStatusRenameRemove) {
@@ -105,13 +109,7 @@ TEST_F(FileTest, NamesStatusRenameRemove) {
   EXPECT_EQ("12345", ReadAll("neu.txt"));
   CFile::Remove(Path("neu.txt"));
   EXPECT_EQ("<missing>", ReadAll("neu.txt"));
-  try {
-    CFile::Remove(Path("neu.txt"));
-    ADD_FAILURE() << "nothing thrown";
-  } catch (CFileException* pe) {
-    EXPECT_EQ(CFileException::fileNotFound, pe->m_cause);
-    pe->Delete();
-  }
+  EXPECT_EQ(CFileException::fileNotFound, CauseOf([&] { CFile::Remove(Path("neu.txt")); }));
 }
 
 TEST_F(FileTest, StdioFileTextModeLongLinesAndAppending) {

@@ -16,7 +16,7 @@ public:
 };
 IMPLEMENT_DYNCREATE(CTestTriangle, CTestShape)
 
-TEST(RuntimeClass, KindsAcrossTheDllAndDowncasts) {
+TEST(RuntimeClass, KindsAcrossTheDllDowncastsCreateObjectAndFromName) {
   EXPECT_TRUE(RUNTIME_CLASS(CTestSquare)->IsDerivedFrom(RUNTIME_CLASS(CObject)));
   CTestTriangle triangle;
   EXPECT_TRUE(triangle.IsKindOf(RUNTIME_CLASS(CTestShape)));
@@ -30,10 +30,8 @@ TEST(RuntimeClass, KindsAcrossTheDllAndDowncasts) {
   EXPECT_EQ(nullptr, DYNAMIC_DOWNCAST(CTestTriangle, p));
   EXPECT_EQ(nullptr, DYNAMIC_DOWNCAST(CTestShape, (CObject*)NULL));
   delete p;
-}
 
-TEST(RuntimeClass, CreateObjectAndFromName) {
-  CObject* p = CRuntimeClass::CreateObject("CTestTriangle");
+  p = CRuntimeClass::CreateObject("CTestTriangle");
   ASSERT_NE(nullptr, p);
   EXPECT_EQ(3, static_cast<CTestShape*>(p)->Sides());
   delete p;

@@ -18,6 +18,17 @@ TEST(CStringEdit, AppendingTheStringToItself) {
   s += 'c';
   s += (LPCSTR)s + 2; // a pointer into the string itself
   EXPECT_EQ("ababcabc", Bytes(s));
+  // Replace returns the count, matching left to right without overlaps or
+  // searching the replacement again.
+  CString t("aaa");
+  EXPECT_EQ(1, t.Replace("aa", "b"));
+  EXPECT_EQ("ba", Bytes(t));
+  CString w("aXa");
+  EXPECT_EQ(2, w.Replace("a", "aa"));
+  EXPECT_EQ("aaXaa", Bytes(w));
+  EXPECT_EQ(0, w.Replace("", "z"));
+  EXPECT_EQ(1, w.Replace("X", NULL));
+  EXPECT_EQ("aaaa", Bytes(w));
 }
 
 TEST(CStringCompare, BytesUnsignedNoCaseAndCollation) {
@@ -41,18 +52,6 @@ TEST(CStringExtract, MidLeftRightClampToTheString) {
   EXPECT_EQ("", Bytes(CString("abc").SpanIncluding("0123456789")));
 }
 
-TEST(CStringEdit, ReplaceReturnsTheCount) {
-  CString t("aaa");
-  EXPECT_EQ(1, t.Replace("aa", "b")); // left to right, not overlapping
-  EXPECT_EQ("ba", Bytes(t));
-  CString w("aXa");
-  EXPECT_EQ(2, w.Replace("a", "aa")); // the replacement is not searched again
-  EXPECT_EQ("aaXaa", Bytes(w));
-  EXPECT_EQ(0, w.Replace("", "z"));
-  EXPECT_EQ(1, w.Replace("X", NULL));
-  EXPECT_EQ("aaaa", Bytes(w));
-}
-
 TEST(CStringFormat, LongTextNumbersAndArgumentsFromTheTarget) {
   CString s;
   s.Format("%d|%5.2f|%x|%s|%c|%lld", -42, 3.14159, 255, "Text", 'Z', 1234567890123LL);
@@ -74,9 +73,7 @@ TEST(CStringBuffer, GetBufferReleaseBuffer) {
   EXPECT_EQ("Hallo Welt", Bytes(s));
 
   CString e;
-  LPSTR pe = e.GetBuffer(0);
-  ASSERT_NE(nullptr, pe);
-  pe[0] = '\0';
+  e.GetBuffer(0)[0] = '\0'; // an empty string still has room for the NUL
   e.ReleaseBuffer();
   EXPECT_TRUE(e.IsEmpty());
 

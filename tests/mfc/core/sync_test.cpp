@@ -17,7 +17,7 @@ TEST(SyncTest, NamedEventIsSharedAndReleasesOneWait)
     EXPECT_FALSE(first.Lock(0));
 }
 
-TEST(SyncTest, MultiLockWaitsForAnyOneOrForAll)
+TEST(SyncTest, MultiLockWaitsForAnyOneForAllOrForQueueInput)
 {
     CEvent a, b;
     CSyncObject* objects[2] = {&a, &b};
@@ -44,20 +44,15 @@ TEST(SyncTest, MultiLockWaitsForAnyOneOrForAll)
     EXPECT_EQ(WAIT_OBJECT_0, lock.Lock(1000, TRUE));
     EXPECT_FALSE(a.Lock(0)); // both were taken
     EXPECT_FALSE(b.Lock(0));
-}
 
-TEST(SyncTest, MultiLockWakesForQueueInputWithTheWakeMask)
-{
-    CEvent a;
-    CSyncObject* objects[1] = {&a};
-    CMultiLock lock(objects, 1);
+    // Queue input ends a wait with the wake mask, and only with it.
+    CMultiLock single(objects, 1);
     MSG msg;
     ::PeekMessageA(&msg, NULL, 0, 0, PM_NOREMOVE); // this thread's queue
     ASSERT_TRUE(::PostThreadMessageA(::GetCurrentThreadId(), WM_APP, 0, 0));
-    EXPECT_EQ(WAIT_OBJECT_0 + 1, lock.Lock(1000, FALSE, QS_POSTMESSAGE));
-    EXPECT_FALSE(lock.IsLocked(0));
-    // Without the mask the message does not end the wait.
-    EXPECT_EQ((DWORD)WAIT_TIMEOUT, lock.Lock(20, FALSE, 0));
+    EXPECT_EQ(WAIT_OBJECT_0 + 1, single.Lock(1000, FALSE, QS_POSTMESSAGE));
+    EXPECT_FALSE(single.IsLocked(0));
+    EXPECT_EQ((DWORD)WAIT_TIMEOUT, single.Lock(20, FALSE, 0));
     ::PeekMessageA(&msg, NULL, WM_APP, WM_APP, PM_REMOVE);
 }
 

@@ -9,6 +9,7 @@
 #include <filesystem>
 #include <random>
 #include <string>
+#include <vector>
 
 // What a call raised: DAO's number ("0" when it raised nothing), and the description.
 struct DaoFailure {
@@ -42,6 +43,17 @@ inline CString TextOf(const COleVariant& var) {
   return var.vt == VT_BSTR ? CString((LPCSTR)var.bstrVal, (int)SysStringByteLen(var.bstrVal)) : CString();
 }
 
+// The names of the database's tables, in the engine's order.
+inline std::vector<CString> TableNames(CDaoDatabase& db) {
+  std::vector<CString> names;
+  for (short i = 0; i < db.GetTableDefCount(); ++i) {
+    CDaoTableDefInfo info;
+    db.GetTableDefInfo(i, info);
+    names.push_back(info.m_strName);
+  }
+  return names;
+}
+
 // A database file made by the test and removed after it.
 class DaoFileTest : public testing::Test {
 protected:
@@ -59,6 +71,19 @@ protected:
     td.Create(lpszName);
     for (const auto& field : fields) td.CreateField(std::get<0>(field), std::get<1>(field), std::get<2>(field));
     td.Append();
+  }
+
+  // An index over the given fields, made on an open table.
+  static void MakeIndex(CDaoTableDef& td, LPCTSTR lpszName, std::initializer_list<CDaoIndexFieldInfo> fields,
+                        BOOL bUnique = FALSE, BOOL bPrimary = FALSE) {
+    std::vector<CDaoIndexFieldInfo> keys(fields);
+    CDaoIndexInfo index;
+    index.m_strName = lpszName;
+    index.m_pFieldInfos = keys.data();
+    index.m_nFields = (short)keys.size();
+    index.m_bUnique = bUnique;
+    index.m_bPrimary = bPrimary;
+    td.CreateIndex(index);
   }
 
   std::string m_file;

@@ -23,18 +23,12 @@ TEST_F(DaoDatabaseTest, CreateMakesAFileThatOpensAgainAndRefusesToOverwrite) {
 }
 
 TEST_F(DaoDatabaseTest, FilesThatAreNoDatabaseOfOursAreRefused) {
-  struct Case {
-    const char* pszName;
-    std::string content;   // written as the file; "-" for no file
-    long lCode;
+  // Name, the file's content ("-" for no file), and the error.
+  const struct { const char* pszName; std::string content; long lCode; } cases[] = {
+      {"missing", "-", 3024}, {"empty", "", 3343},
+      {"truncated SQLite", std::string("SQLite format 3") + '\0' + std::string(84, '\x01'), 3343},
   };
-  std::string sqliteHead = std::string("SQLite format 3") + '\0';
-  const Case cases[] = {
-      {"missing", "-", 3024},
-      {"empty", "", 3343},
-      {"truncated SQLite", sqliteHead + std::string(84, '\x01'), 3343},
-  };
-  for (const Case& c : cases) {
+  for (const auto& c : cases) {
     SCOPED_TRACE(c.pszName);
     std::string file = TempFile(".mdb");
     if (c.content != "-") std::ofstream(file, std::ios::binary) << c.content;
@@ -51,14 +45,8 @@ TEST_F(DaoDatabaseTest, FilesThatAreNoDatabaseOfOursAreRefused) {
 TEST_F(DaoDatabaseTest, PasswordIsCheckedAtOpenAndCanBeChanged) {
   m_db.Create(m_file.c_str(), dbLangGeneral + CString(";pwd=Geheim"));
   m_db.Close();
-  struct Case {
-    const char* pszConnect;
-    long lCode;
-  };
-  const Case before[] = {{"", 3031}, {";PWD=geheim", 3031}};
-  for (const Case& c : before) {
-    SCOPED_TRACE(c.pszConnect);
-    EXPECT_EQ(c.lCode, DaoError([&] { m_db.Open(m_file.c_str(), FALSE, FALSE, c.pszConnect); }).lCode);
+  for (const char* pszConnect : {"", ";PWD=geheim"}) { // none, or in the wrong case
+    EXPECT_EQ(3031, DaoError([&] { m_db.Open(m_file.c_str(), FALSE, FALSE, pszConnect); }).lCode) << pszConnect;
     m_db.Close();
   }
   // The password's text is not in the file.
@@ -100,16 +88,9 @@ TEST_F(DaoDatabaseTest, ExecuteRunsActionStatementsAndRaisesOnFailure) {
   m_db.Execute("update T set A = A * 10");
   EXPECT_EQ(2, m_db.GetRecordsAffected());
   m_db.Execute("update T set A = A + 1 where A = 'x;y';  ");
-  struct Case {
-    const char* pszSQL;
-    long lCode;
-  };
-  const Case cases[] = {
-      {"das ist kein SQL", 3146},
-      {"select * from T", 3065},
-      {"update T set A = 0; delete from T", 3142},
-  };
-  for (const Case& c : cases) {
+  const struct { const char* pszSQL; long lCode; } cases[] = {
+      {"das ist kein SQL", 3146}, {"select * from T", 3065}, {"update T set A = 0; delete from T", 3142}};
+  for (const auto& c : cases) {
     SCOPED_TRACE(c.pszSQL);
     DaoFailure failure = DaoError([&] { m_db.Execute(c.pszSQL, dbFailOnError); });
     EXPECT_EQ(c.lCode, failure.lCode);

@@ -2,8 +2,6 @@
 // and the refusals of writing and of running stored queries.
 #include "DaoTestSupport.h"
 
-#include <vector>
-
 class DaoMdbTest : public testing::Test {
 protected:
   void OpenFixture(const char* pszLeaf) {
@@ -11,22 +9,13 @@ protected:
     if (!std::filesystem::exists(path)) GTEST_SKIP() << path << " is missing: tools/setup.sh fetches it";
     m_db.Open(path.c_str());
   }
-  std::vector<CString> TableNames() {
-    std::vector<CString> names;
-    for (short i = 0; i < m_db.GetTableDefCount(); ++i) {
-      CDaoTableDefInfo info;
-      m_db.GetTableDefInfo(i, info);
-      names.push_back(info.m_strName);
-    }
-    return names;
-  }
   CDaoDatabase m_db;
 };
 
 TEST_F(DaoMdbTest, TheFruitFileListsItsTablesAndReadsThemWhole) {
   OpenFixture("fruit.mdb");
   EXPECT_FALSE(m_db.CanUpdate());
-  EXPECT_EQ((std::vector<CString>{"Fruit", "Fruit Salad", "Veggie Salad", "Muffin/Bread", "Dried"}), TableNames());
+  EXPECT_EQ((std::vector<CString>{"Fruit", "Fruit Salad", "Veggie Salad", "Muffin/Bread", "Dried"}), TableNames(m_db));
 
   CDaoTableDef td(&m_db);
   td.Open("Fruit");
@@ -64,7 +53,7 @@ TEST_F(DaoMdbTest, WritingAndStoredQueriesAreRefusedClearly) {
 
 TEST_F(DaoMdbTest, TheUsersFileGivesTypedValues) {
   OpenFixture("node-adodb.mdb");
-  EXPECT_EQ((std::vector<CString>{"Users"}), TableNames());
+  EXPECT_EQ((std::vector<CString>{"Users"}), TableNames(m_db));
   CDaoRecordset rs(&m_db);
   rs.Open(dbOpenTable, "Users");
   EXPECT_EQ(3, rs.GetRecordCount());

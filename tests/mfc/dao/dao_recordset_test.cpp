@@ -89,8 +89,21 @@ TEST_F(DaoRecordsetTest, ValuesComeAsVariantsOfTheFieldsType) {
   EXPECT_EQ(VT_NULL, rs.GetFieldValue("Leer").vt);
 }
 
-TEST_F(DaoRecordsetTest, TextThatDoesNotFitTheFieldIsRefused) {
+TEST_F(DaoRecordsetTest, EditAndDeleteChangeTheCurrentRecordAndTextThatDoesNotFitIsRefused) {
   CDaoRecordset rs(&m_db);
+  rs.Open(dbOpenDynaset, "select * from Zahlen");
+  rs.Move(1);
+  rs.Edit();
+  rs.SetFieldValue("Text", "zwei");
+  rs.Update();
+  rs.MoveNext();
+  rs.Delete();
+  EXPECT_EQ(3167, DaoError([&] { rs.GetFieldValue(0); }).lCode);
+  rs.Close();
+  CDaoTableDef td(&m_db);
+  td.Open("Zahlen");
+  EXPECT_EQ(4, td.GetRecordCount());
+
   rs.Open(dbOpenTable, "Zahlen");
   rs.AddNew();
   struct { LPCTSTR pszField, pszValue; long lCode; } const cases[] = {
@@ -133,14 +146,7 @@ TEST_F(DaoRecordsetTest, BulkAppendStoresEveryRowWithItsNulls) {
 TEST_F(DaoRecordsetTest, ARowTheFileRefusesIsNeverReportedAsStored) {
   CDaoTableDef td(&m_db);
   td.Open("Zahlen");
-  CDaoIndexFieldInfo key[] = {{"N", FALSE}};
-  CDaoIndexInfo unique;
-  unique.m_strName = "Eindeutig";
-  unique.m_pFieldInfos = key;
-  unique.m_nFields = 1;
-  unique.m_bUnique = TRUE;
-  td.CreateIndex(unique);
-
+  MakeIndex(td, "Eindeutig", {{"N", FALSE}}, TRUE);
   CDaoRecordset rs(&m_db);
   rs.Open(&td);
   // Rows 1 to 3 are new, row 4 repeats N = 2 (already in the table), row 5 is new.
@@ -167,22 +173,6 @@ TEST_F(DaoRecordsetTest, ARowTheFileRefusesIsNeverReportedAsStored) {
   COleVariant count = check.GetFieldValue(0);
   count.ChangeType(VT_I4);
   EXPECT_EQ(lFirstLost - 1, count.lVal);
-}
-
-TEST_F(DaoRecordsetTest, EditAndDeleteChangeTheCurrentRecord) {
-  CDaoRecordset rs(&m_db);
-  rs.Open(dbOpenDynaset, "select * from Zahlen");
-  rs.Move(1);
-  rs.Edit();
-  rs.SetFieldValue("Text", "zwei");
-  rs.Update();
-  rs.MoveNext();
-  rs.Delete();
-  EXPECT_EQ(3167, DaoError([&] { rs.GetFieldValue(0); }).lCode);
-  rs.Close();
-  CDaoTableDef td(&m_db);
-  td.Open("Zahlen");
-  EXPECT_EQ(4, td.GetRecordCount());
 }
 
 TEST_F(DaoRecordsetTest, RowsAppendedToAFileThatVanishedAreReportedAsNotStored) {

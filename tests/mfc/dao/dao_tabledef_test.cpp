@@ -54,7 +54,7 @@ TEST_F(DaoTableDefTest, TablesAreListedOpenedAndDeleted) {
   CDaoTableDef td(&m_db);
   EXPECT_EQ(3265, DaoError([&] { m_db.DeleteTableDef("Fehlt"); }).lCode);
   m_db.DeleteTableDef("Orte");
-  ASSERT_EQ(1, m_db.GetTableDefCount());
+  EXPECT_EQ(std::vector<CString>{"Länder"}, TableNames(m_db));
   EXPECT_EQ(3011, DaoError([&] { td.Open("Orte"); }).lCode);
 }
 
@@ -62,25 +62,14 @@ TEST_F(DaoTableDefTest, IndexesAreMadeAndListedWithTheirFields) {
   MakeTable("Personen", {{"Nr", dbLong, 0}, {"Name", dbText, 40}, {"Ort", dbText, 40}});
   CDaoTableDef td(&m_db);
   td.Open("Personen");
-  CDaoIndexFieldInfo key[] = {{"Nr", FALSE}};
-  CDaoIndexInfo primary;
-  primary.m_strName = "PrimaryKey";
-  primary.m_pFieldInfos = key;
-  primary.m_nFields = 1;
-  primary.m_bPrimary = TRUE;
-  td.CreateIndex(primary);
-  CDaoIndexFieldInfo nameOrt[] = {{"Name", FALSE}, {"Ort", TRUE}};
-  CDaoIndexInfo byName;
-  byName.m_strName = "NachName";
-  byName.m_pFieldInfos = nameOrt;
-  byName.m_nFields = 2;
-  td.CreateIndex(byName);
-  EXPECT_EQ(3375, DaoError([&] { td.CreateIndex(byName); }).lCode);
+  MakeIndex(td, "PrimaryKey", {{"Nr", FALSE}}, FALSE, TRUE);
+  MakeIndex(td, "NachName", {{"Name", FALSE}, {"Ort", TRUE}});
+  EXPECT_EQ(3375, DaoError([&] { MakeIndex(td, "NachName", {{"Name", FALSE}}); }).lCode);
   // Index names are per table: another table may use the same one.
   MakeTable("Firmen", {{"Nr", dbLong, 0}});
   CDaoTableDef firms(&m_db);
   firms.Open("Firmen");
-  firms.CreateIndex(primary);
+  MakeIndex(firms, "PrimaryKey", {{"Nr", FALSE}}, FALSE, TRUE);
 
   ASSERT_EQ(2, td.GetIndexCount());
   CDaoIndexInfo info;
@@ -126,8 +115,7 @@ TEST_F(DaoTableDefTest, StoredQueriesAreViewsAndTemporaryOnesAreNeverStored) {
 }
 
 TEST_F(DaoTableDefTest, NamesJetRefusesAreRefusedBeforeAnythingIsMade) {
-  const std::string longest(64, 'n');
-  const std::string tooLong(65, 'n');
+  const std::string longest(64, 'n'), tooLong(65, 'n');
   const char* refused[] = {"[Kunden]", "a.b", "a!b", "a`b", " vorn", "Tab\tulator", "", tooLong.c_str()};
   MakeTable("T", {{"A", dbLong, 0}});
   CDaoTableDef existing(&m_db);
@@ -140,12 +128,7 @@ TEST_F(DaoTableDefTest, NamesJetRefusesAreRefusedBeforeAnythingIsMade) {
     if (*name != '\0' && strchr(name, '\t') == nullptr) EXPECT_EQ(0, failure.strDescription.Find(CString("'") + name + "'"));
     td.Create("Neu");
     EXPECT_EQ(3125, DaoError([&] { td.CreateField(name, dbLong, 0); }).lCode);
-    CDaoIndexFieldInfo key[] = {{"A", FALSE}};
-    CDaoIndexInfo index;
-    index.m_strName = name;
-    index.m_pFieldInfos = key;
-    index.m_nFields = 1;
-    EXPECT_EQ(3125, DaoError([&] { existing.CreateIndex(index); }).lCode);
+    EXPECT_EQ(3125, DaoError([&] { MakeIndex(existing, name, {{"A", FALSE}}); }).lCode);
     EXPECT_EQ(3125, DaoError([&] { existing.SetName(name); }).lCode);
   }
   MakeTable(longest.c_str(), {{longest.c_str(), dbLong, 0}});
@@ -171,32 +154,12 @@ TEST_F(DaoTableDefTest, ATableIsSwappedInOneTransactionWithItsFieldsAndIndexes) 
   name.m_bAllowZeroLength = FALSE;
   neu.CreateField(name);
   neu.Append();
-  CDaoIndexFieldInfo key[] = {{"Nr", FALSE}};
-  CDaoIndexInfo unique;
-  unique.m_strName = "Schluessel";
-  unique.m_pFieldInfos = key;
-  unique.m_nFields = 1;
-  unique.m_bUnique = TRUE;
-  neu.CreateIndex(unique);
+  MakeIndex(neu, "Schluessel", {{"Nr", FALSE}}, TRUE);
   m_db.Execute("insert into Neu (Nr, Name) values (7, 'sieben')");
   auto swap = [&] {
     m_db.DeleteTableDef("Alt");
     neu.SetName("Alt");
-    CDaoIndexFieldInfo byName[] = {{"Name", FALSE}};
-    CDaoIndexInfo index;
-    index.m_strName = "Alt1";
-    index.m_pFieldInfos = byName;
-    index.m_nFields = 1;
-    neu.CreateIndex(index);
-  };
-  auto tables = [&] {
-    std::string names;
-    for (int i = 0; i < m_db.GetTableDefCount(); ++i) {
-      CDaoTableDefInfo info;
-      m_db.GetTableDefInfo(i, info);
-      names += std::string(info.m_strName) + " ";
-    }
-    return names;
+    MakeIndex(neu, "Alt1", {{"Name", FALSE}});
   };
 
   CDaoWorkspace* ws = m_db.m_pWorkspace;
@@ -209,7 +172,7 @@ TEST_F(DaoTableDefTest, ATableIsSwappedInOneTransactionWithItsFieldsAndIndexes) 
   ws->Rollback();
   ws->Rollback();
   neu.Close();
-  EXPECT_EQ("Alt Neu ", tables());
+  EXPECT_EQ((std::vector<CString>{"Alt", "Neu"}), TableNames(m_db));
   neu.Open("Neu");
   EXPECT_EQ(1, neu.GetIndexCount());
   CDaoRecordset old(&m_db);
@@ -220,7 +183,7 @@ TEST_F(DaoTableDefTest, ATableIsSwappedInOneTransactionWithItsFieldsAndIndexes) 
   ws->BeginTrans();
   swap();
   ws->CommitTrans();
-  EXPECT_EQ("Alt ", tables());
+  EXPECT_EQ(std::vector<CString>{"Alt"}, TableNames(m_db));
   CDaoTableDef swapped(&m_db);
   swapped.Open("Alt");
   CDaoFieldInfo info;

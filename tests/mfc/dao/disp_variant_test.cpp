@@ -30,15 +30,11 @@ TEST(DispVariantTest, TextVariantsAndTypeChanges) {
 }
 
 TEST(DispVariantTest, DatesAreCheckedFormattedAndParsed) {
-  struct Case {
-    int y, mo, d, h, mi, s;
-    bool bValid;
-  };
-  const Case cases[] = {
+  const struct { int y, mo, d, h, mi, s; bool bValid; } cases[] = {
       {2024, 2, 29, 0, 0, 0, true},   {2023, 2, 29, 0, 0, 0, false}, {2026, 4, 31, 0, 0, 0, false},
       {2026, 13, 1, 0, 0, 0, false}, {2026, 1, 1, 24, 0, 0, false},
   };
-  for (const Case& c : cases) {
+  for (const auto& c : cases) {
     COleDateTime date(c.y, c.mo, c.d, c.h, c.mi, c.s);
     EXPECT_EQ(c.bValid ? COleDateTime::valid : COleDateTime::invalid, date.GetStatus()) << c.y << "-" << c.mo << "-" << c.d;
   }

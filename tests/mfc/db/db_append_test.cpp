@@ -32,17 +32,15 @@ TEST_P(DbAppendTest, LongValuesArriveWhole) {
 
 // What the failure says is stored is what a fresh count finds.
 TEST_P(DbAppendTest, FailedRowsAreNamedAndNothingElseIsLost) {
+  // serverText: the data source's own words, kept in the message.
   struct Case {
-    const char* name;
-    const char* columns;
-    long rows;
-    long badRow;
+    const char *name, *columns;
+    long rows, badRow;
     const char* badKey;
     DWORD options;
-    long firstNotStored;
-    long inTable;
+    long firstNotStored, inTable;
     bool postgresOnly;
-    const char* serverText;   // the data source's own words, kept in the message
+    const char* serverText;
   } cases[] = {
       // The duplicate lies after the first commit: the batches since are lost.
       {"unique", "k varchar(10) primary key, v varchar(40)", 60000, 55555, "7", CRecordset::optimizeBulkAdd, 50000,
@@ -125,14 +123,7 @@ TEST(DbAppendNoTransactions, EachUpdateStoresItsRow) {
   std::vector<long> failed;
   for (const char* key : {"a", "b", "a", "c"}) {
     long lFirst = -2;
-    CString strError = DbError(
-        [&] {
-          rs.AddNew();
-          rs.m_values[0] = key;
-          rs.Update();
-        },
-        &lFirst);
-    if (!strError.IsEmpty()) failed.push_back(lFirst);
+    if (!DbError([&] { rs.AddNew(); rs.m_values[0] = key; rs.Update(); }, &lFirst).IsEmpty()) failed.push_back(lFirst);
   }
   EXPECT_EQ(std::vector<long>{2}, failed);
   rs.Close();

@@ -119,6 +119,10 @@ TEST_F(DialogTest, ModalDialogFromTheExtensionTemplateExchangesItsData) {
   EXPECT_EQ(2, dlg.m_nRadio);
   EXPECT_EQ(0, dlg.m_nKind);
   EXPECT_DOUBLE_EQ(-2.25, dlg.m_dFactor);
+  // EndDialog in OnInitDialog returns its result without showing the dialog.
+  dlg.m_nEndInInit = 42;
+  EXPECT_EQ(42, dlg.DoModal());
+  EXPECT_EQ(NULL, dlg.m_hWnd);
 }
 
 TEST_F(DialogTest, InputThatCannotBeTakenIsRefusedWithAGermanPromptAndTheDialogStays) {
@@ -156,13 +160,6 @@ TEST_F(DialogTest, InputThatCannotBeTakenIsRefusedWithAGermanPromptAndTheDialogS
   EXPECT_EQ((std::vector<int>{IDC_COUNT, IDC_COUNT, IDC_NAME}), focus); // on the refused field
   EXPECT_EQ(50, dlg.m_nCount);
   EXPECT_STREQ("kurz", dlg.m_strName);
-}
-
-TEST_F(DialogTest, EndDialogInOnInitDialogReturnsItsResultWithoutShowing) {
-  CDataDlg dlg;
-  dlg.m_nEndInInit = 42;
-  EXPECT_EQ(42, dlg.DoModal());
-  EXPECT_EQ(NULL, dlg.m_hWnd);
 }
 
 // A modeless child page: keyboard navigation works through PreTranslateMessage.

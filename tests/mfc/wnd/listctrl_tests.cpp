@@ -44,7 +44,7 @@ protected:
 
 }  // namespace
 
-TEST_F(ListCtrlTest, VirtualRowsArePaintedThroughDrawItem)
+TEST_F(ListCtrlTest, VirtualRowsArePaintedThroughDrawItemAndRowsKeepTextsAndData)
 {
     m_list.SetItemCountEx(1000000, 0);
     CRect bounds, label;
@@ -60,10 +60,8 @@ TEST_F(ListCtrlTest, VirtualRowsArePaintedThroughDrawItem)
     ASSERT_FALSE(m_list.m_painted.empty());
     EXPECT_EQ(0, m_list.m_painted.front());
     EXPECT_LT((int)m_list.m_painted.size(), 100);  // the visible rows only
-}
 
-TEST_F(ListCtrlTest, RowsKeepLongTextsAndTheirData)
-{
+    // An ordinary report list keeps long texts and each row's data.
     CListCtrl list;
     ASSERT_TRUE(list.Create(WS_CHILD | WS_VISIBLE | LVS_REPORT, CRect(0, 0, 280, 150), m_pFrame, 3));
     list.InsertColumn(0, "Name", LVCFMT_LEFT, 100);

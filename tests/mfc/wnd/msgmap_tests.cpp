@@ -112,16 +112,15 @@ protected:
   CProbeWnd m_wnd;
 };
 
-TEST_F(MessageMapTest, CommandsGoToTheMostDerivedEntryAndFallBackToTheBaseMap) {
+// Commands go to the most derived entry and fall back to the base map;
+// notifications, single and in ranges, bring their results back; a control
+// that reflects a notification handles it without its parent.
+TEST_F(MessageMapTest, CommandsNotificationsAndReflection) {
   EXPECT_TRUE(m_wnd.m_bAttachedInCreate); // the object is known from WM_CREATE on
   m_wnd.SendMessage(WM_COMMAND, ID_BOTH, 0);
   m_wnd.SendMessage(WM_COMMAND, ID_BASE_ONLY, 0);
   m_wnd.SendMessage(WM_COMMAND, ID_RANGE_FIRST + 3, 0);
   m_wnd.SendMessage(WM_COMMAND, ID_RANGE_LAST + 1, 0); // no handler
-  EXPECT_EQ((std::vector<std::string>{"both", "base-only", "range 203"}), m_wnd.m_log);
-}
-
-TEST_F(MessageMapTest, NotificationsSingleAndRangeWithTheirResults) {
   HWND hFrom = ::CreateWindowExA(0, "STATIC", "", WS_CHILD, 0, 0, 10, 10, m_wnd.m_hWnd, (HMENU)(UINT_PTR)IDC_NOTIFIER,
                                  NULL, NULL);
   auto notify = [&](UINT nID, int nCode) {
@@ -131,15 +130,14 @@ TEST_F(MessageMapTest, NotificationsSingleAndRangeWithTheirResults) {
   EXPECT_EQ(5, notify(IDC_NOTIFIER, NM_CLICK));
   EXPECT_EQ(6, notify(404, NM_DBLCLK));
   EXPECT_EQ(0, notify(410, NM_DBLCLK)); // outside the range
-  EXPECT_EQ((std::vector<std::string>{"notify -2", "notify-range 404"}), m_wnd.m_log);
-}
+  const std::vector<std::string> log = {"both", "base-only", "range 203", "notify -2", "notify-range 404"};
+  EXPECT_EQ(log, m_wnd.m_log);
 
-TEST_F(MessageMapTest, ControlHandlesItsOwnNotificationWhenItReflectsIt) {
   CReflectEdit edit;
   ASSERT_TRUE(edit.Create(WS_CHILD | WS_VISIBLE | ES_AUTOHSCROLL, CRect(10, 10, 100, 30), &m_wnd, IDC_REFLECT_EDIT));
   edit.SetWindowText("x");
   EXPECT_EQ(1, edit.m_nChanges);
-  EXPECT_TRUE(m_wnd.m_log.empty()) << "the parent must not see a reflected notification";
+  EXPECT_EQ(log, m_wnd.m_log) << "the parent must not see a reflected notification";
 }
 
 TEST_F(MessageMapTest, ExceptionsInHandlersAreCaughtAndReported) {
@@ -186,14 +184,22 @@ TEST(WindowLifetimeTest, ExceptionInOnCreateFailsTheCreation) {
   EXPECT_TRUE(wnd.m_bPostNcDestroy);
 }
 
+// DestroyWindow detaches the object; an object destroyed first takes its window along.
 TEST(WindowLifetimeTest, DestroyDetachesAndCallsPostNcDestroy) {
-  CProbeWnd wnd;
-  ASSERT_TRUE(wnd.CreateEx(0, NULL, "x", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
-  HWND hWnd = wnd.m_hWnd;
-  EXPECT_TRUE(wnd.DestroyWindow());
-  EXPECT_EQ(NULL, wnd.m_hWnd);
+  HWND hWnd;
+  {
+    CProbeWnd wnd;
+    ASSERT_TRUE(wnd.CreateEx(0, NULL, "x", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
+    hWnd = wnd.m_hWnd;
+    EXPECT_TRUE(wnd.DestroyWindow());
+    EXPECT_EQ(NULL, wnd.m_hWnd);
+    EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
+    EXPECT_TRUE(wnd.m_bPostNcDestroy);
+    ASSERT_TRUE(wnd.CreateEx(0, NULL, "x", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
+    hWnd = wnd.m_hWnd;
+  }
+  EXPECT_FALSE(::IsWindow(hWnd));
   EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
-  EXPECT_TRUE(wnd.m_bPostNcDestroy);
 }
 
 TEST(WindowLifetimeTest, TemporaryWrappersAndAttachDetach) {
@@ -210,17 +216,6 @@ TEST(WindowLifetimeTest, TemporaryWrappersAndAttachDetach) {
   EXPECT_EQ(hWnd, wnd.Detach());
   EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
   ::DestroyWindow(hWnd);
-}
-
-TEST(WindowLifetimeTest, ObjectDestroyedBeforeItsWindowDestroysTheWindow) {
-  HWND hWnd;
-  {
-    CProbeWnd wnd;
-    ASSERT_TRUE(wnd.CreateEx(0, NULL, "x", WS_POPUP, 0, 0, 10, 10, NULL, NULL));
-    hWnd = wnd.m_hWnd;
-  }
-  EXPECT_FALSE(::IsWindow(hWnd));
-  EXPECT_EQ(NULL, CWnd::FromHandlePermanent(hWnd));
 }
 
 class CCountedFrame : public CFrameWnd {

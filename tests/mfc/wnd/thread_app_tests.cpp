@@ -50,7 +50,7 @@ HANDLE DuplicateThreadHandle(CWinThread* pThread) {
   return h;
 }
 
-TEST(ThreadTest, UserInterfaceThreadHandlesThreadMessagesThroughItsMapAndDeletesItself) {
+TEST(ThreadTest, UserInterfaceThreadHandlesThreadMessagesThroughItsMapAndDeletesItselfUnlessTold) {
   g_nJobSum = 0;
   int nDestroyedBefore = g_nDestroyed;
   CWinThread* pThread = AfxBeginThread(RUNTIME_CLASS(CJobThread), THREAD_PRIORITY_NORMAL, 0, CREATE_SUSPENDED);
@@ -80,11 +80,10 @@ TEST(ThreadTest, UserInterfaceThreadHandlesThreadMessagesThroughItsMapAndDeletes
   EXPECT_EQ(105u, dwExit); // ExitInstance's result
   EXPECT_EQ(nDestroyedBefore + 1, g_nDestroyed.load());
   ::CloseHandle(hThread);
-}
 
-TEST(ThreadTest, ThreadObjectThatIsNotAutoDeletedSurvivesItsThread) {
-  int nDestroyedBefore = g_nDestroyed;
-  CWinThread* pThread = AfxBeginThread(RUNTIME_CLASS(CJobThread), THREAD_PRIORITY_NORMAL, 0, CREATE_SUSPENDED);
+  // A thread object that is not auto-deleted survives its thread.
+  nDestroyedBefore = g_nDestroyed;
+  pThread = AfxBeginThread(RUNTIME_CLASS(CJobThread), THREAD_PRIORITY_NORMAL, 0, CREATE_SUSPENDED);
   ASSERT_NE(nullptr, pThread);
   pThread->m_bAutoDelete = FALSE;
   pThread->ResumeThread();

@@ -32,7 +32,7 @@ CQoConfigFile Reread(CQoConfigFile const &cfg, TempFolder const &tmp)
 
 } // namespace
 
-TEST(CQoConfigFileRoundTrip, AnyValueComesBackExactly)
+TEST(CQoConfigFileRoundTrip, AnyValueAndIntegerComesBackExactly)
 {
     TempFolder tmp;
     std::vector<std::string> values = {
@@ -53,6 +53,10 @@ TEST(CQoConfigFileRoundTrip, AnyValueComesBackExactly)
     }
     // Names with the characters that structure the file.
     cfg.SetValue("Sektion ]mit[ = Zeichen", " key=with;all#[]\\ ", "v");
+    // Integers, negative and large within their type.
+    long const numbers[] = {0, -17, INT_MIN, INT_MAX, LONG_MIN, LONG_MAX};
+    for (long v : numbers)
+        cfg.SetValue("Zahlen", std::to_string(v).c_str(), v);
 
     CQoConfigFile back = Reread(cfg, tmp);
     for (std::size_t i = 0; i < values.size(); ++i) {
@@ -63,17 +67,7 @@ TEST(CQoConfigFileRoundTrip, AnyValueComesBackExactly)
     CQoString value;
     EXPECT_TRUE(back.GetValue("Sektion ]mit[ = Zeichen", " key=with;all#[]\\ ", value));
     EXPECT_STREQ("v", value);
-}
-
-TEST(CQoConfigFileRoundTrip, IntegersNegativeAndLargeWithinTheirType)
-{
-    TempFolder tmp;
-    long const values[] = {0, -17, INT_MIN, INT_MAX, LONG_MIN, LONG_MAX};
-    CQoConfigFile cfg;
-    for (long v : values)
-        cfg.SetValue("Zahlen", std::to_string(v).c_str(), v);
-    CQoConfigFile back = Reread(cfg, tmp);
-    for (long v : values) {
+    for (long v : numbers) {
         SCOPED_TRACE(v);
         std::string key = std::to_string(v);
         long l = 99;
@@ -87,7 +81,7 @@ TEST(CQoConfigFileRoundTrip, IntegersNegativeAndLargeWithinTheirType)
     }
 }
 
-TEST(CQoConfigFileValues, MissingOrUnfitValuesKeepThePreset)
+TEST(CQoConfigFileValues, MissingOrUnfitValuesKeepThePresetNamesIgnoreCase)
 {
     CQoConfigFile cfg;
     cfg.SetValue("S", "text", "abc");
@@ -109,11 +103,9 @@ TEST(CQoConfigFileValues, MissingOrUnfitValuesKeepThePreset)
     EXPECT_FALSE(cfg.SetValue("", "k", "v"));
     EXPECT_FALSE(cfg.SetValue(nullptr, "k", 1));
     EXPECT_EQ((std::vector<std::string>{"S"}), Names(cfg.GetSections()));
-}
 
-TEST(CQoConfigFileValues, NamesAreCaseInsensitiveAndKeepTheirOrder)
-{
-    CQoConfigFile cfg;
+    // Names are case-insensitive and keep their order.
+    cfg = CQoConfigFile();
     cfg.SetValue("Zweite", "b", "1");
     cfg.SetValue("Erste", "Gr\366\337e", "1");
     cfg.SetValue("erste", "a", "2");
@@ -124,11 +116,9 @@ TEST(CQoConfigFileValues, NamesAreCaseInsensitiveAndKeepTheirOrder)
     CQoString v;
     EXPECT_TRUE(cfg.GetValue("eRSTE", "gr\366\337E", v));
     EXPECT_STREQ("4", v);
-}
 
-TEST(CQoConfigFileEdit, DeleteCopyAndClear)
-{
-    CQoConfigFile cfg;
+    // Deleting and copying keys and sections.
+    cfg = CQoConfigFile();
     cfg.SetValue("A", "x", "1");
     cfg.SetValue("A", "y", "2");
     cfg.SetValue("B", "z", "3");
@@ -223,7 +213,7 @@ TEST(CQoConfigFileFormat, ValuesReadAsWrittenByHandOrByEitherWriter)
     }
 }
 
-TEST(CQoConfigFileFormat, LinesEndWithCrLfOrEither)
+TEST(CQoConfigFileFormat, LinesEndWithCrLfOrEitherMalformedOnesAreSkipped)
 {
     TempFolder tmp;
     std::string path = tmp.Path("zeilen.cfg");
@@ -239,12 +229,9 @@ TEST(CQoConfigFileFormat, LinesEndWithCrLfOrEither)
         EXPECT_TRUE(cfg.GetValue("Projekt", "Datei", v));
         EXPECT_STREQ("a.txt", v);
     }
-}
 
-TEST(CQoConfigFileFormat, MalformedLinesAreSkipped)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("kaputt.cfg");
+    // Malformed lines are skipped.
+    path = tmp.Path("kaputt.cfg");
     std::string junk = "vorher=keine Sektion\n"
                        "[Gut]\n"
                        "  a = 1  \n"
@@ -300,28 +287,18 @@ TEST(CQoConfigFileFormat, MalformedLinesAreSkipped)
         EXPECT_FALSE(section.IsEmpty());
 }
 
-TEST(CQoConfigFileFiles, OpenReplacesAndAFolderKeepsTheContents)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("neu.cfg");
-    CQoConfigFile cfg;
-    WriteBytes(path, "[Neu]\nk=v\n");
-    cfg.SetValue("Alt", "k", "v");
-    EXPECT_TRUE(cfg.Open(path.c_str()));
-    EXPECT_EQ((std::vector<std::string>{"Neu"}), Names(cfg.GetSections()));
-
-    // A folder cannot be read: false, and the contents stay.
-    EXPECT_FALSE(cfg.Open(tmp.Folder().string().c_str()));
-    EXPECT_EQ((std::vector<std::string>{"Neu"}), Names(cfg.GetSections()));
-}
-
-TEST(CQoConfigFileFiles, FailedWriteLeavesTheOldFileIntact)
+TEST(CQoConfigFileFiles, FailedOpenOrWriteKeepsContentsAndTheOldFile)
 {
     TempFolder tmp;
     std::string path = tmp.Path("projekt.cfg");
-    WriteBytes(path, "[Alt]\nk=v\n");
+    WriteBytes(path, "[Neu]\nk=v\n");
     CQoConfigFile cfg;
-    cfg.SetValue("Neu", "k", "v");
+    cfg.SetValue("Alt", "k", "v");
+    EXPECT_TRUE(cfg.Open(path.c_str())); // replaces what was there
+    // A folder cannot be read: false, and the contents stay.
+    EXPECT_FALSE(cfg.Open(tmp.Folder().string().c_str()));
+    EXPECT_EQ((std::vector<std::string>{"Neu"}), Names(cfg.GetSections()));
+    WriteBytes(path, "[Alt]\nk=v\n");
     // A user's file that happens to have a name the writer might pick.
     WriteBytes(path + ".~tmp", "fremd");
 

@@ -40,7 +40,7 @@ int Code(void (*f)(CQoFile &), CQoFile &file)
 } // namespace
 
 // Windows-1252 from 0xA0 up survives code page 850 there and back.
-TEST(CQoFileCharSet, AsciiWritesDos850AndReadsBackWindows1252)
+TEST(CQoFileCharSet, DosAnsiAndMixedConvertBothWaysAlsoChosenAfterOpening)
 {
     TempFolder tmp;
     std::string path = tmp.Path("dos.txt");
@@ -59,59 +59,45 @@ TEST(CQoFileCharSet, AsciiWritesDos850AndReadsBackWindows1252)
     std::string back(latin.size(), '\0');
     EXPECT_EQ(latin.size(), file.Read(&back[0], back.size()));
     EXPECT_EQ(latin, back);
-}
+    file.Close();
 
-TEST(CQoFileCharSet, CharactersWithoutEquivalentGetTheirNearestForm)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("box.txt");
-    // DOS box drawing and shading: corner, horizontal, vertical, double lines, shade.
+    // Without an equivalent, the nearest form: DOS box drawing and shading.
     WriteBytes(path, "\xDA\xC4\xBF\r\n\xB3\xB0\xBA\r\n\xC0\xCD\xD9\r\n");
     EXPECT_EQ((std::vector<std::string>{"+-+", "|#|", "+-+"}), ReadLines(path, CQoFile::read | CQoFile::ascii));
 
     // Windows-1252 only: euro, s with caron, typographic quotes, dash, unassigned byte.
-    {
-        CQoFile file(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ascii);
-        file.Write(CQoString("\200 \232 \223x\224 \226 \201"));
-    }
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ascii));
+    file.Write(CQoString("\200 \232 \223x\224 \226 \201"));
+    file.Close();
     EXPECT_EQ("E s \"x\" - ?", ReadBytes(path));
-}
 
-TEST(CQoFileCharSet, AnsimixReadsBothEncodingsAndWritesWindows1252)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("mix.txt");
-    // One line in Windows-1252, one in DOS, one mixed; é (0xE9) is plain 1252.
+    // Ansimix reads 1252, DOS and mixed lines (0xE9 is plain 1252), writes 1252.
     WriteBytes(path, "M\374ller Gr\366\337e\r\nM\x81ller Gr\x94\xE1" "e\r\nS\x84tze \344 \xE9t\xE9\r\n");
     EXPECT_EQ((std::vector<std::string>{"M\374ller Gr\366\337e", "M\374ller Gr\366\337e", "S\344tze \344 \351t\351"}),
               ReadLines(path, CQoFile::read | CQoFile::ansimix));
-    {
-        CQoFile file(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ansimix);
-        file.Write(CQoString(kAnsiUmlauts.c_str()));
-    }
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::create | CQoFile::binary | CQoFile::ansimix));
+    file.Write(CQoString(kAnsiUmlauts.c_str()));
+    file.Close();
     EXPECT_EQ(kAnsiUmlauts, ReadBytes(path));
-}
 
-TEST(CQoFileCharSet, CanBeChosenAfterOpening)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("late.txt");
+    // The character set can be chosen after opening.
+    path = tmp.Path("late.txt");
     WriteBytes(path, kDosUmlauts + "\n");
-    CQoFile file(8);
-    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::read | CQoFile::binary));
-    file.FileCharSet(CQoFile::ascii);
+    CQoFile late(8);
+    ASSERT_TRUE(late.Open(path.c_str(), CQoFile::read | CQoFile::binary));
+    late.FileCharSet(CQoFile::ascii);
     CQoString line;
-    ASSERT_TRUE(file.ReadString(line, false));
+    ASSERT_TRUE(late.ReadString(line, false));
     EXPECT_EQ(kAnsiUmlauts, line.Str());
 
     // Seeking back re-reads the file's bytes, converted once, not twice.
-    file.Seek(0, CQoFile::begin);
+    late.Seek(0, CQoFile::begin);
     char buffer[7];
-    EXPECT_EQ(7u, file.Read(buffer, 7, false));
+    EXPECT_EQ(7u, late.Read(buffer, 7, false));
     EXPECT_EQ(kAnsiUmlauts, std::string(buffer, 7));
 }
 
-TEST(CQoFileLines, SplitsAtCrLfLfAndCrAndKeepsTheLastLine)
+TEST(CQoFileLines, SplitsAtAnyLineEndAndTextModeTranslatesThem)
 {
     TempFolder tmp;
     std::string path = tmp.Path("lines.txt");
@@ -120,12 +106,8 @@ TEST(CQoFileLines, SplitsAtCrLfLfAndCrAndKeepsTheLastLine)
               ReadLines(path, CQoFile::read));
     WriteBytes(path, "only\r");
     EXPECT_EQ(std::vector<std::string>{"only"}, ReadLines(path, CQoFile::read));
-}
 
-TEST(CQoFileLines, LinesLongerThanTheBufferAndLineEndsAcrossItsEdge)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("long.txt");
+    // Lines longer than the buffer, and line ends across its edge.
     std::size_t const block = 64 * 1024;
     std::string longLine(3 * block + 17, 'x');
     for (std::size_t i = 0; i < longLine.size(); i += 1000)
@@ -136,12 +118,9 @@ TEST(CQoFileLines, LinesLongerThanTheBufferAndLineEndsAcrossItsEdge)
     // A lone CR there ends its line, and the next line is not lost.
     WriteBytes(path, first + "\r" + longLine + "\rend");
     EXPECT_EQ((std::vector<std::string>{first, longLine, "end"}), ReadLines(path, CQoFile::read, 1));
-}
 
-TEST(CQoFileLines, TextModeTranslatesLineEndsAndBinaryModeDoesNot)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("mode.txt");
+    // Text mode translates line ends, binary mode does not.
+    path = tmp.Path("mode.txt");
     {
         CQoFile file(path.c_str(), CQoFile::create);
         file.Write(CQoString("a\nb\r\nc\r"));
@@ -166,25 +145,24 @@ TEST(CQoFileOpen, WritesEveryBlockLengthThroughItsBuffer)
     TempFolder tmp;
     std::string path = tmp.Path("blocks.bin");
     std::string expected;
-    {
-        CQoFile file(1);
-        ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
-        for (std::size_t n = 0; n <= 300; ++n) {
-            std::string block;
-            for (std::size_t i = 0; i < n; ++i)
-                block += static_cast<char>('A' + (n + i) % 53);
-            file.Write(block.data(), block.size());
-            expected += block;
-        }
+    CQoFile file(1);
+    ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
+    for (std::size_t n = 0; n <= 300; ++n) {
+        std::string block;
+        for (std::size_t i = 0; i < n; ++i)
+            block += static_cast<char>('A' + (n + i) % 53);
+        file.Write(block.data(), block.size());
+        expected += block;
     }
+    file.Close();
     EXPECT_EQ(expected, ReadBytes(path));
 }
 
-TEST(CQoFileOpen, ModesCreateTruncateAppendAndOverwrite)
+TEST(CQoFileOpen, ModesSeekTellAndLength)
 {
     TempFolder tmp;
     std::string path = tmp.Path("modes.txt");
-    CQoFile file;
+    CQoFile file(1);
     EXPECT_FALSE(file.Open(tmp.Folder().string().c_str(), CQoFile::read)); // a folder
     try {
         file.OpenOrThrow(path.c_str(), CQoFile::read);
@@ -208,14 +186,9 @@ TEST(CQoFileOpen, ModesCreateTruncateAppendAndOverwrite)
     ASSERT_TRUE(file.Open(path.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary)); // truncates
     file.Close();
     EXPECT_EQ("", ReadBytes(path));
-}
 
-TEST(CQoFileOpen, SeekTellAndLengthAre64Bit)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("pos.txt");
+    // Seek, Tell and Length are 64-bit.
     WriteBytes(path, "line0\nline1\nline2\nline3\n");
-    CQoFile file(1);
     ASSERT_TRUE(file.Open(path.c_str(), CQoFile::read | CQoFile::binary));
     CQoString line;
     ASSERT_TRUE(file.ReadString(line));
@@ -241,7 +214,7 @@ TEST(CQoFileOpen, SeekTellAndLengthAre64Bit)
     std::filesystem::remove(path);
 }
 
-TEST(CQoFileOpen, ReadingAndWritingOneFileInTurn)
+TEST(CQoFileOpen, ReadingAndWritingOneFileInTurnAndErrors)
 {
     TempFolder tmp;
     std::string path = tmp.Path("rw.txt");
@@ -256,14 +229,9 @@ TEST(CQoFileOpen, ReadingAndWritingOneFileInTurn)
     EXPECT_EQ("6789", std::string(buffer, 4));
     file.Close();
     EXPECT_EQ("0123AB6789", ReadBytes(path));
-}
 
-TEST(CQoFileOpen, ErrorsNameTheFileOrAreQuietOnRequest)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("err.txt");
+    // Errors raise with their code, or are quiet on request.
     CQoFile closed;
-    char buffer[4];
     EXPECT_EQ(0u, closed.Read(buffer, 4, false));
     EXPECT_EQ(CQoException::notOpen, Code([](CQoFile &f) { f.Write("x", 1); }, closed));
     WriteBytes(path, "data");
@@ -315,12 +283,10 @@ TEST(CQoFileReplace, PathsBeyond260Characters)
 #endif
     std::string temp = CQoFile::NewTempFileBeside(target.c_str());
     ASSERT_FALSE(temp.empty());
-    {
-        CQoFile out;
-        ASSERT_TRUE(out.Open(temp.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
-        out.Write("Zeile\r\n", 7);
-        out.Close();
-    }
+    CQoFile out;
+    ASSERT_TRUE(out.Open(temp.c_str(), CQoFile::write | CQoFile::create | CQoFile::binary));
+    out.Write("Zeile\r\n", 7);
+    out.Close();
     ASSERT_TRUE(CQoFile::MoveOver(temp.c_str(), target.c_str()));
     EXPECT_FALSE(CQoFile::Exists(temp.c_str()));
     ASSERT_TRUE(CQoFile::Exists(target.c_str()));

@@ -29,7 +29,7 @@ TEST(CQoString, ComparesBytesUnsignedAndKeepsBytesAfterANul)
         }
 }
 
-TEST(CQoString, OwnTextAsSourceAndMovesOfShortAndLongText)
+TEST(CQoString, OwnTextAsSourceMovesAndFormatOfShortAndLongText)
 {
     // Short text lives in the object, long text on the heap: both survive
     // being their own source, copies and moves.
@@ -59,12 +59,10 @@ TEST(CQoString, OwnTextAsSourceAndMovesOfShortAndLongText)
     EXPECT_THROW(s.Append("x", std::size_t(-1)), CQoException);
     EXPECT_THROW(s.Assign("x", std::size_t(1) << 31), CQoException);
     EXPECT_EQ("kurz", s.Str());
-}
 
-TEST(CQoString, FormatsTextOfAnyLengthAndItsOwnText)
-{
-    std::string longText(100000, 'L');
-    CQoString s;
+    // Format takes text of any length, its own included.
+    std::string const longText(100000, 'L');
+    s = "";
     s.Format("[%s]", longText.c_str());
     EXPECT_EQ("[" + longText + "]", s.Str());
 
@@ -73,7 +71,7 @@ TEST(CQoString, FormatsTextOfAnyLengthAndItsOwnText)
     EXPECT_EQ(std::string(300, 's') + "+" + std::string(300, 's'), self.Str());
 }
 
-TEST(CQoString, CutsPiecesWithClampedArguments)
+TEST(CQoString, CutsReplacesAndIndexesWithCheckedArguments)
 {
     CQoString s("Hallo Welt");
     EXPECT_STREQ("", s.Left(-1));
@@ -81,46 +79,9 @@ TEST(CQoString, CutsPiecesWithClampedArguments)
     EXPECT_STREQ("", s.Mid(99, 2));
     EXPECT_STREQ("Hal", s.Mid(-3, 3));
     EXPECT_EQ(-1, s.Find('H', 50));
-}
 
-TEST(CQoString, ReplacesWithoutRunningAwayOnItsOwnOutput)
-{
-    CQoString grow("aaa");
-    EXPECT_EQ(3, grow.Replace("a", "aa"));
-    EXPECT_STREQ("aaaaaa", grow);
-
-    CQoString overlap("aaaa");
-    EXPECT_EQ(2, overlap.Replace("aa", "b"));
-    EXPECT_STREQ("bb", overlap);
-
-    EXPECT_EQ(0, overlap.Replace("", "x"));
-
-    CQoString self("xyx");
-    EXPECT_EQ(1, self.Replace(self.GetString(), "z"));
-    EXPECT_STREQ("z", self);
-}
-
-TEST(CQoString, ChangesCaseOfWindows1252Letters)
-{
-    CQoString s("abc \344\366\374\337 \351\340\377\232 1+");
-    s.MakeUpper();
-    EXPECT_STREQ("ABC \304\326\334\337 \311\300\237\212 1+", s);
-    // The division and multiplication signs are not letters.
-    EXPECT_EQ('\367', CQoString::ToUpper('\367'));
-    EXPECT_EQ(0, CQoString("\304rger").CompareNoCase("\344RGER"));
-}
-
-TEST(CQoString, ReplacesUmlautsWithoutChangingCase)
-{
-    CQoString s("M\374ller, Gr\366\337e, \304rger \326l \334bel \344\351");
-    s.NoUmlaute();
-    EXPECT_STREQ("Mueller, Groesse, Aerger Oel Uebel ae\351", s);
-}
-
-TEST(CQoString, IndexErrorsRaise)
-{
-    CQoString s("abc");
-    for (int bad : {-1, 3}) {
+    // Index errors raise and change nothing.
+    for (int bad : {-1, 10}) {
         try {
             s.GetAt(bad);
             FAIL() << "GetAt(" << bad << ") returned";
@@ -129,5 +90,32 @@ TEST(CQoString, IndexErrorsRaise)
         }
         EXPECT_THROW(s.SetAt(bad, 'y'), CQoException);
     }
-    EXPECT_STREQ("abc", s);
+    EXPECT_STREQ("Hallo Welt", s);
+
+    // Replacing does not run away on its own output.
+    CQoString grow("aaa");
+    EXPECT_EQ(3, grow.Replace("a", "aa"));
+    EXPECT_STREQ("aaaaaa", grow);
+    CQoString overlap("aaaa");
+    EXPECT_EQ(2, overlap.Replace("aa", "b"));
+    EXPECT_STREQ("bb", overlap);
+    EXPECT_EQ(0, overlap.Replace("", "x"));
+    CQoString self("xyx");
+    EXPECT_EQ(1, self.Replace(self.GetString(), "z"));
+    EXPECT_STREQ("z", self);
+}
+
+TEST(CQoString, ChangesCaseAndUmlautsOfWindows1252Letters)
+{
+    CQoString s("abc \344\366\374\337 \351\340\377\232 1+");
+    s.MakeUpper();
+    EXPECT_STREQ("ABC \304\326\334\337 \311\300\237\212 1+", s);
+    // The division and multiplication signs are not letters.
+    EXPECT_EQ('\367', CQoString::ToUpper('\367'));
+    EXPECT_EQ(0, CQoString("\304rger").CompareNoCase("\344RGER"));
+
+    // Umlauts are replaced without changing case.
+    s = "M\374ller, Gr\366\337e, \304rger \326l \334bel \344\351";
+    s.NoUmlaute();
+    EXPECT_STREQ("Mueller, Groesse, Aerger Oel Uebel ae\351", s);
 }

@@ -37,15 +37,12 @@ std::string MakeDbf(std::vector<Field> const &fields, std::vector<std::string> c
     std::string h(std::size_t(headerLength), '\0');
     unsigned long count = declared < 0 ? records.size() : std::size_t(declared);
     h[0] = char(version);
-    h[1] = char(124);
-    h[2] = 5;
-    h[3] = 17;
     for (int i = 0; i < 4; ++i)
         h[4 + i] = char((count >> (8 * i)) & 0xFF);
-    h[8] = char(headerLength & 0xFF);
-    h[9] = char(headerLength >> 8);
-    h[10] = char(recordLength & 0xFF);
-    h[11] = char(recordLength >> 8);
+    for (int i = 0; i < 2; ++i) {
+        h[8 + i] = char((headerLength >> (8 * i)) & 0xFF);
+        h[10 + i] = char((recordLength >> (8 * i)) & 0xFF);
+    }
     h[29] = char(driver);
     for (std::size_t i = 0; i < fields.size(); ++i) {
         std::size_t d = 32 + 32 * i;
@@ -172,6 +169,16 @@ TEST(DbaseInputFormat, TheCodePageByteOrElseTheFilterDecides)
     dbf.Init(path.c_str());
     EXPECT_EQ(CQoFile::ansi, dbf.RecordCharSet());
     EXPECT_EQ("\xE4\x80", AllRows(dbf)[0][0]);
+
+    // The settings round-trip through the configuration file.
+    dbf.SkipDeleted(false);
+    dbf.CharSet(CQoFile::ansi); // not the default
+    CQoConfigFile cfg;
+    dbf.WriteConfig(cfg, "Eingabe");
+    CQoInputFilterDbase34 copy;
+    copy.ReadConfig(cfg, "Eingabe");
+    EXPECT_FALSE(copy.SkipDeleted());
+    EXPECT_EQ(CQoFile::ansi, copy.CharSet());
 }
 
 TEST(DbaseInputFormat, EmptyTablesAndDeletedRecordsEverywhere)
@@ -257,7 +264,7 @@ TEST(DbaseInputDamaged, HeadersThatAreNotDbaseRaiseClearErrors)
     EXPECT_EQ(0, dbf.NumRows());
 }
 
-TEST(DbaseInputDamaged, RecordsMissingAtTheEndRaiseWhenReached)
+TEST(DbaseInputDamaged, RecordsMissingAtTheEndOrCutWhileReadingRaise)
 {
     TempFolder tmp;
     std::string path = tmp.Path("short.dbf");
@@ -298,41 +305,25 @@ TEST(DbaseInputDamaged, RecordsMissingAtTheEndRaiseWhenReached)
         EXPECT_TRUE(big.AbsoluteRow(1));
         EXPECT_THROW(big.AbsoluteRow(2), CQoException);
     }
-}
 
-TEST(DbaseInputDamaged, FileCutWhileReading)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("vanish.dbf");
+    // A file cut by another program while it is read.
+    path = tmp.Path("vanish.dbf");
     std::vector<std::string> recs;
     for (int i = 0; i < 20000; ++i)
         recs.push_back(Rec("n" + std::to_string(i), std::to_string(i % 1000)));
     WriteBytes(path, MakeDbf(kTwoFields, recs));
-    CQoInputFilterDbase34 dbf;
-    dbf.Init(path.c_str());
-    ASSERT_TRUE(dbf.FirstRow());
+    CQoInputFilterDbase34 cut;
+    cut.Init(path.c_str());
+    ASSERT_TRUE(cut.FirstRow());
     // Another program cuts the file down to its header.
     std::filesystem::resize_file(path, 32 + 64 + 1);
     bool raised = false;
     try {
-        for (int i = 0; i < 20000 && dbf.NextRow(); ++i) {
+        for (int i = 0; i < 20000 && cut.NextRow(); ++i) {
         }
     } catch (CQoException const &e) {
         raised = true;
         EXPECT_NE(std::string::npos, std::string(e.Message()).find("vorzeitig")) << e.Message();
     }
     EXPECT_TRUE(raised);
-}
-
-TEST(DbaseInputConfig, SettingsRoundTripThroughTheConfigurationFile)
-{
-    CQoInputFilterDbase34 dbf;
-    dbf.SkipDeleted(false);
-    dbf.CharSet(CQoFile::ansi);
-    CQoConfigFile cfg;
-    dbf.WriteConfig(cfg, "Eingabe");
-    CQoInputFilterDbase34 copy;
-    copy.ReadConfig(cfg, "Eingabe");
-    EXPECT_FALSE(copy.SkipDeleted());
-    EXPECT_EQ(CQoFile::ansi, copy.CharSet());
 }

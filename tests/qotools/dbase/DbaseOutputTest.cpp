@@ -111,7 +111,7 @@ for name in ('dos.dbf', 'win.dbf'):
     }
 }
 
-TEST(DbaseOutputValues, NumbersAreNormalisedRoundedAndRightAligned)
+TEST(DbaseOutputValues, NumbersDatesLogicalsAndTextAreFormattedOrRefused)
 {
     CDbaseField money("B", 'N', 10, 2);
     EXPECT_EQ("      1.01", Formatted(money, " 1.005 "));
@@ -127,10 +127,7 @@ TEST(DbaseOutputValues, NumbersAreNormalisedRoundedAndRightAligned)
         EXPECT_NE(std::string::npos, FormatError(whole, bad).find("keine Zahl")) << bad;
     std::string message = FormatError(whole, "zw\xF6lf");
     EXPECT_NE(std::string::npos, message.find("Satz 1, Feld N")) << message;
-}
 
-TEST(DbaseOutputValues, DatesLogicalsAndText)
-{
     CDbaseField date("D", 'D', 8);
     EXPECT_EQ("20240305", Formatted(date, "5.3.2024"));
     EXPECT_EQ("        ", Formatted(date, " "));
@@ -147,7 +144,7 @@ TEST(DbaseOutputValues, DatesLogicalsAndText)
     EXPECT_EQ("abcd", Formatted(text, "abcdef"));
 }
 
-TEST(DbaseOutputFile, HeaderCountsRecordsAndSurvivesATextModeFileWithOldContent)
+TEST(DbaseOutputFile, HeaderCountsRecordsAndUnusableSettingsAreRefused)
 {
     TempFolder tmp;
     std::string path = tmp.Path("out.dbf");
@@ -174,12 +171,8 @@ TEST(DbaseOutputFile, HeaderCountsRecordsAndSurvivesATextModeFileWithOldContent)
     CQoInputFilterDbase34 dbf;
     dbf.Init(path.c_str());
     EXPECT_EQ("999", AllRows(dbf).at(999)[0]);
-}
 
-TEST(DbaseOutputFile, UnusableSettingsAreRefusedClearly)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("bad.dbf");
+    // Settings that cannot make a file are refused clearly.
     auto initError = [&](std::vector<CDbaseField> const &list) {
         CQoOutputFilterDbase filter;
         CQoArray<CDbaseField> fields = Fields(list);
@@ -197,8 +190,8 @@ TEST(DbaseOutputFile, UnusableSettingsAreRefusedClearly)
     EXPECT_NE(std::string::npos, initError({CDbaseField("X", 'N', 21)}).find("1 und 20"));
     EXPECT_NE(std::string::npos, initError({CDbaseField("X", 'N', 5, 4)}).find("Nachkommastellen"));
     EXPECT_NE(std::string::npos, initError({CDbaseField("X", 'M', 10)}).find("Unbekannter Feldtyp"));
-    std::vector<CDbaseField> wide(300, CDbaseField("W", 'C', 255));
-    EXPECT_NE(std::string::npos, initError(wide).find("h\xF6" "chstens 255 Felder"));
+    EXPECT_NE(std::string::npos, initError(std::vector<CDbaseField>(300, CDbaseField("W", 'C', 255)))
+                                     .find("h\xF6" "chstens 255 Felder"));
 }
 
 TEST(DbaseOutputConfig, FieldsRoundTripThroughTheConfigurationFile)

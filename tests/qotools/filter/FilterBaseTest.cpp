@@ -63,7 +63,7 @@ public:
 
 } // namespace
 
-TEST(FilterBaseInput, CountsWalksAndNamesRowsForADerivedFilter)
+TEST(FilterBaseInput, CountsWalksNamesAndReportsWrongInputForADerivedFilter)
 {
     ListFilter f({{"a", "b"}, {"", ""}, {"c"}}, 2);
     EXPECT_EQ(3, f.NumRows());
@@ -77,11 +77,8 @@ TEST(FilterBaseInput, CountsWalksAndNamesRowsForADerivedFilter)
     f.SetColName(5, "nichts");
     f.ColName(5, name);
     EXPECT_EQ("", name);
-}
 
-TEST(FilterBaseInput, ReportWrongInputCountsAndAsksTheHook)
-{
-    ListFilter f({}, 0);
+    // A wrong input is counted, and the hook asked where there is one.
     CQoString data("kaputt\nnaechster");
     int pos = 7;
     EXPECT_EQ(CQoInterActive::repairNoHandler, f.ReportWrongInput(data, pos));

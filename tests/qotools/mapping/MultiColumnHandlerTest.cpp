@@ -57,7 +57,7 @@ protected:
 
 } // namespace
 
-TEST(MultiColumnSplitting, CutsEachValueAtItsSeparators)
+TEST(MultiColumnSplitting, CutsEachValueAtItsSeparatorsFollowsChangesAndOutlivesTheHandler)
 {
     struct Part {
         int outer; // -1: not assigned
@@ -106,10 +106,8 @@ TEST(MultiColumnSplitting, CutsEachValueAtItsSeparators)
         EXPECT_EQ(static_cast<long>(c.file.size()), split->NumRows());
         EXPECT_EQ(c.expected, AllRows(*split));
     }
-}
 
-TEST(MultiColumnSplitting, FilterFollowsLaterChangesAndOutlivesTheHandler)
-{
+    // The filter follows later changes and outlives the handler.
     MemoryInputFilter file = AddressFile();
     FilterPtr split;
     {
@@ -149,7 +147,7 @@ TEST_F(MultiColumnSplit, FilterNamesItsColumnsAfterInnerOrOuterColumns)
     EXPECT_EQ("Person", Name(file, 0));
 }
 
-TEST(MultiColumnRules, RefusesWhatCannotBeMapped)
+TEST(MultiColumnRules, RefusesWhatCannotBeMappedAndRemovesAssignmentsWithColumns)
 {
     MemoryInputFilter file = AddressFile();
     CMultiColumnHandler split(CMultiColumnHandler::splitInput);
@@ -169,10 +167,8 @@ TEST(MultiColumnRules, RefusesWhatCannotBeMapped)
     EXPECT_FALSE(compose.AddAssignment(0, 10, "", false)); // outer ids, not indexes
     EXPECT_TRUE(compose.AddAssignment(4, 10, "", false));
     EXPECT_EQ(nullptr, compose.CreateMultiColumnInputFilter());
-}
 
-TEST(MultiColumnRules, RemovingColumnsRemovesTheirAssignments)
-{
+    // Removing columns removes their assignments.
     CMultiColumnHandler h(CMultiColumnHandler::composeOutput);
     h.AddOuterColumn(0, "A");
     h.AddOuterColumn(1, "B");
@@ -208,11 +204,9 @@ MemoryOutputSource PersonSource()
 // (id = function id), outer columns with ids of their own.
 void FillCompose(CMultiColumnHandler &h)
 {
-    h.AddInnerColumn(10001, 10001, "Name");
-    h.AddInnerColumn(10002, 10002, "Vorname");
-    h.AddInnerColumn(10003, 10003, "Titel");
-    h.AddInnerColumn(10004, 10004, "PLZ");
-    h.AddInnerColumn(10005, 10005, "Ort");
+    char const *names[] = {"Name", "Vorname", "Titel", "PLZ", "Ort"};
+    for (int i = 0; i < 5; ++i)
+        h.AddInnerColumn(10001 + i, 10001 + i, names[i]);
     h.AddOuterColumn(7, "Person");
     h.AddAssignment(7, 10001, "", false);
     h.AddAssignment(7, 10002, ", ", false);

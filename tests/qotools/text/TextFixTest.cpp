@@ -17,7 +17,7 @@ template <class Filter> void SetColumns(Filter &f, std::vector<int> const &lengt
 }
 } // namespace
 
-TEST(TextFixRecords, RecordsFollowEachOtherAndRowsAreComputed)
+TEST(TextFixRecords, RecordsFollowEachOtherAShortLastOneIsReported)
 {
     TempFolder tmp;
     std::string path = tmp.Path("fix.dat");
@@ -39,16 +39,13 @@ TEST(TextFixRecords, RecordsFollowEachOtherAndRowsAreComputed)
     f.ColLen(2, 5);
     ASSERT_TRUE(f.AbsoluteRow(0));
     EXPECT_EQ((Row{"Meier", "Bonn", "01"}), CurrentRow(f));
-}
 
-TEST(TextFixRecords, AShortLastRecordIsReportedTrailingLineEndsAreNot)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("kurz.dat");
+    // A short last record is reported, trailing line ends are not.
+    path = tmp.Path("kurz.dat");
     WriteBytes(path, "aaaabbbbccc");
-    CQoInputFilterTextFix f;
     f.RecordLen(4);
     SetColumns(f, {2, 2});
+    f.SetFirstRowHasNames(false);
     {
         RepairScript script({CQoInterActive::repairTakeOver}, {"cc"});
         f.Init(path.c_str());
@@ -65,7 +62,7 @@ TEST(TextFixRecords, AShortLastRecordIsReportedTrailingLineEndsAreNot)
     EXPECT_EQ(2u, AllRows(f).size());
 }
 
-TEST(TextVFLines, LinesAreCutIntoColumns)
+TEST(TextVFLines, LinesAreCutIntoColumnsWhateverEndsThem)
 {
     TempFolder tmp;
     std::string path = tmp.Path("vf.txt");
@@ -81,21 +78,17 @@ TEST(TextVFLines, LinesAreCutIntoColumns)
     f.Init(path.c_str());
     EXPECT_EQ((std::vector<Row>{{"Meier", "53111", "Bonn"}, {"Li", "", ""}, {"Schulz", "10115", "Berlin"}}),
               AllRows(f));
-}
 
-TEST(TextVFLines, CrLfAndCrEndLinesAlike)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("cr.txt");
+    // CR LF, LF and CR end lines alike.
     for (std::string end : {"\r", "\n", "\r\n"}) {
         WriteBytes(path, "Vorspann" + end + "NameOrt" + end + "Li  Ulm" + end + end + "Kai Kiel" + end);
-        CQoInputFilterTextVF f;
-        SetColumns(f, {4, 4});
-        f.Skip(1);
-        f.SetFirstRowHasNames(true);
-        f.Init(path.c_str());
-        EXPECT_EQ(3, f.NumRows()) << end.size();
-        EXPECT_EQ((std::vector<Row>{{"Li", "Ulm"}, {"", ""}, {"Kai", "Kiel"}}), AllRows(f)) << end.size();
+        CQoInputFilterTextVF g;
+        SetColumns(g, {4, 4});
+        g.Skip(1);
+        g.SetFirstRowHasNames(true);
+        g.Init(path.c_str());
+        EXPECT_EQ(3, g.NumRows()) << end.size();
+        EXPECT_EQ((std::vector<Row>{{"Li", "Ulm"}, {"", ""}, {"Kai", "Kiel"}}), AllRows(g)) << end.size();
     }
 }
 

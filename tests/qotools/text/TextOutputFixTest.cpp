@@ -48,7 +48,7 @@ TEST(TextOutputFix, RecordsArePaddedCutAndEndedAsSet)
               ReadBytes(path));
 }
 
-TEST(TextOutputFix, LengthsOutsideTheColumnsAndOddLengths)
+TEST(TextOutputFix, OddLengthsAndSettingsRoundTrip)
 {
     CQoOutputFilterTextFix out;
     out.NumCols(2);
@@ -59,11 +59,8 @@ TEST(TextOutputFix, LengthsOutsideTheColumnsAndOddLengths)
     CQoString text;
     Row(out, {"weg", "da"}, &text);
     EXPECT_EQ("da \r\n", text.Str());
-}
 
-TEST(TextOutputFix, SettingsRoundTripThroughTheConfigurationFile)
-{
-    CQoOutputFilterTextFix out;
+    // The settings round-trip through the configuration file.
     out.NumCols(3);
     out.SetLength(0, 12);
     out.SetLength(1, 0);

@@ -213,12 +213,9 @@ TEST(TextOutputVar, DosCharacterSetAndSettingsRoundTrip)
     out.WriteConfig(cfg, "Csv");
     CQoOutputFilterTextVar copy;
     copy.ReadConfig(cfg, "Csv");
-    EXPECT_EQ('|', copy.Delimiter());
-    EXPECT_EQ('\'', copy.Encloser());
-    EXPECT_EQ('\\', copy.Escape());
-    EXPECT_TRUE(copy.ForceEncloser());
-    EXPECT_TRUE(copy.WriteHeaderFlag());
-    EXPECT_EQ(CQoFile::ascii, copy.FileCharSet());
+    EXPECT_EQ((std::vector<int>{'|', '\'', '\\', 1, 1, CQoFile::ascii}),
+              (std::vector<int>{copy.Delimiter(), copy.Encloser(), copy.Escape(), copy.ForceEncloser(),
+                                copy.WriteHeaderFlag(), copy.FileCharSet()}));
 
     // A tab survives as a tab, "none" as none.
     out.Delimiter('\t');

@@ -32,7 +32,7 @@ std::string PythonRows(PeerFolder const &folder, char delimiter, char quote, cha
             "out.close()\n";
     if (!RunPython(folder, "csvpeer", text))
         return std::string();
-    return ReadFileBytes(folder.Path("rows.txt"));
+    return ReadBytes(folder.Path("rows.txt"));
 }
 
 std::string OurRows(std::string const &path, char delimiter, char quote, char escape)

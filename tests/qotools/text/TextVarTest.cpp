@@ -51,9 +51,24 @@ TEST(TextVarReading, EnclosedFieldsHoldDelimitersQuotesAndLineBreaks)
     WriteBytes(path, "a;b\r\n" + filler + ";f\r\nxy;z\r\nend;e");
     VarPtr g(OpenVar(path, ';', true));
     EXPECT_EQ((std::vector<Row>{{filler, "f"}, {"xy", "z"}, {"end", "e"}}), AllRows(*g));
+
+    // An empty file has no rows; a missing one raises naming it.
+    WriteBytes(path, "");
+    CQoInputFilterTextVar empty;
+    empty.SetFirstRowHasNames(true);
+    empty.Init(path.c_str());
+    EXPECT_EQ(0, empty.NumRows());
+    EXPECT_FALSE(empty.AbsoluteRow(0));
+    try {
+        empty.Init(tmp.Path("fehlt.csv").c_str());
+        FAIL() << "a missing file must raise";
+    } catch (CQoException const &e) {
+        EXPECT_NE(std::string::npos, std::string(e.Message()).find("fehlt.csv"));
+    }
+    EXPECT_FALSE(empty.FirstRow());
 }
 
-TEST(TextVarReading, CrLfAndCrEndLinesAlikeAndMixed)
+TEST(TextVarReading, CrLfAndCrEndLinesAlikeTabEscapeSkipAndShortRows)
 {
     TempFolder tmp;
     std::string path = tmp.Path("ende.csv");
@@ -77,12 +92,9 @@ TEST(TextVarReading, CrLfAndCrEndLinesAlikeAndMixed)
                                     {"Koch", "Kiel"}}),
                   AllRows(f));
     }
-}
 
-TEST(TextVarReading, TabEscapeNoEncloserSkipAndShortRows)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("t.txt");
+    // Tab, escape, no encloser, skipped lines and short rows.
+    path = tmp.Path("t.txt");
     WriteBytes(path, "Kopfzeile \"ohne\" Ende\nnoch eine\n"
                      "a\\\tb\t\"c\"\td\n"
                      "x\n"
@@ -100,27 +112,7 @@ TEST(TextVarReading, TabEscapeNoEncloserSkipAndShortRows)
     EXPECT_EQ((Row{"a\\", "b", "\"c\"", "d"}), AllRows(f)[0]);
 }
 
-TEST(TextVarReading, EmptyAndMissingFiles)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("leer.csv");
-    WriteBytes(path, "");
-    CQoInputFilterTextVar f;
-    f.SetFirstRowHasNames(true);
-    f.Init(path.c_str());
-    EXPECT_EQ(0, f.NumRows());
-    EXPECT_FALSE(f.AbsoluteRow(0));
-
-    try {
-        f.Init(tmp.Path("fehlt.csv").c_str());
-        FAIL() << "a missing file must raise";
-    } catch (CQoException const &e) {
-        EXPECT_NE(std::string::npos, std::string(e.Message()).find("fehlt.csv"));
-    }
-    EXPECT_FALSE(f.FirstRow());
-}
-
-TEST(TextVarIndex, AbsoluteRowSeeksToAnyRowInAnyOrder)
+TEST(TextVarIndex, AbsoluteRowSeeksToAnyRowAndRaisesWhereTheFileWasCut)
 {
     TempFolder tmp;
     std::string path = tmp.Path("n.csv");
@@ -142,49 +134,41 @@ TEST(TextVarIndex, AbsoluteRowSeeksToAnyRowInAnyOrder)
         ASSERT_EQ("w" + std::to_string(row * 7) + (row % 97 == 0 ? "\nx" : ""), r[1]);
     }
     EXPECT_FALSE(f->AbsoluteRow(5000));
-}
 
-TEST(TextVarIndex, AFileCutShortWhileReadingRaises)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("kurz.csv");
-    std::string text;
+    // A file cut short while reading raises; what is left stays readable.
+    path = tmp.Path("kurz.csv");
+    text.clear();
     for (int i = 0; i < 300000; ++i)
         text += "zeile;" + std::to_string(i) + "\n";
     WriteBytes(path, text);
-    VarPtr f(OpenVar(path));
-    ASSERT_EQ(300000, f->NumRows());
-    ASSERT_TRUE(f->AbsoluteRow(0)); // what is in memory now is the start
+    VarPtr cut(OpenVar(path));
+    ASSERT_EQ(300000, cut->NumRows());
+    ASSERT_TRUE(cut->AbsoluteRow(0)); // what is in memory now is the start
     std::filesystem::resize_file(path, text.size() / 2);
-    EXPECT_THROW(f->AbsoluteRow(299999), CQoException);
+    EXPECT_THROW(cut->AbsoluteRow(299999), CQoException);
     // Still usable for what is left.
-    EXPECT_TRUE(f->AbsoluteRow(10));
-    EXPECT_EQ((Row{"zeile", "10"}), CurrentRow(*f));
+    EXPECT_TRUE(cut->AbsoluteRow(10));
+    EXPECT_EQ((Row{"zeile", "10"}), CurrentRow(*cut));
 }
 
-TEST(TextVarDefects, WithoutHookADefectiveRecordRaisesWithItsRow)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("d.csv");
-    WriteBytes(path, "a;b\n1;2\n3;4;5\n6;7\n");
-    VarPtr f(OpenVar(path, ';', true));
-    ASSERT_TRUE(f->FirstRow());
-    try {
-        f->NextRow();
-        FAIL() << "three fields in a two-column file must raise";
-    } catch (CQoException const &e) {
-        EXPECT_EQ(CQoException::formatError, e.Code());
-        // Counted as the user counts: the second data row.
-        EXPECT_NE(std::string::npos, std::string(e.Message()).find("Satz 2:")) << e.Message();
-    }
-    EXPECT_EQ(1, f->WrongInputCount());
-}
-
-TEST(TextVarDefects, HookSkipsTakesOverOrStops)
+TEST(TextVarDefects, WithoutHookARecordRaisesWithItsRowAHookSkipsTakesOverOrStops)
 {
     TempFolder tmp;
     std::string path = tmp.Path("r.csv");
     WriteBytes(path, "a;b\n1;2\n3;4;5\n6;7\n8;9;10\n11;12\n");
+    {
+        VarPtr f(OpenVar(path, ';', true));
+        ASSERT_TRUE(f->FirstRow());
+        try {
+            f->NextRow();
+            FAIL() << "three fields in a two-column file must raise";
+        } catch (CQoException const &e) {
+            EXPECT_EQ(CQoException::formatError, e.Code());
+            // Counted as the user counts: the second data row.
+            EXPECT_NE(std::string::npos, std::string(e.Message()).find("Satz 2:")) << e.Message();
+        }
+        EXPECT_EQ(1, f->WrongInputCount());
+    }
     {
         RepairScript script({CQoInterActive::repairSkip, CQoInterActive::repairTakeOver},
                             {"", "8;9+10\r\n"});
@@ -203,6 +187,15 @@ TEST(TextVarDefects, HookSkipsTakesOverOrStops)
         VarPtr f(OpenVar(path, ';', true));
         ASSERT_TRUE(f->FirstRow());
         EXPECT_THROW(f->NextRow(), CQoException);
+    }
+    {
+        // An encloser left open at the end: the offered next record is the line after it.
+        WriteBytes(path, "1;2\n3;\"vier\n5;6");
+        RepairScript script({CQoInterActive::repairSkip});
+        VarPtr f(OpenVar(path));
+        EXPECT_EQ((std::vector<Row>{{"1", "2"}, {"5", "6"}}), AllRows(*f));
+        ASSERT_EQ(1u, RepairScript::calls.size());
+        EXPECT_EQ(8, RepairScript::calls[0].pos);
     }
 }
 
@@ -229,19 +222,6 @@ TEST(TextVarDefects, ATakenOverRecordThatStillDoesNotFitGoesToTheCorrection)
     }
 }
 
-TEST(TextVarDefects, UnterminatedEncloserAtTheEndGoesToTheHook)
-{
-    TempFolder tmp;
-    std::string path = tmp.Path("u.csv");
-    WriteBytes(path, "1;2\n3;\"vier\n5;6");
-    RepairScript script({CQoInterActive::repairSkip});
-    VarPtr f(OpenVar(path));
-    // The offered next record is the line after the defective one.
-    EXPECT_EQ((std::vector<Row>{{"1", "2"}, {"5", "6"}}), AllRows(*f));
-    ASSERT_EQ(1u, RepairScript::calls.size());
-    EXPECT_EQ(8, RepairScript::calls[0].pos);
-}
-
 TEST(TextVarSettings, ConfigurationRoundTripAndBadValues)
 {
     CQoInputFilterTextVar a;
@@ -255,12 +235,8 @@ TEST(TextVarSettings, ConfigurationRoundTripAndBadValues)
     a.WriteConfig(cfg, "Eingabe");
     CQoInputFilterTextVar b;
     b.ReadConfig(cfg, "Eingabe");
-    EXPECT_EQ('\t', b.Delimiter());
-    EXPECT_EQ('\'', b.Encloser());
-    EXPECT_EQ('\\', b.Escape());
-    EXPECT_EQ(3, b.Skip());
-    EXPECT_EQ(CQoFile::ansimix, b.CharSet());
-    EXPECT_TRUE(b.GetFirstRowHasNames());
+    EXPECT_EQ((std::vector<int>{'\t', '\'', '\\', 3, CQoFile::ansimix, 1}),
+              (std::vector<int>{b.Delimiter(), b.Encloser(), b.Escape(), b.Skip(), b.CharSet(), b.GetFirstRowHasNames()}));
 
     b.CharSet(12345); // not a character set: ignored
     EXPECT_EQ(CQoFile::ansimix, b.CharSet());

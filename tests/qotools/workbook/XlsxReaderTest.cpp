@@ -136,34 +136,16 @@ std::vector<PeerSheet> ReadPeer(std::string const &path)
     return sheets;
 }
 
-class XlsxPeer : public ::testing::Test {
-protected:
-    static void SetUpTestSuite()
-    {
-        s_folder = new PeerFolder;
-        s_ready = s_folder->Usable() && RunPython(*s_folder, "write", writeWorkbooks) &&
-                  RunPython(*s_folder, "read", readWorkbooks);
-    }
-    static void TearDownTestSuite()
-    {
-        delete s_folder;
-        s_folder = nullptr;
-    }
-    static PeerFolder *s_folder;
-    static bool s_ready;
-};
-PeerFolder *XlsxPeer::s_folder = nullptr;
-bool XlsxPeer::s_ready = false;
-
-TEST_F(XlsxPeer, EveryCellReadsAsOpenpyxlReadsIt)
+TEST(XlsxPeer, EveryCellAndEscapeReadsAsOpenpyxlReadsIt)
 {
-    if (!s_ready)
+    PeerFolder folder;
+    if (!folder.Usable() || !RunPython(folder, "write", writeWorkbooks) || !RunPython(folder, "read", readWorkbooks))
         PEER_UNAVAILABLE();
     for (char const *name : {"xlsxwriter1900", "xlsxwriter1904"}) {
         SCOPED_TRACE(name);
-        std::vector<PeerSheet> peer = ReadPeer(s_folder->Path((std::string(name) + ".peer").c_str()));
+        std::vector<PeerSheet> peer = ReadPeer(folder.Path((std::string(name) + ".peer").c_str()));
         CQoXlsxReader reader;
-        reader.Open(s_folder->Path((std::string(name) + ".xlsx").c_str()).c_str());
+        reader.Open(folder.Path((std::string(name) + ".xlsx").c_str()).c_str());
         EXPECT_EQ(std::string(name).find("1904") != std::string::npos, reader.Date1904());
         ASSERT_EQ(int(peer.size()), reader.SheetCount());
         for (int sheet = 0; sheet < reader.SheetCount(); ++sheet) {
@@ -199,18 +181,14 @@ TEST_F(XlsxPeer, EveryCellReadsAsOpenpyxlReadsIt)
             EXPECT_EQ(expectedCells, got);
         }
     }
-}
 
-TEST_F(XlsxPeer, EscapedCharactersReadAsWritten)
-{
-    if (!s_ready)
-        PEER_UNAVAILABLE();
+    // Escaped characters read as written, from shared and inline strings.
     std::vector<std::string> const expected = {"_x0041_ w\xF6rtlich", "a\x01" "b", "Zeile\r\nZwei",
                                                "Tab\tEnde", "_x005F_", "\x80_x20AC_"};
     for (char const *name : {"escapes_shared.xlsx", "escapes_inline.xlsx"}) {
         SCOPED_TRACE(name);
         CQoXlsxReader reader;
-        reader.Open(s_folder->Path(name).c_str());
+        reader.Open(folder.Path(name).c_str());
         reader.OpenSheet(0);
         std::vector<std::string> got;
         std::vector<Cell> row;
